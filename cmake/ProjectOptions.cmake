@@ -1,0 +1,57 @@
+# Build options shared by every target of the project.
+#
+#   ORV_SANITIZE=address   AddressSanitizer + UndefinedBehaviorSanitizer
+#   ORV_SANITIZE=thread    ThreadSanitizer
+#   ORV_FUZZ=ON            libFuzzer targets (needs clang)
+#   ORV_BENCH=ON           Google Benchmark programs under bench/
+
+set(ORV_SANITIZE "" CACHE STRING "Sanitizer build: empty, 'address' or 'thread'")
+set_property(CACHE ORV_SANITIZE PROPERTY STRINGS "" address thread)
+option(ORV_FUZZ "Build the libFuzzer targets (clang only)" OFF)
+option(ORV_BENCH "Build the benchmarks" ON)
+
+if(ORV_SANITIZE STREQUAL "address")
+  add_compile_options(-fsanitize=address,undefined -fno-omit-frame-pointer -fno-sanitize-recover=undefined)
+  add_link_options(-fsanitize=address,undefined)
+elseif(ORV_SANITIZE STREQUAL "thread")
+  add_compile_options(-fsanitize=thread -fno-omit-frame-pointer)
+  add_link_options(-fsanitize=thread)
+elseif(NOT ORV_SANITIZE STREQUAL "")
+  message(FATAL_ERROR "ORV_SANITIZE must be empty, 'address' or 'thread', not '${ORV_SANITIZE}'")
+endif()
+
+# Warnings as errors on the project's own code. Call it for every target the
+# project defines; third-party headers are included as SYSTEM and stay quiet.
+function(orv_project_target target)
+  target_compile_options(${target} PRIVATE
+    -Wall -Wextra -Werror -Wshadow -Wformat=2 -Wundef
+    $<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor -Woverloaded-virtual>)
+endfunction()
+
+# A GoogleTest suite registered with ctest. Usage:
+#   orv_add_gtest(name SOURCES a.cpp b.cpp LIBS lib1 lib2)
+function(orv_add_gtest name)
+  cmake_parse_arguments(ARG "" "" "SOURCES;LIBS" ${ARGN})
+  add_executable(${name} ${ARG_SOURCES})
+  orv_project_target(${name})
+  target_link_libraries(${name} PRIVATE ${ARG_LIBS} GTest::gtest GTest::gtest_main GTest::gmock Threads::Threads)
+  gtest_discover_tests(${name} DISCOVERY_TIMEOUT 60
+    PROPERTIES ENVIRONMENT "ORV_BUILD_DIR=${CMAKE_BINARY_DIR};ORV_SOURCE_DIR=${CMAKE_SOURCE_DIR}")
+endfunction()
+
+# Adds every sub-folder of the current folder that has a CMakeLists.txt, in name order.
+function(orv_add_subfolders)
+  file(GLOB children RELATIVE ${CMAKE_CURRENT_SOURCE_DIR} ${CMAKE_CURRENT_SOURCE_DIR}/*)
+  list(SORT children)
+  foreach(child ${children})
+    if(IS_DIRECTORY ${CMAKE_CURRENT_SOURCE_DIR}/${child} AND EXISTS ${CMAKE_CURRENT_SOURCE_DIR}/${child}/CMakeLists.txt)
+      add_subdirectory(${child})
+    endif()
+  endforeach()
+endfunction()
+
+# Only what a library exports on purpose is visible: the provider library's
+# factories. Everything else, including the static libraries linked into it, is hidden.
+set(CMAKE_C_VISIBILITY_PRESET hidden)
+set(CMAKE_CXX_VISIBILITY_PRESET hidden)
+set(CMAKE_VISIBILITY_INLINES_HIDDEN ON)

@@ -1,0 +1,21 @@
+#!/usr/bin/env bash
+# Installs every Debian package the build, the tests and the benchmarks need.
+# Safe to run again; needs root (or sudo) on a Debian 12 machine.
+set -euo pipefail
+
+PACKAGES=(
+  # toolchain and build
+  build-essential cmake ninja-build pkg-config clang libclang-rt-14-dev
+  # test and measurement tools
+  libgtest-dev libgmock-dev googletest libbenchmark-dev valgrind
+  # libraries the project links against
+  libboost-dev nlohmann-json3-dev libcpp-httplib-dev libexpat1-dev libmnl-dev
+  # tools the end-to-end and Linux tests drive
+  sblim-wbemcli ethtool iproute2 curl procps
+)
+
+SUDO=""
+if [ "$(id -u)" -ne 0 ]; then SUDO="sudo"; fi
+export DEBIAN_FRONTEND=noninteractive
+$SUDO apt-get update -qq
+$SUDO apt-get install -y -qq --no-install-recommends "${PACKAGES[@]}"
