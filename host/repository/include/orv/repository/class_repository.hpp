@@ -60,11 +60,13 @@ public:
     // The ancestors of the class, nearest first (the class itself not included).
     // Empty for a root class or an unknown one.
     std::vector<std::string> superclassChain(std::string_view ns, std::string_view className) const;
-    // Subclasses, direct only or all descendants, in declaration order.
+    // Subclasses, direct only or all descendants. Direct subclasses come in
+    // declaration order; deep lists go depth-first (each class followed by its
+    // own subclasses). Empty for an unknown class.
     std::vector<std::string> subclasses(std::string_view ns, std::string_view className,
                                         bool deep) const;
     // EnumerateClassNames: with an empty className the root classes (deep: every
-    // class), otherwise the class's subclasses (direct or deep). Declaration order.
+    // class), otherwise the class's subclasses (direct or deep), ordered as above.
     std::vector<std::string> classNames(std::string_view ns, std::string_view className,
                                         bool deep) const;
     // Key property names, inherited ones included, in schema order.

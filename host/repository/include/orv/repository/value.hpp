@@ -37,7 +37,7 @@ public:
     bool operator==(const Value&) const = default;
 
 private:
-    enum class Kind : std::uint8_t { Null, Scalar, Array };
+    enum class Kind : std::uint8_t { Null, One, Array };
     Kind kind_ = Kind::Null;
     std::vector<Scalar> items_;
 };
