@@ -1,0 +1,75 @@
+// The ethtool ioctl queries the NIC records need, one function per command,
+// answering the kernel's own structures (or small owned ones where the kernel's
+// answer has a variable length). Every refusal throws LinuxCallError naming the command.
+#pragma once
+
+#include "ethtool_channel.hpp"
+
+#include <cstdint>
+#include <linux/ethtool.h>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace orv::linuxhost {
+
+// A link-mode bit mask in the kernel's word layout: bit n is bit n%32 of word n/32.
+struct LinkModeMask {
+    std::vector<std::uint32_t> words;
+    bool test(unsigned bit) const;
+    void set(unsigned bit);
+};
+
+enum class LinkSettingsSource { Netlink, LinkSettingsIoctl, LegacyIoctl };
+
+struct LinkSettings {
+    std::uint32_t speed = static_cast<std::uint32_t>(SPEED_UNKNOWN);  // Mb/s
+    std::uint8_t duplex = DUPLEX_UNKNOWN;
+    std::uint8_t port = PORT_OTHER;
+    std::uint8_t phyAddress = 0;
+    std::uint8_t transceiver = XCVR_INTERNAL;
+    std::uint8_t autoneg = AUTONEG_DISABLE;
+    LinkModeMask supported;
+    LinkModeMask advertising;
+    LinkModeMask partner;
+    LinkSettingsSource source = LinkSettingsSource::LinkSettingsIoctl;
+};
+
+struct DriverStatistic {
+    std::string name;
+    std::uint64_t value = 0;
+};
+
+class EthtoolReader {
+public:
+    EthtoolReader(EthtoolChannel& channel, std::string ifname);
+
+    // ETHTOOL_GLINKSETTINGS with the mask-size handshake; ETHTOOL_GSET when the
+    // kernel or driver does not know the newer command.
+    LinkSettings linkSettings() const;
+    ethtool_drvinfo driverInfo() const;
+    ethtool_wolinfo wakeOnLan() const;
+    ethtool_coalesce coalesce() const;
+    ethtool_pauseparam pause() const;
+    ethtool_ringparam rings() const;
+    std::uint32_t messageLevel() const;
+    bool linkDetected() const;
+    // The burnt-in address; empty when the driver reports none.
+    std::vector<std::uint8_t> permanentAddress() const;
+    // The driver's own counters (string set ETH_SS_STATS) with their names.
+    std::vector<DriverStatistic> driverStatistics() const;
+
+private:
+    void exchange(void* buffer, std::size_t size, const char* command) const;
+    template <typename Answer>
+    Answer simple(std::uint32_t command, const char* name) const;
+    LinkSettings legacySettings() const;
+    std::uint32_t statisticsCount() const;
+    std::vector<std::string> statisticNames(std::uint32_t count) const;
+    std::vector<std::uint64_t> statisticValues(std::uint32_t count) const;
+
+    EthtoolChannel& channel_;
+    std::string ifname_;
+};
+
+}  // namespace orv::linuxhost

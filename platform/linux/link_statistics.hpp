@@ -1,0 +1,20 @@
+// The 64-bit interface counters of rtnetlink (RTM_GETLINK, IFLA_STATS64).
+#pragma once
+
+#include "netlink_socket.hpp"
+
+#include <linux/if_link.h>
+#include <optional>
+#include <string>
+
+namespace orv::linuxhost {
+
+// Asks for one interface by name. Throws LinuxCallError ("RTM_GETLINK", name,
+// errno) when the interface is gone or the kernel gives no 64-bit counters.
+rtnl_link_stats64 readLinkStatistics(NetlinkSocket& route, const std::string& ifname);
+// The request message for one interface, written into buffer (MNL_SOCKET_BUFFER_SIZE bytes).
+nlmsghdr* buildLinkRequest(char* buffer, const std::string& ifname);
+// The IFLA_STATS64 attribute of an RTM_NEWLINK answer; nothing when it has none.
+std::optional<rtnl_link_stats64> parseLinkStatistics(const NetlinkMessage& answer);
+
+}  // namespace orv::linuxhost
