@@ -1,0 +1,103 @@
+#include "array.hpp"
+
+#include "value.hpp"
+
+namespace orv::host::detail {
+
+ArrayImpl::ArrayImpl(CMPICount size, CMPIType type)
+    : elementType(storedType(static_cast<CMPIType>(type & ~CMPI_ARRAY))), elements(size) {
+    for (CMPIData& element : elements) {
+        element.type = elementType;
+        element.state = CMPI_nullValue;
+    }
+}
+
+ArrayImpl::ArrayImpl(const ArrayImpl& other) : elementType(other.elementType), elements(other.elements.size()) {
+    for (std::size_t i = 0; i < elements.size(); ++i) {
+        copyValue(elements[i], other.elements[i]);
+    }
+}
+
+ArrayImpl::~ArrayImpl() {
+    for (CMPIData& element : elements) {
+        freeValue(element);
+    }
+}
+
+namespace {
+
+CMPIStatus release(CMPIArray* array) { return releaseAny(array, &kArrayFT); }
+
+CMPIArray* clone(const CMPIArray* array, CMPIStatus* rc) {
+    CMPIArray* copy = cloneArray(array, Owner::Caller);
+    setRc(rc, copy != nullptr ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE);
+    return copy;
+}
+
+CMPICount getSize(const CMPIArray* array, CMPIStatus* rc) {
+    ArrayImpl* impl = arrayImpl(array);
+    setRc(rc, impl != nullptr ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE);
+    return impl != nullptr ? static_cast<CMPICount>(impl->elements.size()) : 0;
+}
+
+CMPIType getSimpleType(const CMPIArray* array, CMPIStatus* rc) {
+    ArrayImpl* impl = arrayImpl(array);
+    setRc(rc, impl != nullptr ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE);
+    return impl != nullptr ? impl->elementType : CMPI_null;
+}
+
+CMPIData getElementAt(const CMPIArray* array, CMPICount index, CMPIStatus* rc) {
+    ArrayImpl* impl = arrayImpl(array);
+    if (impl == nullptr) {
+        setRc(rc, CMPI_RC_ERR_INVALID_HANDLE);
+        return nullData();
+    }
+    if (index >= impl->elements.size()) {
+        setRc(rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
+        return nullData(CMPI_badValue);
+    }
+    setRc(rc, CMPI_RC_OK);
+    return impl->elements[index];
+}
+
+CMPIStatus setElementAt(CMPIArray* array, CMPICount index, const CMPIValue* value, CMPIType type) {
+    ArrayImpl* impl = arrayImpl(array);
+    if (impl == nullptr) {
+        return CMPIStatus{CMPI_RC_ERR_INVALID_HANDLE, nullptr};
+    }
+    if (index >= impl->elements.size()) {
+        return CMPIStatus{CMPI_RC_ERR_NO_SUCH_PROPERTY, nullptr};
+    }
+    if (storedType(type) != impl->elementType) {
+        return CMPIStatus{CMPI_RC_ERR_TYPE_MISMATCH, nullptr};
+    }
+    CMPIData stored{};
+    if (CMPIrc rc = storeValue(stored, value, type); rc != CMPI_RC_OK) {
+        return CMPIStatus{rc, nullptr};
+    }
+    retireValue(impl->elements[index]);
+    impl->elements[index] = stored;
+    return okStatus();
+}
+
+}  // namespace
+
+const CMPIArrayFT kArrayFT = {1, release, clone, getSize, getSimpleType, getElementAt, setElementAt};
+
+CMPIArray* newArray(CMPICount size, CMPIType elementType, Owner owner) {
+    return makeObject<CMPIArray, ArrayImpl>(&kArrayFT, owner, size, elementType);
+}
+
+ArrayImpl* arrayImpl(const CMPIArray* array) noexcept { return implOf<ArrayImpl>(array, &kArrayFT); }
+
+CMPIArray* cloneArray(const CMPIArray* array, Owner owner) {
+    ArrayImpl* impl = arrayImpl(array);
+    return impl != nullptr ? makeObject<CMPIArray, ArrayImpl>(&kArrayFT, owner, *impl) : nullptr;
+}
+
+CMPIType arrayElementType(const CMPIArray* array) noexcept {
+    ArrayImpl* impl = arrayImpl(array);
+    return impl != nullptr ? impl->elementType : CMPI_null;
+}
+
+}  // namespace orv::host::detail

@@ -1,0 +1,201 @@
+#include "instance.hpp"
+
+#include "names.hpp"
+#include "object_path.hpp"
+#include "string.hpp"
+#include "value_text.hpp"
+
+namespace orv::host::detail {
+
+namespace {
+
+constexpr CMPIStatus kInvalid{CMPI_RC_ERR_INVALID_HANDLE, nullptr};
+
+InstanceImpl* impl(const CMPIInstance* instance) { return instanceImpl(instance); }
+
+const std::vector<std::string>& keyNamesOf(const InstanceImpl& inst) {
+    if (inst.classes != nullptr) {
+        if (const auto* names = inst.classes->keyNames(inst.nameSpace, inst.className); names != nullptr) {
+            return *names;
+        }
+    }
+    return inst.pathKeys;
+}
+
+bool contains(const std::vector<std::string>& names, std::string_view name) {
+    for (const std::string& item : names) {
+        if (equalsNoCase(item, name)) {
+            return true;
+        }
+    }
+    return false;
+}
+
+// Whether the property filter lets `name` in.
+bool passesFilter(const InstanceImpl& inst, std::string_view name) {
+    return !inst.filter || contains(*inst.filter, name) || contains(keyNamesOf(inst), name);
+}
+
+CMPIStatus release(CMPIInstance* instance) { return releaseAny(instance, &kInstanceFT); }
+
+CMPIInstance* clone(const CMPIInstance* instance, CMPIStatus* rc) {
+    CMPIInstance* copy = cloneInstance(instance, Owner::Caller);
+    setRc(rc, copy != nullptr ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE);
+    return copy;
+}
+
+CMPIData getProperty(const CMPIInstance* instance, const char* name, CMPIStatus* rc) {
+    InstanceImpl* inst = impl(instance);
+    if (inst == nullptr || name == nullptr) {
+        setRc(rc, inst == nullptr ? CMPI_RC_ERR_INVALID_HANDLE : CMPI_RC_ERR_INVALID_PARAMETER);
+        return nullData();
+    }
+    return inst->properties.get(name, rc, CMPI_notFound);
+}
+
+CMPIData getPropertyAt(const CMPIInstance* instance, CMPICount index, CMPIString** name, CMPIStatus* rc) {
+    InstanceImpl* inst = impl(instance);
+    if (inst == nullptr) {
+        setRc(rc, CMPI_RC_ERR_INVALID_HANDLE);
+        return nullData();
+    }
+    return inst->properties.at(index, name, rc, CMPI_notFound);
+}
+
+CMPICount getPropertyCount(const CMPIInstance* instance, CMPIStatus* rc) {
+    InstanceImpl* inst = impl(instance);
+    setRc(rc, inst != nullptr ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE);
+    return inst != nullptr ? static_cast<CMPICount>(inst->properties.size()) : 0;
+}
+
+CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
+    InstanceImpl* inst = impl(instance);
+    if (inst == nullptr) {
+        return kInvalid;
+    }
+    if (name == nullptr) {
+        return CMPIStatus{CMPI_RC_ERR_INVALID_PARAMETER, nullptr};
+    }
+    if (!passesFilter(*inst, name)) {
+        return okStatus();  // filtered out: accepted and dropped
+    }
+    return CMPIStatus{inst->properties.set(name, value, type), nullptr};
+}
+
+CMPIStatus setPropertyWithOrigin(const CMPIInstance* instance, const char* name, const CMPIValue* value,
+                                 CMPIType type, const char* /*origin: class origins are not kept*/) {
+    return setProperty(instance, name, value, type);
+}
+
+CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
+    InstanceImpl* inst = impl(instance);
+    if (inst == nullptr) {
+        setRc(rc, CMPI_RC_ERR_INVALID_HANDLE);
+        return nullptr;
+    }
+    CMPIObjectPath* path = newObjectPath(inst->nameSpace, inst->className, inst->classes, Owner::Arena);
+    ObjectPathImpl* p = objectPathImpl(path);
+    p->host = inst->host;
+    for (const std::string& key : keyNamesOf(*inst)) {
+        const NamedValue* property = inst->properties.find(key);
+        if (property != nullptr && property->data.state == CMPI_goodValue) {
+            CMPIData copy{};
+            copyValue(copy, property->data);
+            p->keys.setStored(property->name, copy);
+        }
+    }
+    setRc(rc, CMPI_RC_OK);
+    return path;
+}
+
+std::vector<std::string> nameList(const char** names) {
+    std::vector<std::string> list;
+    for (; names != nullptr && *names != nullptr; ++names) {
+        list.emplace_back(*names);
+    }
+    return list;
+}
+
+CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** propertyList, const char** keys) {
+    InstanceImpl* inst = impl(instance);
+    if (inst == nullptr) {
+        return kInvalid;
+    }
+    if (propertyList == nullptr) {
+        return okStatus();  // NULL list: every property
+    }
+    std::vector<std::string> allowed = nameList(propertyList);
+    for (std::string& key : nameList(keys)) {
+        allowed.push_back(std::move(key));
+    }
+    inst->filter = std::move(allowed);
+    inst->properties.keepIf([inst](const std::string& name) { return passesFilter(*inst, name); });
+    return okStatus();
+}
+
+CMPIStatus setObjectPath(CMPIInstance* instance, const CMPIObjectPath* op) {
+    InstanceImpl* inst = impl(instance);
+    ObjectPathImpl* path = objectPathImpl(op);
+    if (inst == nullptr || path == nullptr) {
+        return kInvalid;
+    }
+    inst->nameSpace = path->nameSpace;
+    inst->host = path->host;
+    inst->className = path->className;
+    inst->pathKeys.clear();
+    for (std::size_t i = 0; i < path->keys.size(); ++i) {
+        const NamedValue& key = path->keys[i];
+        CMPIData copy{};
+        copyValue(copy, key.data);
+        inst->properties.setStored(key.name, copy);
+        inst->pathKeys.push_back(key.name);
+    }
+    return okStatus();
+}
+
+}  // namespace
+
+const CMPIInstanceFT kInstanceFT = {
+    1,
+    release,
+    clone,
+    getProperty,
+    getPropertyAt,
+    getPropertyCount,
+    setProperty,
+    getObjectPath,
+    setPropertyFilter,
+    setObjectPath,
+    setPropertyWithOrigin,
+};
+
+CMPIInstance* newInstance(const CMPIObjectPath* path, Owner owner) {
+    ObjectPathImpl* p = objectPathImpl(path);
+    if (p == nullptr) {
+        return nullptr;
+    }
+    CMPIInstance* instance = makeObject<CMPIInstance, InstanceImpl>(&kInstanceFT, owner);
+    instanceImpl(instance)->classes = p->classes;
+    setObjectPath(instance, path);
+    return instance;
+}
+
+InstanceImpl* instanceImpl(const CMPIInstance* instance) noexcept {
+    return implOf<InstanceImpl>(instance, &kInstanceFT);
+}
+
+CMPIInstance* cloneInstance(const CMPIInstance* instance, Owner owner) {
+    InstanceImpl* inst = instanceImpl(instance);
+    return inst != nullptr ? makeObject<CMPIInstance, InstanceImpl>(&kInstanceFT, owner, *inst) : nullptr;
+}
+
+std::string instanceText(const InstanceImpl& instance) {
+    std::string text = "instance of " + instance.className + " {\n";
+    for (std::size_t i = 0; i < instance.properties.size(); ++i) {
+        const NamedValue& property = instance.properties[i];
+        text += " " + property.name + " = " + keyText(property.data) + ";\n";
+    }
+    return text + "};\n";
+}
+
+}  // namespace orv::host::detail

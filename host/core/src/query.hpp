@@ -1,0 +1,38 @@
+// A small WQL/CQL reader for select expressions:
+//   SELECT * | prop [, prop ...] FROM Class [WHERE pred [AND|OR pred ...]]
+// with pred = prop op literal | prop IS [NOT] NULL | prop ISA Class, and
+// op one of = <> != < <= > >= LIKE. AND binds tighter than OR; the condition is
+// kept in disjunctive normal form (a list of AND-groups). No parentheses.
+#pragma once
+
+#include <cmpidt.h>
+
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace orv::host::detail {
+
+struct Predicate {
+    std::string lhs;  // property name
+    std::string rhs;  // literal text without quotes ("" for IS [NOT] NULL)
+    CMPIPredOp op = CMPI_PredOp_Equals;
+    CMPIType type = CMPI_charString;  // CMPI_charString, CMPI_numericString, CMPI_booleanString
+};
+
+using Conjunction = std::vector<Predicate>;
+
+struct Query {
+    std::string fromClass;
+    std::vector<std::string> projection;  // empty: "*"
+    std::vector<Conjunction> where;       // empty: no WHERE clause
+};
+
+// The parsed query, or empty with `error` set.
+std::optional<Query> parseQuery(std::string_view text, std::string* error);
+
+// Whether one predicate holds for a value given in text form (isNull: no value).
+bool predicateHolds(const Predicate& predicate, const std::string& value, bool isNull);
+
+}  // namespace orv::host::detail

@@ -1,0 +1,24 @@
+// CMPIResult: collects, in order, what a provider returns. Returned objects are
+// copied into the sink's arena (the reply's or the up-calling invocation's),
+// since the provider may change or release its own after returning them.
+#pragma once
+
+#include <vector>
+
+#include "object.hpp"
+#include "orv/host/broker_core.hpp"
+
+namespace orv::host::detail {
+
+extern const CMPIResultFT kResultFT;
+
+struct ResultSink {
+    explicit ResultSink(Arena& arena) : out(&arena) {}
+    Arena* out;
+    std::vector<ReturnedItem> items;
+    unsigned done = 0;
+};
+
+// A caller-owned result feeding `sink`; free it with disposeObject.
+
+}  // namespace orv::host::detail

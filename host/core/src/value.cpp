@@ -1,0 +1,275 @@
+#include "value.hpp"
+
+#include <cstring>
+
+#include "array.hpp"
+#include "args.hpp"
+#include "datetime.hpp"
+#include "enumeration.hpp"
+#include "instance.hpp"
+#include "names.hpp"
+#include "object_path.hpp"
+#include "object.hpp"
+#include "select_exp.hpp"
+#include "string.hpp"
+
+namespace orv::host::detail {
+
+namespace {
+
+// Width of a scalar type's value, 0 for anything that is not a plain scalar.
+std::size_t scalarWidth(CMPIType type) noexcept {
+    switch (type) {
+    case CMPI_boolean:
+    case CMPI_uint8:
+    case CMPI_sint8:
+        return 1;
+    case CMPI_char16:
+    case CMPI_uint16:
+    case CMPI_sint16:
+        return 2;
+    case CMPI_uint32:
+    case CMPI_sint32:
+    case CMPI_real32:
+        return 4;
+    case CMPI_uint64:
+    case CMPI_sint64:
+    case CMPI_real64:
+        return 8;
+    default:
+        return 0;
+    }
+}
+
+// Encapsulated types whose member a stored value owns.
+bool ownsMember(CMPIType type) noexcept {
+    if ((type & CMPI_ARRAY) != 0) {
+        return true;
+    }
+    switch (type) {
+    case CMPI_instance:
+    case CMPI_ref:
+    case CMPI_args:
+    case CMPI_filter:
+    case CMPI_enumeration:
+    case CMPI_string:
+    case CMPI_dateTime:
+        return true;
+    default:
+        return false;
+    }
+}
+
+// A Parent-owned copy of an encapsulated input object, or nullptr when the
+// object is not one of ours of that type.
+void* copyMember(CMPIType type, const void* object) {
+    if ((type & CMPI_ARRAY) != 0) {
+        return cloneArray(static_cast<const CMPIArray*>(object), Owner::Parent);
+    }
+    switch (type) {
+    case CMPI_instance:
+        return cloneInstance(static_cast<const CMPIInstance*>(object), Owner::Parent);
+    case CMPI_ref:
+        return cloneObjectPath(static_cast<const CMPIObjectPath*>(object), Owner::Parent);
+    case CMPI_args:
+        return cloneArgs(static_cast<const CMPIArgs*>(object), Owner::Parent);
+    case CMPI_filter:
+        return cloneSelectExp(static_cast<const CMPISelectExp*>(object), Owner::Parent);
+    case CMPI_enumeration:
+        return cloneEnumeration(static_cast<const CMPIEnumeration*>(object), Owner::Parent);
+    case CMPI_string: {
+        const char* text = stringText(static_cast<const CMPIString*>(object));
+        return text != nullptr ? newString(text, Owner::Parent) : nullptr;
+    }
+    case CMPI_dateTime:
+        return cloneDateTime(static_cast<const CMPIDateTime*>(object), Owner::Parent);
+    default:
+        return nullptr;
+    }
+}
+
+// Every CMPIValue member that is an object pointer sits at offset 0.
+const void* memberPointer(const CMPIValue& value) noexcept { return value.inst; }
+
+CMPIrc checkArrayType(CMPIType type, const void* array) noexcept {
+    CMPIType element = storedType(static_cast<CMPIType>(type & ~CMPI_ARRAY));
+    CMPIType held = arrayElementType(static_cast<const CMPIArray*>(array));
+    return held == element ? CMPI_RC_OK : CMPI_RC_ERR_TYPE_MISMATCH;
+}
+
+}  // namespace
+
+bool isKnownType(CMPIType type) noexcept {
+    if (scalarWidth(type) != 0) {
+        return true;
+    }
+    if ((type & CMPI_ARRAY) != 0) {
+        CMPIType element = static_cast<CMPIType>(type & ~CMPI_ARRAY);
+        return element != CMPI_null && (element & CMPI_ARRAY) == 0 && isKnownType(element);
+    }
+    switch (type) {
+    case CMPI_null:
+    case CMPI_instance:
+    case CMPI_ref:
+    case CMPI_args:
+    case CMPI_class:
+    case CMPI_filter:
+    case CMPI_enumeration:
+    case CMPI_string:
+    case CMPI_chars:
+    case CMPI_dateTime:
+    case CMPI_ptr:
+    case CMPI_charsptr:
+        return true;
+    default:
+        return false;
+    }
+}
+
+CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
+    if (!isKnownType(type)) {
+        return CMPI_RC_ERR_INVALID_DATA_TYPE;
+    }
+    out = CMPIData{};
+    out.type = storedType(type);
+    out.state = CMPI_goodValue;
+    if (type == CMPI_null || value == nullptr) {
+        out.state = CMPI_nullValue;
+        return CMPI_RC_OK;
+    }
+    if (std::size_t width = scalarWidth(type); width != 0) {
+        std::memcpy(&out.value, value, width);
+        return CMPI_RC_OK;
+    }
+    if (type == CMPI_chars) {
+        out.value.string = newString(reinterpret_cast<const char*>(value), Owner::Parent);
+        return CMPI_RC_OK;
+    }
+    if (!ownsMember(type)) {  // class, ptr, charsptr: kept as given
+        std::memcpy(&out.value, value, sizeof(void*));
+        if (type == CMPI_ptr || type == CMPI_charsptr) {
+            out.value.dataPtr = value->dataPtr;
+        }
+        return CMPI_RC_OK;
+    }
+    const void* member = memberPointer(*value);
+    if (member == nullptr) {
+        out.state = CMPI_nullValue;
+        return CMPI_RC_OK;
+    }
+    if ((type & CMPI_ARRAY) != 0 && arrayElementType(static_cast<const CMPIArray*>(member)) != CMPI_null) {
+        if (CMPIrc rc = checkArrayType(type, member); rc != CMPI_RC_OK) {
+            return rc;
+        }
+    }
+    void* copy = copyMember(type, member);
+    if (copy == nullptr) {
+        return CMPI_RC_ERR_INVALID_HANDLE;
+    }
+    out.value.inst = static_cast<CMPIInstance*>(copy);
+    return CMPI_RC_OK;
+}
+
+void copyValue(CMPIData& out, const CMPIData& in) {
+    out = in;
+    if (ownsMember(in.type) && in.state == CMPI_goodValue && in.value.inst != nullptr) {
+        out.value.inst = static_cast<CMPIInstance*>(copyMember(in.type, in.value.inst));
+    }
+}
+
+void freeValue(CMPIData& data) noexcept {
+    if (ownsMember(data.type) && data.value.inst != nullptr && data.state == CMPI_goodValue) {
+        ObjectBase* member = baseOf(data.value.inst);
+        member->destroy(member);
+    }
+    data.value.inst = nullptr;
+}
+
+void retireValue(CMPIData& data) noexcept {
+    handOverValue(data, currentArena());
+    data.value.inst = nullptr;
+}
+
+ValueList::~ValueList() {
+    for (NamedValue& item : items_) {
+        freeValue(item.data);
+    }
+}
+
+ValueList::ValueList(const ValueList& other) {
+    items_.reserve(other.items_.size());
+    for (const NamedValue& item : other.items_) {
+        NamedValue copy{item.name, item.hash, {}};
+        copyValue(copy.data, item.data);
+        items_.push_back(std::move(copy));
+    }
+}
+
+const NamedValue* ValueList::find(std::string_view name) const noexcept {
+    std::uint32_t hash = hashNoCase(name);
+    for (const NamedValue& item : items_) {
+        if (item.hash == hash && equalsNoCase(item.name, name)) {
+            return &item;
+        }
+    }
+    return nullptr;
+}
+
+CMPIrc ValueList::set(std::string_view name, const CMPIValue* value, CMPIType type) {
+    CMPIData stored{};
+    CMPIrc rc = storeValue(stored, value, type);
+    if (rc == CMPI_RC_OK) {
+        setStored(name, stored);
+    }
+    return rc;
+}
+
+void ValueList::setStored(std::string_view name, CMPIData stored) {
+    if (auto* existing = const_cast<NamedValue*>(find(name)); existing != nullptr) {
+        retireValue(existing->data);
+        existing->data = stored;
+        return;
+    }
+    items_.push_back(NamedValue{std::string(name), hashNoCase(name), stored});
+}
+
+CMPIData ValueList::get(std::string_view name, CMPIStatus* rc, CMPIValueState missing) const {
+    const NamedValue* item = find(name);
+    if (item == nullptr) {
+        setRc(rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
+        return nullData(missing);
+    }
+    setRc(rc, CMPI_RC_OK);
+    return item->data;
+}
+
+CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc,
+                       CMPIValueState missing) const {
+    if (index >= items_.size()) {
+        setRc(rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
+        if (name != nullptr) {
+            *name = nullptr;
+        }
+        return nullData(missing);
+    }
+    const NamedValue& item = items_[index];
+    if (name != nullptr) {
+        *name = newString(item.name, Owner::Arena);
+    }
+    setRc(rc, CMPI_RC_OK);
+    return item.data;
+}
+
+}  // namespace orv::host::detail
+
+namespace orv::host::detail {
+
+void handOverValue(CMPIData& data, Arena& arena) noexcept {
+    if (ownsMember(data.type) && data.value.inst != nullptr && data.state == CMPI_goodValue) {
+        ObjectBase* member = baseOf(data.value.inst);
+        member->owner = Owner::Arena;
+        arena.adopt(member);
+    }
+}
+
+}  // namespace orv::host::detail
