@@ -1,0 +1,36 @@
+// CMPI data as CIM-XML text: type names and the text of scalar values.
+#pragma once
+
+#include <cmpidt.h>
+#include <cmpift.h>
+
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace orv::cimxml {
+
+// The characters of a CMPI string; "" for a NULL string.
+std::string cmpiString(const CMPIString* text);
+
+// The TYPE attribute for a CMPI type with the array flag removed: "uint16", "string",
+// "datetime", ... (strings, chars and embedded instances are "string"; references
+// "reference"). Empty for types CIM-XML cannot carry.
+std::string_view xmlTypeName(CMPIType type) noexcept;
+
+// The VALUE text of one non-null scalar item: booleans "TRUE"/"FALSE", integers in
+// decimal, reals in their shortest round-trip form, char16 as UTF-8, datetimes in
+// the 25-character interval or timestamp form. nullopt for null data, references,
+// instances and types without a text form.
+std::optional<std::string> scalarText(const CMPIData& data);
+
+// The VALUETYPE of a key of this type: "string", "boolean" or "numeric".
+std::string_view keyValueType(CMPIType type) noexcept;
+
+// True for the NULL states (null value, not found).
+bool isNullData(const CMPIData& data) noexcept;
+
+// A UTF-16 code unit as UTF-8 (a lone surrogate becomes U+FFFD).
+std::string char16ToUtf8(CMPIChar16 unit);
+
+}  // namespace orv::cimxml

@@ -1,0 +1,58 @@
+// DSP0201 encoding of what providers return: instances, instance names and the path
+// forms the operation responses need, read through the CMPI function tables.
+#pragma once
+
+#include <cmpidt.h>
+#include <cmpift.h>
+
+#include <functional>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "orv/cimxml/xml_writer.hpp"
+
+namespace orv::cimxml {
+
+// What the encoder may know about a property from the class declaration.
+struct PropertyInfo {
+    std::string classOrigin;     // CLASSORIGIN when asked for
+    std::string referenceClass;  // REFERENCECLASS of reference properties
+    bool propagated = false;
+};
+
+// Declaration lookup: (class name, property name) -> info; nullopt when unknown.
+using PropertyLookup =
+    std::function<std::optional<PropertyInfo>(std::string_view className, std::string_view property)>;
+
+struct InstanceEncoding {
+    bool includeClassOrigin = false;
+    // Properties to keep (any case); nullopt keeps every property.
+    std::optional<std::vector<std::string>> propertyList;
+    PropertyLookup lookup;  // may be empty
+};
+
+// Where a path lacks a host or namespace, INSTANCEPATH uses these.
+struct PathDefaults {
+    std::string host;
+    std::string nameSpace;
+};
+
+// <INSTANCENAME CLASSNAME=...> with one KEYBINDING per key.
+void writeInstanceName(XmlWriter& out, const CMPIObjectPath* path);
+// <INSTANCEPATH><NAMESPACEPATH><HOST/><LOCALNAMESPACEPATH/></NAMESPACEPATH><INSTANCENAME/>.
+void writeInstancePath(XmlWriter& out, const CMPIObjectPath* path, const PathDefaults& defaults);
+// <VALUE.REFERENCE> with INSTANCEPATH when the path has a host, LOCALINSTANCEPATH when it
+// has only a namespace, else INSTANCENAME.
+void writeValueReference(XmlWriter& out, const CMPIObjectPath* path);
+// <INSTANCE CLASSNAME=...> with its properties.
+void writeInstance(XmlWriter& out, const CMPIInstance* instance, const InstanceEncoding& encoding);
+// The INSTANCE element alone, as text (the value of an embedded instance).
+std::string instanceText(const CMPIInstance* instance);
+
+// The class name of a path / an instance's path ("" when unknown).
+std::string pathClassName(const CMPIObjectPath* path);
+std::string instanceClassName(const CMPIInstance* instance);
+
+}  // namespace orv::cimxml

@@ -1,0 +1,40 @@
+// A small streaming XML writer: elements, attributes and escaped text into a string.
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace orv::cimxml {
+
+// Text with &, <, >, " and ' replaced by entity references, and characters that XML 1.0
+// cannot carry (control characters other than tab, line feed and carriage return)
+// written as character references so that a parser rejects nothing we send.
+std::string escapeXml(std::string_view text);
+
+class XmlWriter {
+public:
+    // Starts <name ...>; attributes may follow until content or close().
+    XmlWriter& open(std::string_view name);
+    XmlWriter& attr(std::string_view name, std::string_view value);
+    XmlWriter& text(std::string_view value);
+    // Closes the innermost open element ("/>" when it has no content).
+    XmlWriter& close();
+    // An element holding only text: <name>text</name>.
+    XmlWriter& leaf(std::string_view name, std::string_view value);
+    // Markup that is already well formed, copied as it is.
+    XmlWriter& raw(std::string_view markup);
+
+    std::size_t depth() const noexcept { return open_.size(); }
+    const std::string& str() const noexcept { return out_; }
+    std::string take();
+
+private:
+    void finishStartTag();
+
+    std::string out_;
+    std::vector<std::string> open_;
+    bool startTagPending_ = false;
+};
+
+}  // namespace orv::cimxml
