@@ -4,7 +4,9 @@
 
 using cmpibinding::dispatch;
 
-CmpiAssociationMI::CmpiAssociationMI(const CmpiBroker& mbp, const CmpiContext& ctx) : CmpiBaseMI(mbp, ctx) {}
+CmpiAssociationMI::CmpiAssociationMI(const CmpiBroker& mbp, const CmpiContext& ctx) : CmpiBaseMI(mbp, ctx) {
+    associationMI = this;
+}
 
 CmpiStatus CmpiAssociationMI::associators(const CmpiContext&, CmpiResult&, const CmpiObjectPath&, const char*,
                                           const char*, const char*, const char*, const char**) {

@@ -4,7 +4,9 @@
 
 using cmpibinding::dispatch;
 
-CmpiIndicationMI::CmpiIndicationMI(const CmpiBroker& mbp, const CmpiContext& ctx) : CmpiBaseMI(mbp, ctx) {}
+CmpiIndicationMI::CmpiIndicationMI(const CmpiBroker& mbp, const CmpiContext& ctx) : CmpiBaseMI(mbp, ctx) {
+    indicationMI = this;
+}
 
 CmpiStatus CmpiIndicationMI::authorizeFilter(const CmpiContext&, const CmpiSelectExp&, const char*,
                                              const CmpiObjectPath&, const char*) {

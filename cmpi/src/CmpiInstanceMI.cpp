@@ -4,7 +4,9 @@
 
 using cmpibinding::dispatch;
 
-CmpiInstanceMI::CmpiInstanceMI(const CmpiBroker& mbp, const CmpiContext& ctx) : CmpiBaseMI(mbp, ctx) {}
+CmpiInstanceMI::CmpiInstanceMI(const CmpiBroker& mbp, const CmpiContext& ctx) : CmpiBaseMI(mbp, ctx) {
+    instanceMI = this;
+}
 
 CmpiStatus CmpiInstanceMI::enumInstanceNames(const CmpiContext&, CmpiResult&, const CmpiObjectPath&) {
     return CmpiStatus(CMPI_RC_ERR_NOT_SUPPORTED);

@@ -2,7 +2,9 @@
 
 #include "Dispatch.h"
 
-CmpiMethodMI::CmpiMethodMI(const CmpiBroker& mbp, const CmpiContext& ctx) : CmpiBaseMI(mbp, ctx) {}
+CmpiMethodMI::CmpiMethodMI(const CmpiBroker& mbp, const CmpiContext& ctx) : CmpiBaseMI(mbp, ctx) {
+    methodMI = this;
+}
 
 CmpiStatus CmpiMethodMI::invokeMethod(const CmpiContext&, CmpiResult&, const CmpiObjectPath&, const char*,
                                       const CmpiArgs&, CmpiArgs&) {

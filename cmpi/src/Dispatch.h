@@ -4,7 +4,11 @@
 #ifndef ORV_CMPI_SRC_DISPATCH_H
 #define ORV_CMPI_SRC_DISPATCH_H
 
+#include <cmpi/CmpiAssociationMI.h>
 #include <cmpi/CmpiBaseMI.h>
+#include <cmpi/CmpiIndicationMI.h>
+#include <cmpi/CmpiInstanceMI.h>
+#include <cmpi/CmpiMethodMI.h>
 #include <cmpi/CmpiStatus.h>
 
 #include <exception>
@@ -22,6 +26,12 @@ inline CmpiBaseMI* providerOf(const void* hdl) {
 
 // Runs run() and answers what it returns; a thrown CmpiStatus becomes the
 // answer, any other exception is logged and answered with CMPI_RC_ERR_FAILED.
+// The interface of kind MI that the provider object serves, or null.
+inline CmpiInstanceMI* interfaceOf(CmpiInstanceMI*, const CmpiBaseMI& p) { return p.instanceInterface(); }
+inline CmpiAssociationMI* interfaceOf(CmpiAssociationMI*, const CmpiBaseMI& p) { return p.associationInterface(); }
+inline CmpiIndicationMI* interfaceOf(CmpiIndicationMI*, const CmpiBaseMI& p) { return p.indicationInterface(); }
+inline CmpiMethodMI* interfaceOf(CmpiMethodMI*, const CmpiBaseMI& p) { return p.methodInterface(); }
+
 template <class Run>
 CMPIStatus guarded(const char* miName, const char* operation, Run&& run) {
     try {
@@ -39,7 +49,7 @@ template <class MI, class Record, class Operation>
 CMPIStatus dispatch(Record* mi, const char* operation, Operation&& run) {
     const char* miName = mi->ft->miName;
     return guarded(miName, operation, [&]() -> CMPIStatus {
-        MI* provider = dynamic_cast<MI*>(providerOf(mi->hdl));
+        MI* provider = interfaceOf(static_cast<MI*>(nullptr), *providerOf(mi->hdl));
         if (provider == nullptr) {
             return failedStatus(miName, operation, "the provider does not serve this interface");
         }

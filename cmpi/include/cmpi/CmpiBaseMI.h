@@ -20,6 +20,10 @@
 #include <cmpift.h>
 
 class CmpiProviderBase;
+class CmpiInstanceMI;
+class CmpiAssociationMI;
+class CmpiIndicationMI;
+class CmpiMethodMI;
 
 class CmpiBaseMI {
 public:
@@ -54,10 +58,27 @@ public:
         return cleanupProvider(static_cast<const void*>(mi->hdl), mi->ft->miName, eCtx, terminating);
     }
 
+    // The interfaces this provider object serves; each MI base registers
+    // itself while it is built, so that the dispatchers find it whether the
+    // provider inherits it publicly or not. Null for an interface not served.
+    CmpiInstanceMI* instanceInterface() const { return instanceMI; }
+    CmpiAssociationMI* associationInterface() const { return associationMI; }
+    CmpiIndicationMI* indicationInterface() const { return indicationMI; }
+    CmpiMethodMI* methodInterface() const { return methodMI; }
+
 protected:
     CmpiBroker* broker;
 
 private:
+    friend class CmpiInstanceMI;
+    friend class CmpiAssociationMI;
+    friend class CmpiIndicationMI;
+    friend class CmpiMethodMI;
+    CmpiInstanceMI* instanceMI = nullptr;
+    CmpiAssociationMI* associationMI = nullptr;
+    CmpiIndicationMI* indicationMI = nullptr;
+    CmpiMethodMI* methodMI = nullptr;
+
     static CMPIStatus cleanupProvider(const void* hdl, const char* miName, const CMPIContext* eCtx,
                                       CMPIBoolean terminating);
     CmpiProviderBase* providerBase;
