@@ -144,12 +144,17 @@ ethtool_ringparam EthtoolReader::rings() const
 
 std::uint32_t EthtoolReader::messageLevel() const
 {
-    return simple<ethtool_value>(ETHTOOL_GMSGLVL, "ETHTOOL_GMSGLVL").data;
+    return value(ETHTOOL_GMSGLVL, "ETHTOOL_GMSGLVL");
 }
 
 bool EthtoolReader::linkDetected() const
 {
-    return simple<ethtool_value>(ETHTOOL_GLINK, "ETHTOOL_GLINK").data != 0;
+    return value(ETHTOOL_GLINK, "ETHTOOL_GLINK") != 0;
+}
+
+std::uint32_t EthtoolReader::value(std::uint32_t command, const char* name) const
+{
+    return simple<ethtool_value>(command, name).data;
 }
 
 std::vector<std::uint8_t> EthtoolReader::permanentAddress() const

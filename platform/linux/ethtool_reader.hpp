@@ -54,6 +54,8 @@ public:
     ethtool_ringparam rings() const;
     std::uint32_t messageLevel() const;
     bool linkDetected() const;
+    // A legacy on/off query answered in an ethtool_value (ETHTOOL_GRXCSUM, ...).
+    std::uint32_t value(std::uint32_t command, const char* name) const;
     // The burnt-in address; empty when the driver reports none.
     std::vector<std::uint8_t> permanentAddress() const;
     // The driver's own counters (string set ETH_SS_STATS) with their names.

@@ -1,0 +1,68 @@
+// The Linux substitute: every platform area answered by the running machine.
+#pragma once
+
+#include "ethtool_channel.hpp"
+#include "linux_ksi.hpp"
+#include "os_version.hpp"
+
+#include "orv/platform/backend/Backend.h"
+
+#include <memory>
+
+namespace orv::linuxhost {
+
+// The physical NICs: net devices with a bus device, in interface-index order.
+class LinuxNetwork final : public orv::platform::NetworkBackend {
+public:
+    LinuxNetwork(std::string sysRoot, std::shared_ptr<EthtoolChannel> channel);
+    std::vector<NodeMgr::Network::Pnic*> getPnics() override;
+    NodeMgr::Network::Pnic* getPnicByName(const std::string& name) override;
+
+private:
+    std::string sysRoot_;
+    std::shared_ptr<EthtoolChannel> channel_;
+};
+
+// Version record from os-release and uname; host type from configuration.
+class LinuxVersion final : public orv::platform::VersionBackend {
+public:
+    LinuxVersion(std::string root, bool hypervisorKernel);
+    TmkuserStatus_Code getSystemVersion(TmkuserVersion_SystemVersionInfo& info) override;
+    int codeToErrno(TmkuserStatus_Code code) override;
+    std::string codeToString(TmkuserStatus_Code code) override;
+    bool osIsTmk() override;
+
+private:
+    std::string root_;
+    bool hypervisorKernel_;
+};
+
+class LinuxHost final : public orv::platform::HostBackend {
+public:
+    bool fqdn(std::string& out) override;
+    bool hostName(std::string& out) override;
+    int sysInfo(struct sysinfo& out) override;
+};
+
+void fillVersionRecord(const SystemVersion& version, TmkuserVersion_SystemVersionInfo& info);
+// "1", "true", "yes" (any case) switch the hypervisor-kernel host type on.
+bool parseHostTypeSetting(const char* value);
+
+class LinuxBackend final : public orv::platform::Backend {
+public:
+    LinuxBackend(LinuxRoots roots, std::string fileRoot, bool hypervisorKernel);
+    const char* name() const override { return "linux"; }
+    void beginBatch() override { ksi_.invalidate(); }
+    orv::platform::NetworkBackend& network() override { return network_; }
+    orv::platform::KsiBackend& ksi() override { return ksi_; }
+    orv::platform::VersionBackend& version() override { return version_; }
+    orv::platform::HostBackend& host() override { return host_; }
+
+private:
+    LinuxNetwork network_;
+    LinuxKsi ksi_;
+    LinuxVersion version_;
+    LinuxHost host_;
+};
+
+}  // namespace orv::linuxhost
