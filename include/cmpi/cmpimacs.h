@@ -94,9 +94,9 @@ static inline void cmpi_macro_set_status_chars(const CMPIBroker* mb, CMPIStatus*
 #define CMNewDateTimeFromChars(b, d, rc) ((b)->eft->newDateTimeFromChars((b), (d), (rc)))
 #define CMNewSelectExp(b, q, l, p, rc) ((b)->eft->newSelectExp((b), (q), (l), (p), (rc)))
 #define CMClassPathIsA(b, p, pn, rc) ((b)->eft->classPathIsA((b), (p), (pn), (rc)))
-#define CDToString(b, o, rc) ((b)->eft->toString((b), (void*)(o), (rc)))
-#define CDIsOfType(b, o, t, rc) ((b)->eft->isOfType((b), (void*)(o), (t), (rc)))
-#define CDGetType(b, o, rc) ((b)->eft->getType((b), (void*)(o), (rc)))
+#define CDToString(b, o, rc) ((b)->eft->toString((b), (const void*)(o), (rc)))
+#define CDIsOfType(b, o, t, rc) ((b)->eft->isOfType((b), (const void*)(o), (t), (rc)))
+#define CDGetType(b, o, rc) ((b)->eft->getType((b), (const void*)(o), (rc)))
 #define CMLogMessage(b, severity, id, text, string) \
     ((b)->eft->logMessage((b), (severity), (id), (text), (string)))
 #define CMTraceMessage(b, level, component, text, string) \
