@@ -61,7 +61,8 @@ std::vector<CmpiObjectPath> farEnds(const std::vector<Reference>& refs, const Cm
                                     const char* role, const char* resultRole) {
     std::vector<CmpiObjectPath> ends;
     if (!absent(resultRole)) {
-        if (const Reference* atResultRole = named(refs, resultRole)) ends.push_back(atResultRole->path);
+        const Reference* atResultRole = named(refs, resultRole);
+        if (atResultRole != nullptr && !(atResultRole->path == source)) ends.push_back(atResultRole->path);
         return ends;
     }
     for (const Reference& ref : refs) {

@@ -33,8 +33,9 @@ std::vector<Reference> referencesOf(const CmpiInstance& inst);
 // otherwise whether the property named role is a reference equal to source.
 bool sourceAtRole(const std::vector<Reference>& refs, const CmpiObjectPath& source, const char* role);
 
-// The far ends: the reference named resultRole when given, otherwise every
-// reference other than the one named role and those equal to the source.
+// The far ends: the reference named resultRole when given (unless it is the
+// source itself), otherwise every reference other than the one named role
+// and those equal to the source.
 std::vector<CmpiObjectPath> farEnds(const std::vector<Reference>& refs, const CmpiObjectPath& source,
                                     const char* role, const char* resultRole);
 

@@ -1,0 +1,17 @@
+#!/usr/bin/env bash
+# Checks that a provider library depends at load time only on the C library,
+# the C++ runtime and the sanitizer runtimes of a sanitizer build: every
+# undefined dynamic symbol must carry a GLIBC, GLIBCXX, CXXABI or GCC version,
+# be weak, or belong to a sanitizer runtime. Prints offenders and fails.
+set -euo pipefail
+lib=$1
+offenders=$(nm -D --undefined-only "$lib" |
+  awk '$1 != "w" && $1 != "v" { print $NF }' |
+  grep -Ev '@(GLIBC|GLIBCXX|CXXABI|GCC)_[0-9.]+$' |
+  grep -Ev '^__(asan|ubsan|tsan|lsan|sanitizer)_' || true)
+if [ -n "$offenders" ]; then
+  echo "undefined symbols outside the C library and the C++ runtime in $lib:"
+  echo "$offenders"
+  exit 1
+fi
+echo "$lib: no undefined symbols beyond the C library and the C++ runtime"
