@@ -5,7 +5,8 @@
 # be weak, or belong to a sanitizer runtime. Prints offenders and fails.
 set -euo pipefail
 lib=$1
-offenders=$(nm -D --undefined-only "$lib" |
+symbols=$(nm -D --undefined-only "$lib")
+offenders=$(echo "$symbols" |
   awk '$1 != "w" && $1 != "v" { print $NF }' |
   grep -Ev '@(GLIBC|GLIBCXX|CXXABI|GCC)_[0-9.]+$' |
   grep -Ev '^__(asan|ubsan|tsan|lsan|sanitizer)_' || true)
