@@ -1,0 +1,136 @@
+// The sysfs readers on a sysfs tree written out by the test: a NIC on a PCI bus
+// behind a virtio device, a virtual device without a bus, and a CPU topology.
+#include "cpu_topology.hpp"
+#include "linux_call_error.hpp"
+#include "sysfs_net.hpp"
+
+#include <filesystem>
+#include <fstream>
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+using namespace orv::linuxhost;
+namespace fs = std::filesystem;
+
+namespace {
+
+class SysfsTree : public ::testing::Test {
+protected:
+    void SetUp() override
+    {
+        root_ = fs::temp_directory_path() / ("orv-sysfs-" + std::to_string(::getpid()));
+        fs::remove_all(root_);
+        buildNet();
+        buildCpus();
+    }
+    void TearDown() override { fs::remove_all(root_); }
+
+    void write(const fs::path& file, const std::string& text)
+    {
+        fs::create_directories(file.parent_path());
+        std::ofstream(file) << text;
+    }
+    void link(const fs::path& target, const fs::path& at)
+    {
+        fs::create_directories(at.parent_path());
+        fs::create_symlink(target, at);
+    }
+    void netDevice(const fs::path& dir, const std::string& index, const std::string& mtu)
+    {
+        write(dir / "ifindex", index + "\n");
+        write(dir / "flags", "0x1003\n");
+        write(dir / "mtu", mtu + "\n");
+        write(dir / "operstate", "up\n");
+        write(dir / "carrier", "1\n");
+        write(dir / "address", "02:fc:00:00:00:01\n");
+        write(dir / "speed", "-1\n");
+        write(dir / "duplex", "unknown\n");
+    }
+    void buildNet()
+    {
+        const fs::path pci = root_ / "devices/pci0000:00/0000:00:03.0";
+        write(pci / "vendor", "0x1af4\n");
+        write(pci / "device", "0x1000\n");
+        link(root_ / "bus/pci", pci / "subsystem");
+        const fs::path virtio = pci / "virtio2";
+        write(virtio / "vendor", "0x1af4\n");
+        link(root_ / "bus/virtio", virtio / "subsystem");
+        netDevice(virtio / "net/eth0", "4", "1400");
+        link(virtio, virtio / "net/eth0/device");
+        link(virtio / "net/eth0", root_ / "class/net/eth0");
+        netDevice(root_ / "devices/virtual/net/veth0", "2", "1500");
+        link(root_ / "devices/virtual/net/veth0", root_ / "class/net/veth0");
+    }
+    void buildCpus()
+    {
+        const fs::path cpus = root_ / "devices/system/cpu";
+        write(cpus / "online", "0-5,7\n");
+        // two packages; package 1 holds CPUs 0,1 (one core, two threads) and 4; package 0 holds 2,3,5,7
+        const std::vector<std::tuple<int, int, std::string>> layout = {
+            {0, 1, "0-1"}, {1, 1, "0-1"}, {2, 0, "2,5"}, {3, 0, "3"}, {4, 1, "4"}, {5, 0, "2,5"}, {7, 0, "7"}};
+        for (const auto& [cpu, package, siblings] : layout) {
+            const fs::path topology = cpus / ("cpu" + std::to_string(cpu)) / "topology";
+            write(topology / "physical_package_id", std::to_string(package) + "\n");
+            write(topology / "thread_siblings_list", siblings + "\n");
+        }
+    }
+
+    fs::path root_;
+};
+
+}  // namespace
+
+TEST_F(SysfsTree, NicsAreTheDevicesWithABusDevice)
+{
+    SysfsNet sysfs(root_.string());
+    EXPECT_EQ(sysfs.allDevices(), (std::vector<std::string>{"veth0", "eth0"}));  // interface-index order
+    EXPECT_EQ(sysfs.busDevices(), std::vector<std::string>{"eth0"});
+    EXPECT_FALSE(sysfs.hasBusDevice("veth0"));
+}
+
+TEST_F(SysfsTree, PciFunctionIsTheNearestPciAncestor)
+{
+    SysfsNet sysfs(root_.string());
+    auto pci = sysfs.pciDevice("eth0");
+    ASSERT_TRUE(pci);
+    EXPECT_EQ(pci->address.segment, 0);
+    EXPECT_EQ(pci->address.bus, 0);
+    EXPECT_EQ(pci->address.slot, 3);
+    EXPECT_EQ(pci->address.function, 0);
+    EXPECT_EQ(pci->vendorId, 0x1af4);
+    EXPECT_EQ(pci->deviceId, 0x1000);  // the PCI function's, not the virtio device's
+    EXPECT_FALSE(sysfs.pciDevice("veth0"));
+}
+
+TEST_F(SysfsTree, LinkAttributesAndAVanishedDevice)
+{
+    SysfsNet sysfs(root_.string());
+    auto link = sysfs.linkAttributes("eth0");
+    EXPECT_EQ(link.ifindex, 4);
+    EXPECT_EQ(link.mtu, 1400u);
+    EXPECT_EQ(link.flags, 0x1003u);
+    EXPECT_EQ(link.operstate, "up");
+    EXPECT_EQ(link.carrier, true);
+    EXPECT_EQ(link.speed, -1);
+    EXPECT_EQ(link.address, "02:fc:00:00:00:01");
+    fs::remove_all(root_ / "devices/pci0000:00/0000:00:03.0/virtio2/net/eth0");
+    try {
+        sysfs.linkAttributes("eth0");
+        FAIL() << "a vanished device must not answer";
+    } catch (const LinuxCallError& error) {
+        EXPECT_TRUE(error.vanished());
+    }
+    EXPECT_TRUE(sysfs.busDevices().empty());
+}
+
+TEST_F(SysfsTree, PackagesCoresAndCpuOrder)
+{
+    auto topology = readCpuTopology(root_.string());
+    ASSERT_EQ(topology.packages.size(), 2u);
+    EXPECT_EQ(topology.packages[0].packageId, 0u);
+    ASSERT_EQ(topology.packages[0].cores.size(), 3u);  // {2,5} {3} {7}
+    EXPECT_EQ(topology.packages[0].cores[0].cpus, (std::vector<unsigned>{2, 5}));
+    ASSERT_EQ(topology.packages[1].cores.size(), 2u);  // {0,1} {4}
+    EXPECT_EQ(topology.cpuOrder(), (std::vector<unsigned>{2, 3, 7, 0, 4, 1, 5}));
+    EXPECT_EQ(topology.coreCount(), 5u);
+}
