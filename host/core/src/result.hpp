@@ -20,5 +20,6 @@ struct ResultSink {
 };
 
 // A caller-owned result feeding `sink`; free it with disposeObject.
+CMPIResult* newResult(ResultSink& sink);
 
 }  // namespace orv::host::detail

@@ -41,7 +41,8 @@ std::size_t scalarWidth(CMPIType type) noexcept {
     }
 }
 
-// Encapsulated types whose member a stored value owns.
+}  // namespace
+
 bool ownsMember(CMPIType type) noexcept {
     if ((type & CMPI_ARRAY) != 0) {
         return true;
@@ -59,6 +60,8 @@ bool ownsMember(CMPIType type) noexcept {
         return false;
     }
 }
+
+namespace {
 
 // A Parent-owned copy of an encapsulated input object, or nullptr when the
 // object is not one of ours of that type.

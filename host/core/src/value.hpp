@@ -42,6 +42,8 @@ inline CMPIType storedType(CMPIType type) noexcept {
     return type;
 }
 bool isKnownType(CMPIType type) noexcept;
+// Whether a stored value of this type owns an encapsulated member.
+bool ownsMember(CMPIType type) noexcept;
 
 struct NamedValue {
     std::string name;

@@ -1,0 +1,121 @@
+#include "core.hpp"
+
+#include <algorithm>
+#include <stdexcept>
+
+#include "broker_tables.hpp"
+#include "instance.hpp"
+#include "names.hpp"
+#include "qualifier_data.hpp"
+
+namespace orv::host::detail {
+
+namespace {
+
+namespace fs = std::filesystem;
+namespace repo = orv::repository;
+
+// MOF files of a path: the file itself, or a directory's *.mof in name order.
+std::vector<fs::path> mofFiles(const fs::path& path) {
+    if (!fs::is_directory(path)) {
+        return {path};
+    }
+    std::vector<fs::path> files;
+    for (const auto& item : fs::directory_iterator(path)) {
+        if (item.path().extension() == ".mof") {
+            files.push_back(item.path());
+        }
+    }
+    std::sort(files.begin(), files.end());
+    return files;
+}
+
+}  // namespace
+
+CoreServices::CoreServices(const CoreConfig& config) : broker_(makeBroker(this)) {
+    try {
+        for (const fs::path& path : config.mofPaths) {
+            for (const fs::path& file : mofFiles(path)) {
+                repository_.loadFile(file, config.mofNamespace);
+            }
+        }
+        for (const fs::path& file : config.registrationFiles) {
+            registrationSets_.push_back(repo::RegistrationSet::parseFile(file));
+        }
+    } catch (const repo::ParseError& error) {
+        throw std::runtime_error(error.what());
+    }
+    for (const auto& set : registrationSets_) {
+        for (const auto& reg : set.all()) {
+            registrations_.push_back(&reg);
+        }
+    }
+    loader_ = std::make_unique<ProviderLoader>(config.providerDirs, &broker_);
+}
+
+CoreServices::~CoreServices() { loader_->shutdown(); }
+
+const std::vector<std::string>* CoreServices::keyNames(std::string_view ns, std::string_view className) const {
+    std::string cacheKey = lowerCase(ns) + ":" + lowerCase(className);
+    std::lock_guard lock(keyMutex_);
+    auto found = keyCache_.find(cacheKey);
+    if (found == keyCache_.end()) {
+        std::unique_ptr<std::vector<std::string>> names;
+        if (repository_.getClass(ns, className) != nullptr) {
+            names = std::make_unique<std::vector<std::string>>(repository_.keyNames(ns, className));
+        }
+        found = keyCache_.emplace(cacheKey, std::move(names)).first;
+    }
+    return found->second.get();
+}
+
+CMPIData CoreServices::qualifier(std::string_view ns, std::string_view className, char elementKind,
+                                 std::string_view element, std::string_view qualifierName, CMPIrc* rc) const {
+    const repo::ClassDecl* cls = repository_.getClass(ns, className);
+    if (cls == nullptr) {
+        *rc = CMPI_RC_ERR_INVALID_CLASS;
+        return nullData();
+    }
+    const repo::QualifierList* list = qualifierList(*cls, elementKind, element);
+    const repo::Qualifier* found = list != nullptr ? list->find(qualifierName) : nullptr;
+    if (found == nullptr) {
+        *rc = list == nullptr ? CMPI_RC_ERR_NO_SUCH_PROPERTY : CMPI_RC_ERR_NOT_FOUND;
+        return nullData();
+    }
+    return qualifierData(*found, rc);
+}
+
+bool CoreServices::isA(std::string_view ns, std::string_view className, std::string_view ancestor) const {
+    return equalsNoCase(className, ancestor) || repository_.isA(ns, className, ancestor);
+}
+
+std::uint64_t CoreServices::addSubscriber(IndicationSubscriber subscriber) {
+    std::lock_guard lock(subscriberMutex_);
+    std::uint64_t id = nextSubscriber_++;
+    subscribers_.emplace(id, std::make_shared<IndicationSubscriber>(std::move(subscriber)));
+    return id;
+}
+
+void CoreServices::removeSubscriber(std::uint64_t id) {
+    std::lock_guard lock(subscriberMutex_);
+    subscribers_.erase(id);
+}
+
+CMPIStatus CoreServices::deliver(const char* ns, const CMPIInstance* indication) {
+    if (instanceImpl(indication) == nullptr) {
+        return makeStatus(CMPI_RC_ERR_INVALID_PARAMETER, "deliverIndication needs a live instance");
+    }
+    std::vector<std::shared_ptr<IndicationSubscriber>> targets;
+    {
+        std::lock_guard lock(subscriberMutex_);
+        for (const auto& [id, subscriber] : subscribers_) {
+            targets.push_back(subscriber);
+        }
+    }
+    for (const auto& subscriber : targets) {
+        (*subscriber)(ns != nullptr ? ns : "", indication);
+    }
+    return okStatus();
+}
+
+}  // namespace orv::host::detail

@@ -1,0 +1,128 @@
+// The core's internal services: class repository, registrations, loader,
+// routing and indication subscribers. BrokerCore (the client API) and the
+// broker's up-calls both send requests through dispatch().
+#pragma once
+
+#include <cmpidt.h>
+#include <cmpift.h>
+
+#include <map>
+#include <memory>
+#include <mutex>
+#include <string>
+#include <vector>
+
+#include "class_source.hpp"
+#include "loader.hpp"
+#include "orv/host/broker_core.hpp"
+#include "orv/repository/class_repository.hpp"
+#include "orv/repository/registration.hpp"
+#include "result.hpp"
+
+namespace orv::host::detail {
+
+enum class Op : std::uint8_t {
+    EnumerateInstances,
+    EnumerateInstanceNames,
+    GetInstance,
+    CreateInstance,
+    ModifyInstance,
+    DeleteInstance,
+    ExecQuery,
+    Associators,
+    AssociatorNames,
+    References,
+    ReferenceNames,
+    InvokeMethod,
+};
+
+// Who asks, as carried by the MI call's context.
+struct Caller {
+    std::string principal;
+    std::string role;
+    CMPIFlags flags = 0;
+    CMPIUint32 sessionId = 0;
+};
+
+struct Request {
+    Op op = Op::EnumerateInstances;
+    const CMPIObjectPath* path = nullptr;
+    const CMPIInstance* instance = nullptr;
+    const char** properties = nullptr;
+    const char* assocClass = nullptr;   // associators/associatorNames
+    const char* resultClass = nullptr;  // for references: the association class
+    const char* role = nullptr;
+    const char* resultRole = nullptr;
+    const char* query = nullptr;
+    const char* lang = nullptr;
+    const char* method = nullptr;
+    const CMPIArgs* in = nullptr;
+    CMPIArgs* out = nullptr;
+    Caller caller;
+};
+
+struct Outcome {
+    CMPIrc rc = CMPI_RC_OK;
+    std::string message;
+    unsigned calls = 0;
+};
+
+// A provider registration chosen for a request, and the class name the MI is
+// called with.
+struct Target {
+    const ProviderRegistration* reg = nullptr;
+    std::string className;
+};
+
+class CoreServices final : public ClassSource {
+public:
+    explicit CoreServices(const CoreConfig& config);
+    ~CoreServices() override;
+    CoreServices(const CoreServices&) = delete;
+    CoreServices& operator=(const CoreServices&) = delete;
+
+    const CMPIBroker* broker() const noexcept { return &broker_; }
+    const orv::repository::ClassRepository& classes() const noexcept { return repository_; }
+
+    Outcome dispatch(const Request& request, ResultSink& sink);
+    Outcome filterControl(std::string_view ns, std::string_view query, std::string_view lang, const Caller& caller,
+                          bool activate);
+    Outcome indicationSwitch(std::string_view ns, std::string_view className, bool enable);
+
+    std::uint64_t addSubscriber(IndicationSubscriber subscriber);
+    void removeSubscriber(std::uint64_t id);
+    CMPIStatus deliver(const char* ns, const CMPIInstance* indication);
+
+    ProviderLoader& loader() noexcept { return *loader_; }
+
+    // ClassSource
+    const std::vector<std::string>* keyNames(std::string_view ns, std::string_view className) const override;
+    CMPIData qualifier(std::string_view ns, std::string_view className, char elementKind, std::string_view element,
+                       std::string_view qualifierName, CMPIrc* rc) const override;
+    bool isA(std::string_view ns, std::string_view className, std::string_view ancestor) const override;
+
+private:
+    std::vector<Target> targets(std::string_view ns, std::string_view className, ProviderKind kind,
+                                bool withSubclasses) const;
+    std::vector<Target> associationTargets(std::string_view ns, const char* filterClass) const;
+    std::vector<const ProviderRegistration*> registrationsFor(std::string_view ns, std::string_view className,
+                                                              ProviderKind kind) const;
+    Outcome callTargets(const std::vector<Target>& targets, ProviderKind kind, const Request& request,
+                        ResultSink& sink);
+    Outcome noTarget(std::string_view ns, std::string_view className) const;
+
+    orv::repository::ClassRepository repository_;
+    std::vector<orv::repository::RegistrationSet> registrationSets_;
+    std::vector<const ProviderRegistration*> registrations_;
+    CMPIBroker broker_;
+    std::unique_ptr<ProviderLoader> loader_;
+
+    mutable std::mutex keyMutex_;
+    mutable std::map<std::string, std::unique_ptr<std::vector<std::string>>> keyCache_;
+
+    std::mutex subscriberMutex_;
+    std::map<std::uint64_t, std::shared_ptr<IndicationSubscriber>> subscribers_;
+    std::uint64_t nextSubscriber_ = 1;
+};
+
+}  // namespace orv::host::detail

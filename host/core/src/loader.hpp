@@ -1,0 +1,84 @@
+// The provider loader: libraries found in the provider directories, MIs made
+// by the factories sfcb looks up, one MI per provider name and kind, created
+// on first use; cleanup and unloading.
+#pragma once
+
+#include <cmpidt.h>
+#include <cmpift.h>
+
+#include <filesystem>
+#include <map>
+#include <memory>
+#include <mutex>
+#include <string>
+#include <vector>
+
+#include "orv/repository/registration.hpp"
+
+namespace orv::host::detail {
+
+using orv::repository::ProviderKind;
+using orv::repository::ProviderRegistration;
+
+// One loaded (or failed) library.
+struct ProviderLibrary {
+    std::string location;
+    std::string path;  // where it was found
+    void* handle = nullptr;
+    std::string error;  // dlerror text when loading failed
+    bool keepLoaded = false;  // a cleanup refused unloading for good
+};
+
+// An MI of one provider and kind, or why there is none.
+struct LoadedMI {
+    void* mi = nullptr;  // CMPIInstanceMI*, CMPIAssociationMI*, ...
+    std::string error;   // non-empty: creating it failed
+};
+
+struct ProviderEntry {
+    std::string name;
+    std::string location;
+    std::string parameters;
+    bool unloadNever = false;
+    std::map<ProviderKind, LoadedMI> mis;
+    bool indicationsEnabled = false;
+    unsigned activeFilters = 0;
+};
+
+class ProviderLoader {
+public:
+    ProviderLoader(std::vector<std::filesystem::path> dirs, const CMPIBroker* broker);
+    ~ProviderLoader();
+    ProviderLoader(const ProviderLoader&) = delete;
+    ProviderLoader& operator=(const ProviderLoader&) = delete;
+
+    // The MI of the registration's provider for `kind`, created on first use.
+    // On failure: nullptr and `error` holds the reason (with dlerror's text).
+    void* mi(const ProviderRegistration& reg, ProviderKind kind, std::string* error);
+    // The provider's record (after mi() succeeded once), for indication state.
+    ProviderEntry* provider(const std::string& name);
+
+    // cleanup(terminating = false) on every idle provider library; see BrokerCore.
+    unsigned unloadIdle();
+    // disableIndications, cleanup(true) once per library and kind, dlclose.
+    void shutdown();
+    std::vector<std::string> loadedLibraries() const;
+
+private:
+    ProviderLibrary& library(const std::string& location);
+    LoadedMI create(ProviderEntry& entry, ProviderLibrary& lib, ProviderKind kind);
+    std::string findLibrary(const std::string& location) const;
+
+    std::vector<std::filesystem::path> dirs_;
+    const CMPIBroker* broker_;
+    mutable std::recursive_mutex mutex_;
+    std::vector<std::unique_ptr<ProviderLibrary>> libraries_;  // load order
+    std::map<std::string, std::unique_ptr<ProviderEntry>> providers_;
+    std::vector<std::string> order_;  // provider names in creation order
+    bool shutDown_ = false;
+};
+
+// Name of a kind as the factory symbols spell it ("Instance", "Association", ...).
+const char* kindName(ProviderKind kind) noexcept;
+
+}  // namespace orv::host::detail
