@@ -1,0 +1,57 @@
+// Injected failures of a simulated host. A rule names a call and optionally a
+// kernel node, a parameter, a NIC and which matching invocation fails (the
+// Nth, counted from 1); without nth every matching invocation fails.
+#pragma once
+
+#include <atomic>
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace orv::platform::sim {
+
+struct FaultRule {
+    std::string call;
+    std::optional<std::string> node;
+    std::optional<std::string> param;
+    std::optional<std::string> nic;
+    std::optional<uint64_t> nth;
+    std::optional<int64_t> status;
+    std::string message;
+};
+
+// What an invocation is, for matching against the rules.
+struct CallSite {
+    std::string_view call;
+    std::string_view node;                   // empty when the call reads no node
+    const std::vector<std::string>* params;  // parameters of the invocation, may be null
+    std::string_view nic;                    // empty when not a NIC operation
+};
+
+class FaultTable {
+public:
+    FaultTable() = default;
+    explicit FaultTable(std::vector<FaultRule> rules);
+    FaultTable(FaultTable&& other) noexcept = default;
+    FaultTable& operator=(FaultTable&& other) noexcept = default;
+
+    // The first rule that fires for this invocation, or null. Every matching
+    // rule counts the invocation, fired or not.
+    const FaultRule* fire(const CallSite& site) const;
+
+    const std::vector<FaultRule>& rules() const { return rules_; }
+
+private:
+    std::vector<FaultRule> rules_;
+    std::unique_ptr<std::atomic<uint64_t>[]> hits_;
+};
+
+// Every call name a rule may give.
+bool isKnownCall(std::string_view call);
+// True for the KSI calls that read a node (a rule for them may name one).
+bool callReadsNode(std::string_view call);
+
+} // namespace orv::platform::sim
