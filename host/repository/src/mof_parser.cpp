@@ -43,10 +43,15 @@ private:
     [[noreturn]] void fail(const std::string& message) const {
         throw MofError(lexer_.fileName(), tok_.line, message);
     }
-    void advance() { tok_ = lexer_.next(); }
+    void advance() {
+        previousLine_ = tok_.line;
+        tok_ = lexer_.next();
+    }
+    // A missing closing token is reported on the line of what it should follow.
     void expectPunct(char c, std::string_view where) {
         if (!tok_.isPunct(c)) {
-            fail(std::string("expected '") + c + "' " + std::string(where));
+            throw MofError(lexer_.fileName(), previousLine_,
+                           std::string("expected '") + c + "' " + std::string(where));
         }
         advance();
     }
@@ -422,6 +427,7 @@ private:
 
     Lexer lexer_;
     Token tok_;
+    int previousLine_ = 1;
 };
 
 }  // namespace

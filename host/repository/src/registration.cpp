@@ -46,7 +46,7 @@ public:
 
     std::vector<ProviderRegistration> read(std::string_view source) {
         std::size_t pos = 0;
-        while (pos <= source.size() && !(pos == source.size() && !source.empty())) {
+        while (pos < source.size()) {
             const auto end = std::min(source.find('\n', pos), source.size());
             ++line_;
             handleLine(text::trim(source.substr(pos, end - pos)));
