@@ -158,4 +158,8 @@ void HttpServer::stop() {
     impl_->server.stop();
 }
 
+bool HttpServer::running() const noexcept {
+    return impl_->server.is_running();
+}
+
 }  // namespace orv::http

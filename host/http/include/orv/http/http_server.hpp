@@ -66,8 +66,11 @@ public:
     int port() const noexcept;
     // Serves until stop(); returns after the requests in flight have been answered.
     void run();
-    // Stops accepting connections; callable from any thread.
+    // Stops accepting connections; callable from any thread. Has no effect before
+    // run() has started listening (see running()).
     void stop();
+    // True while run() is listening.
+    bool running() const noexcept;
 
     struct Impl;
 

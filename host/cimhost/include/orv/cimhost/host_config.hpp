@@ -1,0 +1,65 @@
+// Configuration of orv-cimhost: defaults for the build tree, a configuration file of
+// "key: value" lines in the style of sfcb.cfg, and command-line overrides.
+#pragma once
+
+#include <chrono>
+#include <cstddef>
+#include <filesystem>
+#include <stdexcept>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace orv::cimhost {
+
+enum class LogLevel { Error, Warning, Info, Debug };
+
+struct HostConfig {
+    std::string listenAddress = "127.0.0.1";
+    int httpPort = 5988;
+    std::vector<std::filesystem::path> providerDirs;
+    std::vector<std::filesystem::path> registrationFiles;
+    std::vector<std::filesystem::path> mofFiles;  // files, or folders of *.mof files
+    std::string mofNamespace = "root/cimv2";
+    std::string platform;                // sim | linux; empty: the environment decides
+    std::filesystem::path fixture;       // simulated host description (sim)
+    LogLevel logLevel = LogLevel::Info;
+    std::filesystem::path credentialsFile;  // basic authentication when set
+    std::size_t maxRequestBytes = 4U << 20U;
+    std::chrono::seconds readTimeout{30};
+    std::chrono::seconds writeTimeout{30};
+    std::chrono::seconds keepAliveTimeout{5};
+    std::size_t keepAliveMaxRequests = 100;
+    std::size_t threads = 8;
+    std::string hostName;  // HOST of instance paths in responses; empty: this machine's name
+};
+
+// Bad configuration input; what() is one line naming the file and line or the option.
+class ConfigError : public std::runtime_error {
+public:
+    using std::runtime_error::runtime_error;
+};
+
+// Defaults of a build tree: provider libraries from its lib folder, the project's
+// registration file and MOF from the source tree.
+HostConfig defaultConfig();
+
+// Sets one key ("httpPort", "providerDirs", ...) from its text; relative paths are
+// taken from `baseDir`. List keys take whitespace-separated items and replace the list.
+void applyConfigValue(HostConfig& config, std::string_view key, std::string_view value,
+                      const std::filesystem::path& baseDir);
+// Reads a configuration file into `config`; throws ConfigError ("file:line: message").
+void loadConfigFile(HostConfig& config, const std::filesystem::path& file);
+
+struct CommandLine {
+    HostConfig config;
+    bool showHelp = false;
+};
+// Defaults, then --config FILE, then the other options in order; throws ConfigError.
+CommandLine parseCommandLine(int argc, const char* const* argv);
+// The usage text listing every option and its configuration key.
+std::string usageText();
+
+std::string_view logLevelName(LogLevel level) noexcept;
+
+}  // namespace orv::cimhost

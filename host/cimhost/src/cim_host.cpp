@@ -1,0 +1,128 @@
+#include "orv/cimhost/cim_host.hpp"
+
+#include <unistd.h>
+
+#include <chrono>
+#include <stdexcept>
+#include <thread>
+
+#include "orv/cimhost/cim_dispatcher.hpp"
+#include "orv/cimhost/cim_http_handler.hpp"
+#include "orv/cimhost/log.hpp"
+#include "orv/host/broker_core.hpp"
+#include "orv/http/http_server.hpp"
+#include "startup_checks.hpp"
+
+namespace orv::cimhost {
+
+namespace fs = std::filesystem;
+
+struct CimHost::Impl {
+    repository::ClassRepository classes;
+    std::unique_ptr<host::BrokerCore> core;
+    std::unique_ptr<CimDispatcher> dispatcher;
+    std::unique_ptr<http::HttpServer> server;
+    std::atomic<bool> stopRequested{false};
+    std::atomic<bool> runEntered{false};
+    std::atomic<bool> runFinished{false};
+};
+
+namespace {
+
+std::string machineName() {
+    char buffer[256] = {};
+    if (gethostname(buffer, sizeof buffer - 1) != 0 || buffer[0] == '\0') {
+        return "localhost";
+    }
+    return buffer;
+}
+
+http::ServerOptions serverOptions(const HostConfig& config) {
+    http::ServerOptions options;
+    options.address = config.listenAddress;
+    options.port = config.httpPort;
+    options.threads = config.threads;
+    options.maxRequestBytes = config.maxRequestBytes;
+    options.readTimeout = config.readTimeout;
+    options.writeTimeout = config.writeTimeout;
+    options.keepAliveTimeout = config.keepAliveTimeout;
+    options.keepAliveMaxRequests = config.keepAliveMaxRequests;
+    if (!config.credentialsFile.empty()) {
+        options.credentials = http::Credentials::loadFile(config.credentialsFile);
+    }
+    return options;
+}
+
+void logRequest(const http::Request& request, const http::Response& response) {
+    if (!logEnabled(LogLevel::Debug)) {
+        return;
+    }
+    const std::string* method = request.header("CIMMethod");
+    logLine(LogLevel::Debug, request.method + " " + request.path + " " + (method ? *method : std::string("-")) +
+                                 " -> " + std::to_string(response.status) + " (" +
+                                 std::to_string(response.body.size()) + " bytes)");
+}
+
+host::CoreConfig coreConfig(const HostConfig& config) {
+    host::CoreConfig core;
+    core.providerDirs = config.providerDirs;
+    core.registrationFiles = config.registrationFiles;
+    core.mofPaths = config.mofFiles;
+    core.mofNamespace = config.mofNamespace;
+    return core;
+}
+
+}  // namespace
+
+CimHost::CimHost(const HostConfig& config) : impl_(std::make_unique<Impl>()) {
+    detail::selectPlatform(config);
+    detail::checkProviders(config);
+    detail::loadClasses(impl_->classes, config);
+    try {
+        impl_->core = std::make_unique<host::BrokerCore>(coreConfig(config));
+    } catch (const std::exception& error) {
+        throw std::runtime_error(std::string("broker core: ") + error.what());
+    }
+    impl_->dispatcher = std::make_unique<CimDispatcher>(
+        *impl_->core, impl_->classes, config.hostName.empty() ? machineName() : config.hostName);
+    const CimDispatcher* dispatcher = impl_->dispatcher.get();
+    impl_->server = std::make_unique<http::HttpServer>(
+        serverOptions(config),
+        [dispatcher](const http::Request& request) { return handleCimRequest(request, *dispatcher); },
+        logRequest);
+    impl_->server->bind();
+}
+
+CimHost::~CimHost() {
+    stop();
+    if (impl_->core) {
+        impl_->core->shutdown();
+    }
+}
+
+int CimHost::port() const noexcept {
+    return impl_->server->port();
+}
+
+void CimHost::run() {
+    impl_->runEntered.store(true);
+    if (!impl_->stopRequested.load()) {
+        impl_->server->run();
+    }
+    impl_->runFinished.store(true);
+    impl_->core->shutdown();
+}
+
+void CimHost::stop() {
+    impl_->stopRequested.store(true);
+    // The server ignores stop() until it listens: wait for that if run() has begun.
+    while (impl_->runEntered.load() && !impl_->runFinished.load()) {
+        if (impl_->server->running()) {
+            impl_->server->stop();
+            return;
+        }
+        std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    }
+}
+
+}  // namespace orv::cimhost

@@ -1,0 +1,290 @@
+#include "cmpi_builder.hpp"
+
+#include <strings.h>
+
+#include <charconv>
+#include <cstdlib>
+#include <limits>
+#include <string>
+
+#include "orv/cimxml/cim_status.hpp"
+#include "orv/cimxml/cmpi_value.hpp"
+
+namespace orv::cimhost::detail {
+
+namespace {
+
+using cimxml::CimError;
+using cimxml::CimStatus;
+using repository::CimType;
+
+// One value converted for a CMPI call; `text` keeps string data alive for the call.
+struct Converted {
+    CMPIValue value{};
+    CMPIType type = CMPI_null;
+    std::string text;
+};
+
+CMPIType cmpiType(CimType type) {
+    switch (type) {
+        case CimType::Boolean: return CMPI_boolean;
+        case CimType::String: return CMPI_string;
+        case CimType::Char16: return CMPI_char16;
+        case CimType::Uint8: return CMPI_uint8;
+        case CimType::Sint8: return CMPI_sint8;
+        case CimType::Uint16: return CMPI_uint16;
+        case CimType::Sint16: return CMPI_sint16;
+        case CimType::Uint32: return CMPI_uint32;
+        case CimType::Sint32: return CMPI_sint32;
+        case CimType::Uint64: return CMPI_uint64;
+        case CimType::Sint64: return CMPI_sint64;
+        case CimType::Real32: return CMPI_real32;
+        case CimType::Real64: return CMPI_real64;
+        case CimType::Datetime: return CMPI_dateTime;
+        case CimType::Reference: return CMPI_ref;
+    }
+    return CMPI_string;
+}
+
+[[noreturn]] void badValue(std::string_view name, std::string_view text, std::string_view type) {
+    throw CimError(CimStatus::InvalidParameter,
+                   std::string(name) + ": '" + std::string(text) + "' is not a valid " + std::string(type));
+}
+
+template <typename Number>
+Number parseInteger(std::string_view name, const std::string& text, std::string_view type) {
+    Number number{};
+    const char* first = text.data();
+    if (!text.empty() && text.front() == '+') {
+        ++first;
+    }
+    auto [end, error] = std::from_chars(first, text.data() + text.size(), number);
+    if (error != std::errc() || end != text.data() + text.size() || text.empty()) {
+        badValue(name, text, type);
+    }
+    return number;
+}
+
+double parseReal(std::string_view name, const std::string& text, std::string_view type) {
+    char* end = nullptr;
+    const double number = std::strtod(text.c_str(), &end);
+    if (text.empty() || end != text.c_str() + text.size()) {
+        badValue(name, text, type);
+    }
+    return number;
+}
+
+CMPIChar16 parseChar16(std::string_view name, const std::string& text) {
+    const auto* bytes = reinterpret_cast<const unsigned char*>(text.data());
+    if (text.size() == 1 && bytes[0] < 0x80) {
+        return bytes[0];
+    }
+    if (text.size() == 2 && (bytes[0] & 0xE0U) == 0xC0U) {
+        return static_cast<CMPIChar16>(((bytes[0] & 0x1FU) << 6U) | (bytes[1] & 0x3FU));
+    }
+    if (text.size() == 3 && (bytes[0] & 0xF0U) == 0xE0U) {
+        return static_cast<CMPIChar16>(((bytes[0] & 0x0FU) << 12U) | ((bytes[1] & 0x3FU) << 6U) |
+                                       (bytes[2] & 0x3FU));
+    }
+    badValue(name, text, "char16");
+}
+
+bool parseBoolean(std::string_view name, const std::string& text) {
+    if (strcasecmp(text.c_str(), "true") == 0) {
+        return true;
+    }
+    if (strcasecmp(text.c_str(), "false") == 0) {
+        return false;
+    }
+    badValue(name, text, "boolean");
+}
+
+template <typename Number>
+Number inRange(std::string_view name, const std::string& text, std::string_view type, auto value) {
+    if (value < std::numeric_limits<Number>::lowest() || value > std::numeric_limits<Number>::max()) {
+        badValue(name, text, type);
+    }
+    return static_cast<Number>(value);
+}
+
+void convertNumber(Converted& out, std::string_view name, const std::string& text) {
+    CMPIValue& v = out.value;
+    const std::string_view type = cimxml::xmlTypeName(out.type);
+    switch (out.type) {
+        case CMPI_uint8: v.uint8 = inRange<CMPIUint8>(name, text, type, parseInteger<std::uint64_t>(name, text, type)); break;
+        case CMPI_uint16: v.uint16 = inRange<CMPIUint16>(name, text, type, parseInteger<std::uint64_t>(name, text, type)); break;
+        case CMPI_uint32: v.uint32 = inRange<CMPIUint32>(name, text, type, parseInteger<std::uint64_t>(name, text, type)); break;
+        case CMPI_uint64: v.uint64 = parseInteger<std::uint64_t>(name, text, type); break;
+        case CMPI_sint8: v.sint8 = inRange<CMPISint8>(name, text, type, parseInteger<std::int64_t>(name, text, type)); break;
+        case CMPI_sint16: v.sint16 = inRange<CMPISint16>(name, text, type, parseInteger<std::int64_t>(name, text, type)); break;
+        case CMPI_sint32: v.sint32 = inRange<CMPISint32>(name, text, type, parseInteger<std::int64_t>(name, text, type)); break;
+        case CMPI_sint64: v.sint64 = parseInteger<std::int64_t>(name, text, type); break;
+        case CMPI_real32: v.real32 = static_cast<CMPIReal32>(parseReal(name, text, type)); break;
+        case CMPI_real64: v.real64 = parseReal(name, text, type); break;
+        default: badValue(name, text, "number");
+    }
+}
+
+// Converts text to `out.type`; strings travel as CMPI_chars pointing into out.text.
+void convertText(const CMPIBroker* broker, Converted& out, std::string_view name, const std::string& text) {
+    switch (out.type) {
+        case CMPI_boolean: out.value.boolean = parseBoolean(name, text) ? 1 : 0; return;
+        case CMPI_char16: out.value.char16 = parseChar16(name, text); return;
+        case CMPI_string:
+        case CMPI_chars:
+            out.text = text;
+            out.type = CMPI_chars;
+            out.value.chars = out.text.data();
+            return;
+        case CMPI_dateTime: {
+            CMPIStatus rc{CMPI_RC_OK, nullptr};
+            out.value.dateTime = broker->eft->newDateTimeFromChars(broker, text.c_str(), &rc);
+            if (rc.rc != CMPI_RC_OK || out.value.dateTime == nullptr) {
+                badValue(name, text, "datetime");
+            }
+            return;
+        }
+        default: convertNumber(out, name, text);
+    }
+}
+
+const repository::PropertyDecl* declaredProperty(const repository::ClassRepository& classes,
+                                                 std::string_view nameSpace, std::string_view className,
+                                                 std::string_view property) {
+    const repository::ClassDecl* cls = classes.getClass(nameSpace, className);
+    return cls == nullptr ? nullptr : cls->findProperty(property);
+}
+
+// The type of a key nobody declared, from how the client sent it.
+CMPIType guessedKeyType(const cimxml::KeyBindingModel& key) {
+    using Kind = cimxml::KeyBindingModel::Kind;
+    switch (key.kind) {
+        case Kind::Boolean: return CMPI_boolean;
+        case Kind::Reference: return CMPI_ref;
+        case Kind::Numeric:
+            if (key.value.find_first_of(".eE") != std::string::npos) {
+                return CMPI_real64;
+            }
+            return !key.value.empty() && key.value.front() == '-' ? CMPI_sint64 : CMPI_uint64;
+        case Kind::String: break;
+    }
+    return CMPI_string;
+}
+
+CMPIType typeFromXmlName(std::string_view name) {
+    for (CMPIType type : {CMPI_boolean, CMPI_char16, CMPI_real32, CMPI_real64, CMPI_uint8, CMPI_uint16,
+                          CMPI_uint32, CMPI_uint64, CMPI_sint8, CMPI_sint16, CMPI_sint32, CMPI_sint64,
+                          CMPI_dateTime, CMPI_string}) {
+        if (cimxml::xmlTypeName(type) == name) {
+            return type;
+        }
+    }
+    return CMPI_string;
+}
+
+void addKey(const CMPIBroker* broker, const repository::ClassRepository& classes, std::string_view nameSpace,
+            CMPIObjectPath* path, const cimxml::ObjectPathModel& model, const cimxml::KeyBindingModel& key) {
+    const repository::PropertyDecl* declared = declaredProperty(classes, nameSpace, model.className, key.name);
+    Converted converted;
+    converted.type = declared != nullptr ? cmpiType(declared->type.type) : guessedKeyType(key);
+    if (converted.type == CMPI_ref || key.kind == cimxml::KeyBindingModel::Kind::Reference) {
+        if (!key.reference) {
+            badValue(key.name, key.value, "reference");
+        }
+        converted.type = CMPI_ref;
+        converted.value.ref = buildObjectPath(broker, classes, nameSpace, *key.reference);
+    } else {
+        convertText(broker, converted, key.name, key.value);
+    }
+    path->ft->addKey(path, key.name.c_str(), &converted.value, converted.type);
+}
+
+CMPIType propertyType(const repository::PropertyDecl* declared, const cimxml::PropertyModel& property) {
+    if (property.kind == cimxml::PropertyModel::Kind::Reference) {
+        return CMPI_ref;
+    }
+    return declared != nullptr ? cmpiType(declared->type.type) : typeFromXmlName(property.type);
+}
+
+void setArrayProperty(const CMPIBroker* broker, CMPIInstance* instance, const cimxml::PropertyModel& property,
+                      CMPIType elementType) {
+    if (!property.elements) {
+        instance->ft->setProperty(instance, property.name.c_str(), nullptr, elementType | CMPI_ARRAY);
+        return;
+    }
+    const auto& items = *property.elements;
+    const CMPIType arrayElementType = elementType == CMPI_string ? CMPI_chars : elementType;
+    CMPIArray* array = broker->eft->newArray(broker, static_cast<CMPICount>(items.size()), arrayElementType, nullptr);
+    for (std::size_t i = 0; i < items.size(); ++i) {
+        if (!items[i]) {
+            continue;  // elements of a new array start out null
+        }
+        Converted converted;
+        converted.type = elementType;
+        convertText(broker, converted, property.name, *items[i]);
+        array->ft->setElementAt(array, static_cast<CMPICount>(i), &converted.value, converted.type);
+    }
+    CMPIValue value{};
+    value.array = array;
+    instance->ft->setProperty(instance, property.name.c_str(), &value, arrayElementType | CMPI_ARRAY);
+}
+
+void setProperty(const CMPIBroker* broker, const repository::ClassRepository& classes, std::string_view nameSpace,
+                 CMPIInstance* instance, const std::string& className, const cimxml::PropertyModel& property) {
+    const repository::PropertyDecl* declared = declaredProperty(classes, nameSpace, className, property.name);
+    const CMPIType type = propertyType(declared, property);
+    if (property.kind == cimxml::PropertyModel::Kind::Array) {
+        setArrayProperty(broker, instance, property, type);
+        return;
+    }
+    Converted converted;
+    converted.type = type;
+    if (type == CMPI_ref) {
+        if (!property.reference) {
+            instance->ft->setProperty(instance, property.name.c_str(), nullptr, CMPI_ref);
+            return;
+        }
+        converted.value.ref = buildObjectPath(broker, classes, nameSpace, *property.reference);
+    } else if (!property.value) {
+        instance->ft->setProperty(instance, property.name.c_str(), nullptr, type);
+        return;
+    } else {
+        convertText(broker, converted, property.name, *property.value);
+    }
+    instance->ft->setProperty(instance, property.name.c_str(), &converted.value, converted.type);
+}
+
+}  // namespace
+
+CMPIObjectPath* buildObjectPath(const CMPIBroker* broker, const repository::ClassRepository& classes,
+                                std::string_view nameSpace, const cimxml::ObjectPathModel& model) {
+    const std::string ns = model.nameSpace.empty() ? std::string(nameSpace) : model.nameSpace;
+    CMPIStatus rc{CMPI_RC_OK, nullptr};
+    CMPIObjectPath* path = broker->eft->newObjectPath(broker, ns.c_str(), model.className.c_str(), &rc);
+    if (path == nullptr || rc.rc != CMPI_RC_OK) {
+        throw CimError(CimStatus::Failed, "cannot create an object path");
+    }
+    if (!model.host.empty()) {
+        path->ft->setHostname(path, model.host.c_str());
+    }
+    for (const auto& key : model.keys) {
+        addKey(broker, classes, ns, path, model, key);
+    }
+    return path;
+}
+
+CMPIInstance* buildInstance(const CMPIBroker* broker, const repository::ClassRepository& classes,
+                            std::string_view nameSpace, const cimxml::InstanceModel& model,
+                            const CMPIObjectPath* path) {
+    CMPIStatus rc{CMPI_RC_OK, nullptr};
+    CMPIInstance* instance = broker->eft->newInstance(broker, path, &rc);
+    if (instance == nullptr || rc.rc != CMPI_RC_OK) {
+        throw CimError(CimStatus::Failed, "cannot create an instance");
+    }
+    for (const auto& property : model.properties) {
+        setProperty(broker, classes, nameSpace, instance, model.className, property);
+    }
+    return instance;
+}
+
+}  // namespace orv::cimhost::detail

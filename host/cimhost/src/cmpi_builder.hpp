@@ -1,0 +1,27 @@
+// Request arguments as CMPI objects: object paths and instances built with the broker's
+// factory functions, values converted to the types the class declares.
+#pragma once
+
+#include <cmpidt.h>
+#include <cmpift.h>
+
+#include <string_view>
+
+#include "orv/cimxml/request.hpp"
+#include "orv/repository/class_repository.hpp"
+
+namespace orv::cimhost::detail {
+
+// The path in `nameSpace` (the model's own namespace wins when it has one). Keys take
+// the declared type of the key property; keys of unknown properties take the type
+// their VALUETYPE suggests. Throws CimError(CIM_ERR_INVALID_PARAMETER) for values
+// that do not fit the declared type.
+CMPIObjectPath* buildObjectPath(const CMPIBroker* broker, const repository::ClassRepository& classes,
+                                std::string_view nameSpace, const cimxml::ObjectPathModel& model);
+
+// An instance of the model's class whose object path is `path`.
+CMPIInstance* buildInstance(const CMPIBroker* broker, const repository::ClassRepository& classes,
+                            std::string_view nameSpace, const cimxml::InstanceModel& model,
+                            const CMPIObjectPath* path);
+
+}  // namespace orv::cimhost::detail

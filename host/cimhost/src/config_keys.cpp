@@ -1,0 +1,128 @@
+#include "config_keys.hpp"
+
+#include <strings.h>
+
+#include <array>
+#include <charconv>
+#include <sstream>
+
+namespace orv::cimhost::detail {
+
+namespace {
+
+namespace fs = std::filesystem;
+
+template <typename Number>
+Number parseNumber(std::string_view value, Number low, Number high) {
+    Number number{};
+    auto [end, error] = std::from_chars(value.data(), value.data() + value.size(), number);
+    if (error != std::errc() || end != value.data() + value.size() || number < low || number > high) {
+        throw ConfigError("'" + std::string(value) + "' is not a number from " + std::to_string(low) +
+                          " to " + std::to_string(high));
+    }
+    return number;
+}
+
+fs::path resolve(std::string_view value, const fs::path& baseDir) {
+    fs::path path(value);
+    return path.is_relative() ? (baseDir / path).lexically_normal() : path;
+}
+
+std::vector<fs::path> pathList(std::string_view value, const fs::path& baseDir) {
+    std::vector<fs::path> paths;
+    std::istringstream words{std::string(value)};
+    std::string word;
+    while (words >> word) {
+        paths.push_back(resolve(word, baseDir));
+    }
+    return paths;
+}
+
+std::chrono::seconds seconds(std::string_view value) {
+    return std::chrono::seconds(parseNumber<long>(value, 1, 3600));
+}
+
+LogLevel parseLogLevel(std::string_view value) {
+    for (LogLevel level : {LogLevel::Error, LogLevel::Warning, LogLevel::Info, LogLevel::Debug}) {
+        if (strncasecmp(std::string(value).c_str(), std::string(logLevelName(level)).c_str(), 16) == 0) {
+            return level;
+        }
+    }
+    throw ConfigError("'" + std::string(value) + "' is not one of error, warning, info, debug");
+}
+
+std::string platformName(std::string_view value) {
+    if (value != "sim" && value != "linux") {
+        throw ConfigError("'" + std::string(value) + "' is not sim or linux");
+    }
+    return std::string(value);
+}
+
+using Base = const fs::path&;
+
+constexpr std::array kKeys = {
+    ConfigKey{"listenAddress", "address", "address to listen on (127.0.0.1; 0.0.0.0 for every interface)",
+              [](HostConfig& c, std::string_view v, Base) { c.listenAddress = std::string(v); }},
+    ConfigKey{"httpPort", "port", "HTTP port (5988; 0 picks a free port)",
+              [](HostConfig& c, std::string_view v, Base) { c.httpPort = parseNumber<int>(v, 0, 65535); }},
+    ConfigKey{"providerDirs", "provider-dir", "folders searched for lib<location>.so",
+              [](HostConfig& c, std::string_view v, Base b) { c.providerDirs = pathList(v, b); }},
+    ConfigKey{"registrationFile", "registration", "provider registration file(s)",
+              [](HostConfig& c, std::string_view v, Base b) { c.registrationFiles = pathList(v, b); }},
+    ConfigKey{"mofFiles", "mof", "MOF file(s), or folders of *.mof files",
+              [](HostConfig& c, std::string_view v, Base b) { c.mofFiles = pathList(v, b); }},
+    ConfigKey{"mofNamespace", "namespace", "namespace the MOF is read into (root/cimv2)",
+              [](HostConfig& c, std::string_view v, Base) { c.mofNamespace = std::string(v); }},
+    ConfigKey{"platform", "platform", "platform substitute: sim or linux (sets ORV_PLATFORM)",
+              [](HostConfig& c, std::string_view v, Base) { c.platform = platformName(v); }},
+    ConfigKey{"fixture", "fixture", "simulated host fixture file (sets ORV_SIM_FIXTURE)",
+              [](HostConfig& c, std::string_view v, Base b) { c.fixture = resolve(v, b); }},
+    ConfigKey{"logLevel", "log-level", "error, warning, info or debug (info)",
+              [](HostConfig& c, std::string_view v, Base) { c.logLevel = parseLogLevel(v); }},
+    ConfigKey{"credentialsFile", "credentials", "file of user:password lines; enables basic authentication",
+              [](HostConfig& c, std::string_view v, Base b) { c.credentialsFile = resolve(v, b); }},
+    ConfigKey{"maxRequestBytes", "max-request-bytes", "largest request body accepted (4194304)",
+              [](HostConfig& c, std::string_view v, Base) {
+                  c.maxRequestBytes = parseNumber<std::size_t>(v, 1024, std::size_t{1} << 30U);
+              }},
+    ConfigKey{"readTimeout", "read-timeout", "seconds a client may stay silent mid-request (30)",
+              [](HostConfig& c, std::string_view v, Base) { c.readTimeout = seconds(v); }},
+    ConfigKey{"writeTimeout", "write-timeout", "seconds a response may take to be sent (30)",
+              [](HostConfig& c, std::string_view v, Base) { c.writeTimeout = seconds(v); }},
+    ConfigKey{"keepaliveTimeout", "keepalive-timeout", "seconds an idle connection is kept (5)",
+              [](HostConfig& c, std::string_view v, Base) { c.keepAliveTimeout = seconds(v); }},
+    ConfigKey{"keepaliveMaxRequest", "keepalive-max-requests", "requests served on one connection (100)",
+              [](HostConfig& c, std::string_view v, Base) {
+                  c.keepAliveMaxRequests = parseNumber<std::size_t>(v, 1, 1000000);
+              }},
+    ConfigKey{"threads", "threads", "worker threads serving requests (8)",
+              [](HostConfig& c, std::string_view v, Base) { c.threads = parseNumber<std::size_t>(v, 1, 256); }},
+    ConfigKey{"hostName", "host-name", "HOST written in instance paths (this machine's name)",
+              [](HostConfig& c, std::string_view v, Base) { c.hostName = std::string(v); }},
+};
+
+}  // namespace
+
+std::span<const ConfigKey> configKeys() noexcept {
+    return kKeys;
+}
+
+const ConfigKey* findByKey(std::string_view key) noexcept {
+    for (const auto& entry : kKeys) {
+        if (entry.key.size() == key.size() && strncasecmp(entry.key.data(), key.data(), key.size()) == 0) {
+            return &entry;
+        }
+    }
+    return nullptr;
+}
+
+const ConfigKey* findByOption(std::string_view option) noexcept {
+    for (const auto& entry : kKeys) {
+        if (entry.option == option) {
+            return &entry;
+        }
+    }
+    return nullptr;
+}
+
+}  // namespace orv::cimhost::detail

@@ -1,0 +1,161 @@
+// Instance operations, sent through the broker core to the providers.
+#include <strings.h>
+
+#include "cmpi_builder.hpp"
+#include "orv/cimxml/cim_status.hpp"
+#include "orv/cimxml/request_params.hpp"
+#include "result_writers.hpp"
+
+namespace orv::cimhost::detail {
+
+using cimxml::CimError;
+using cimxml::CimStatus;
+
+namespace {
+
+// The flags every instance read takes.
+struct ReadFlags {
+    bool localOnly;
+    bool includeQualifiers;
+    bool includeClassOrigin;
+    std::optional<std::vector<std::string>> propertyList;
+};
+
+ReadFlags readFlags(const cimxml::CimRequest& request) {
+    return ReadFlags{cimxml::boolParam(request, "LocalOnly", true),
+                     cimxml::boolParam(request, "IncludeQualifiers", false),
+                     cimxml::boolParam(request, "IncludeClassOrigin", false),
+                     cimxml::propertyListParam(request, "PropertyList")};
+}
+
+CMPIObjectPath* instancePath(const OperationContext& context, const cimxml::ObjectPathModel& model) {
+    requireClass(context, model.className);
+    return buildObjectPath(context.core.broker(), context.classes, context.request.nameSpace, model);
+}
+
+bool contains(const std::vector<std::string>& names, const std::string& name) {
+    for (const auto& candidate : names) {
+        if (strcasecmp(candidate.c_str(), name.c_str()) == 0) {
+            return true;
+        }
+    }
+    return false;
+}
+
+// Without deep inheritance only the requested class's own properties are returned.
+std::optional<std::vector<std::string>> shallowPropertyList(const repository::ClassDecl& cls,
+                                                            const std::optional<std::vector<std::string>>& requested) {
+    std::vector<std::string> names;
+    for (const auto& property : cls.properties) {
+        if (!requested || contains(*requested, property.name)) {
+            names.push_back(property.name);
+        }
+    }
+    return names;
+}
+
+std::string requiredString(const cimxml::CimRequest& request, const char* name) {
+    std::optional<std::string> value = cimxml::stringParam(request, name);
+    if (!value) {
+        throw CimError(CimStatus::InvalidParameter, std::string("missing parameter ") + name);
+    }
+    return *value;
+}
+
+}  // namespace
+
+void getInstance(OperationContext& context) {
+    const auto& request = context.request;
+    cimxml::checkParameterNames(request, {"InstanceName", "LocalOnly", "IncludeQualifiers", "IncludeClassOrigin",
+                                          "PropertyList"});
+    const ReadFlags flags = readFlags(request);
+    CMPIObjectPath* path = instancePath(context, cimxml::instanceNameParam(request, "InstanceName"));
+    host::Reply reply = context.core.getInstance(
+        path, callOptions(context, flags.localOnly, false, flags.includeQualifiers, flags.includeClassOrigin,
+                          flags.propertyList));
+    throwIfFailed(reply);
+    const auto instances = reply.instances();
+    if (instances.empty()) {
+        throw CimError(CimStatus::NotFound, "no such instance");
+    }
+    cimxml::writeInstance(context.out, instances.front(),
+                          instanceEncoding(context, flags.includeClassOrigin, flags.propertyList));
+}
+
+void enumerateInstances(OperationContext& context) {
+    const auto& request = context.request;
+    cimxml::checkParameterNames(request, {"ClassName", "LocalOnly", "DeepInheritance", "IncludeQualifiers",
+                                          "IncludeClassOrigin", "PropertyList"});
+    const ReadFlags flags = readFlags(request);
+    const bool deep = cimxml::boolParam(request, "DeepInheritance", true);
+    const std::string className = cimxml::classNameParam(request, "ClassName").value_or("");
+    const repository::ClassDecl& cls = requireClass(context, className);
+    host::Reply reply = context.core.enumerateInstances(
+        classPath(context, cls.name),
+        callOptions(context, flags.localOnly, deep, flags.includeQualifiers, flags.includeClassOrigin,
+                    flags.propertyList));
+    throwIfFailed(reply);
+    auto kept = deep ? flags.propertyList : shallowPropertyList(cls, flags.propertyList);
+    writeNamedInstances(context, reply, instanceEncoding(context, flags.includeClassOrigin, std::move(kept)));
+}
+
+void enumerateInstanceNames(OperationContext& context) {
+    const auto& request = context.request;
+    cimxml::checkParameterNames(request, {"ClassName"});
+    const std::string className = cimxml::classNameParam(request, "ClassName").value_or("");
+    const repository::ClassDecl& cls = requireClass(context, className);
+    host::Reply reply = context.core.enumerateInstanceNames(classPath(context, cls.name),
+                                                            callOptions(context, false, true, false, false, {}));
+    throwIfFailed(reply);
+    writeInstanceNames(context, reply);
+}
+
+void createInstance(OperationContext& context) {
+    const auto& request = context.request;
+    cimxml::checkParameterNames(request, {"NewInstance"});
+    const cimxml::InstanceModel& model = cimxml::instanceParam(request, "NewInstance");
+    requireClass(context, model.className);
+    CMPIObjectPath* path = classPath(context, model.className);
+    CMPIInstance* instance =
+        buildInstance(context.core.broker(), context.classes, request.nameSpace, model, path);
+    host::Reply reply = context.core.createInstance(path, instance, callOptions(context, false, false, false, false, {}));
+    throwIfFailed(reply);
+    writeInstanceNames(context, reply);
+}
+
+void modifyInstance(OperationContext& context) {
+    const auto& request = context.request;
+    cimxml::checkParameterNames(request, {"ModifiedInstance", "IncludeQualifiers", "PropertyList"});
+    const cimxml::NamedInstanceModel& model = cimxml::namedInstanceParam(request, "ModifiedInstance");
+    const bool includeQualifiers = cimxml::boolParam(request, "IncludeQualifiers", true);
+    CMPIObjectPath* path = instancePath(context, model.path);
+    CMPIInstance* instance =
+        buildInstance(context.core.broker(), context.classes, request.nameSpace, model.instance, path);
+    host::Reply reply = context.core.modifyInstance(
+        path, instance,
+        callOptions(context, false, false, includeQualifiers, false,
+                    cimxml::propertyListParam(request, "PropertyList")));
+    throwIfFailed(reply);
+}
+
+void deleteInstance(OperationContext& context) {
+    const auto& request = context.request;
+    cimxml::checkParameterNames(request, {"InstanceName"});
+    CMPIObjectPath* path = instancePath(context, cimxml::instanceNameParam(request, "InstanceName"));
+    host::Reply reply = context.core.deleteInstance(path, callOptions(context, false, false, false, false, {}));
+    throwIfFailed(reply);
+}
+
+void execQuery(OperationContext& context) {
+    const auto& request = context.request;
+    cimxml::checkParameterNames(request, {"QueryLanguage", "Query"});
+    const std::string language = requiredString(request, "QueryLanguage");
+    const std::string query = requiredString(request, "Query");
+    CMPIObjectPath* nsPath = classPath(context, "");
+    host::Reply reply = context.core.execQuery(nsPath, query.c_str(), language.c_str(),
+                                               callOptions(context, false, true, false, false, {}));
+    throwIfFailed(reply);
+    writeObjectsWithPath(context, reply, instanceEncoding(context, false, std::nullopt));
+}
+
+}  // namespace orv::cimhost::detail

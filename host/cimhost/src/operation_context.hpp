@@ -1,0 +1,60 @@
+// What every operation handler gets, and the handlers of the three operation families.
+#pragma once
+
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "orv/cimxml/object_encoder.hpp"
+#include "orv/cimxml/request.hpp"
+#include "orv/cimxml/xml_writer.hpp"
+#include "orv/host/broker_core.hpp"
+#include "orv/repository/class_repository.hpp"
+
+namespace orv::cimhost::detail {
+
+struct OperationContext {
+    host::BrokerCore& core;
+    const repository::ClassRepository& classes;
+    const cimxml::CimRequest& request;
+    const std::string& principal;
+    cimxml::PathDefaults defaults;  // host and request namespace
+    cimxml::XmlWriter& out;         // positioned inside IRETURNVALUE
+};
+
+using OperationHandler = void (*)(OperationContext& context);
+
+// Class operations (repository).
+void getClass(OperationContext& context);
+void enumerateClasses(OperationContext& context);
+void enumerateClassNames(OperationContext& context);
+
+// Instance operations (broker core).
+void getInstance(OperationContext& context);
+void enumerateInstances(OperationContext& context);
+void enumerateInstanceNames(OperationContext& context);
+void createInstance(OperationContext& context);
+void modifyInstance(OperationContext& context);
+void deleteInstance(OperationContext& context);
+void execQuery(OperationContext& context);
+
+// Association operations (broker core).
+void associators(OperationContext& context);
+void associatorNames(OperationContext& context);
+void references(OperationContext& context);
+void referenceNames(OperationContext& context);
+
+// Shared helpers.
+// Throws CIM_ERR_INVALID_CLASS when the request namespace has no such class.
+const repository::ClassDecl& requireClass(const OperationContext& context, const std::string& className);
+// Throws CimError with the reply's code and message unless it is OK.
+void throwIfFailed(const host::Reply& reply);
+// CMPI invocation flags and property list of a request.
+host::CallOptions callOptions(const OperationContext& context, bool localOnly, bool deepInheritance,
+                              bool includeQualifiers, bool includeClassOrigin,
+                              const std::optional<std::vector<std::string>>& propertyList);
+// Encoding of returned instances: class origins and property list from the request.
+cimxml::InstanceEncoding instanceEncoding(const OperationContext& context, bool includeClassOrigin,
+                                          std::optional<std::vector<std::string>> propertyList);
+
+}  // namespace orv::cimhost::detail

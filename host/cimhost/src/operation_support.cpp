@@ -1,0 +1,55 @@
+// Helpers shared by the operation handlers.
+#include "orv/cimxml/cim_status.hpp"
+#include "operation_context.hpp"
+
+namespace orv::cimhost::detail {
+
+using cimxml::CimError;
+using cimxml::CimStatus;
+
+const repository::ClassDecl& requireClass(const OperationContext& context, const std::string& className) {
+    const repository::ClassDecl* cls = context.classes.getClass(context.request.nameSpace, className);
+    if (cls == nullptr) {
+        throw CimError(CimStatus::InvalidClass, "class " + className + " does not exist");
+    }
+    return *cls;
+}
+
+void throwIfFailed(const host::Reply& reply) {
+    if (reply.rc() != CMPI_RC_OK) {
+        throw CimError(static_cast<int>(reply.rc()), reply.message());
+    }
+}
+
+host::CallOptions callOptions(const OperationContext& context, bool localOnly, bool deepInheritance,
+                              bool includeQualifiers, bool includeClassOrigin,
+                              const std::optional<std::vector<std::string>>& propertyList) {
+    host::CallOptions options;
+    options.principal = context.principal;
+    options.flags = (localOnly ? CMPI_FLAG_LocalOnly : 0U) | (deepInheritance ? CMPI_FLAG_DeepInheritance : 0U) |
+                    (includeQualifiers ? CMPI_FLAG_IncludeQualifiers : 0U) |
+                    (includeClassOrigin ? CMPI_FLAG_IncludeClassOrigin : 0U);
+    options.properties = propertyList;
+    return options;
+}
+
+cimxml::InstanceEncoding instanceEncoding(const OperationContext& context, bool includeClassOrigin,
+                                          std::optional<std::vector<std::string>> propertyList) {
+    cimxml::InstanceEncoding encoding;
+    encoding.includeClassOrigin = includeClassOrigin;
+    encoding.propertyList = std::move(propertyList);
+    const repository::ClassRepository& classes = context.classes;
+    const std::string nameSpace = context.request.nameSpace;
+    encoding.lookup = [&classes, nameSpace](std::string_view className,
+                                            std::string_view property) -> std::optional<cimxml::PropertyInfo> {
+        const repository::ClassDecl* cls = classes.getClass(nameSpace, className);
+        const repository::PropertyDecl* decl = cls == nullptr ? nullptr : cls->findProperty(property);
+        if (decl == nullptr) {
+            return std::nullopt;
+        }
+        return cimxml::PropertyInfo{decl->classOrigin, decl->type.referenceClass, false};
+    };
+    return encoding;
+}
+
+}  // namespace orv::cimhost::detail
