@@ -23,6 +23,12 @@ struct Converted {
     CMPIValue value{};
     CMPIType type = CMPI_null;
     std::string text;
+
+    // What the CMPI setters take: for CMPI_chars the characters themselves stand in
+    // for the value, as providers pass them.
+    const CMPIValue* pointer() const noexcept {
+        return type == CMPI_chars ? reinterpret_cast<const CMPIValue*>(text.c_str()) : &value;
+    }
 };
 
 CMPIType cmpiType(CimType type) {
@@ -134,7 +140,6 @@ void convertText(const CMPIBroker* broker, Converted& out, std::string_view name
         case CMPI_chars:
             out.text = text;
             out.type = CMPI_chars;
-            out.value.chars = out.text.data();
             return;
         case CMPI_dateTime: {
             CMPIStatus rc{CMPI_RC_OK, nullptr};
@@ -196,7 +201,7 @@ void addKey(const CMPIBroker* broker, const repository::ClassRepository& classes
     } else {
         convertText(broker, converted, key.name, key.value);
     }
-    path->ft->addKey(path, key.name.c_str(), &converted.value, converted.type);
+    path->ft->addKey(path, key.name.c_str(), converted.pointer(), converted.type);
 }
 
 CMPIType propertyType(const repository::PropertyDecl* declared, const cimxml::PropertyModel& property) {
@@ -222,7 +227,7 @@ void setArrayProperty(const CMPIBroker* broker, CMPIInstance* instance, const ci
         Converted converted;
         converted.type = elementType;
         convertText(broker, converted, property.name, *items[i]);
-        array->ft->setElementAt(array, static_cast<CMPICount>(i), &converted.value, converted.type);
+        array->ft->setElementAt(array, static_cast<CMPICount>(i), converted.pointer(), converted.type);
     }
     CMPIValue value{};
     value.array = array;
@@ -251,7 +256,7 @@ void setProperty(const CMPIBroker* broker, const repository::ClassRepository& cl
     } else {
         convertText(broker, converted, property.name, *property.value);
     }
-    instance->ft->setProperty(instance, property.name.c_str(), &converted.value, converted.type);
+    instance->ft->setProperty(instance, property.name.c_str(), converted.pointer(), converted.type);
 }
 
 }  // namespace

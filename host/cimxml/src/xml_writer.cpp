@@ -70,14 +70,11 @@ XmlWriter& XmlWriter::close() {
     if (open_.empty()) {
         throw std::logic_error("XmlWriter: close without an open element");
     }
-    if (startTagPending_) {
-        out_ += "/>";
-        startTagPending_ = false;
-    } else {
-        out_ += "</";
-        out_ += open_.back();
-        out_ += '>';
-    }
+    // Always an explicit end tag: some CIM-XML clients do not read empty-element tags.
+    finishStartTag();
+    out_ += "</";
+    out_ += open_.back();
+    out_ += '>';
     open_.pop_back();
     return *this;
 }

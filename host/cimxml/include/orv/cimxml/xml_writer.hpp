@@ -18,7 +18,7 @@ public:
     XmlWriter& open(std::string_view name);
     XmlWriter& attr(std::string_view name, std::string_view value);
     XmlWriter& text(std::string_view value);
-    // Closes the innermost open element ("/>" when it has no content).
+    // Closes the innermost open element with an end tag.
     XmlWriter& close();
     // An element holding only text: <name>text</name>.
     XmlWriter& leaf(std::string_view name, std::string_view value);
