@@ -1,6 +1,7 @@
 // Sending a request to the providers it reaches, one MI call each, in order.
 #include <string>
 
+#include "args.hpp"
 #include "context.hpp"
 #include "core.hpp"
 #include "mi_calls.hpp"
@@ -130,9 +131,12 @@ Outcome CoreServices::callTargets(const std::vector<Target>& targets, ProviderKi
             // class, or the requested one when a superclass's provider serves it.
             status = callAssociationMI(mi, request, frame.ctx(), rslt, target.className.c_str());
         } else {
+            // Providers always get argument objects, empty when the caller gave none.
+            const CMPIArgs* in = request.in != nullptr ? request.in : newArgs(Owner::Arena);
+            CMPIArgs* out = request.out != nullptr ? request.out : newArgs(Owner::Arena);
             status = call<CMPIMethodMI>(mi, &CMPIMethodMIFT::invokeMethod, "invokeMethod", frame.ctx(),
                                         static_cast<const CMPIResult*>(rslt), pathFor(request, target),
-                                        request.method, request.in, request.out);
+                                        request.method, in, out);
         }
         disposeObject(rslt);
         if (status.rc != CMPI_RC_OK) {

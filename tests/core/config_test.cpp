@@ -1,0 +1,48 @@
+// Bad registration or MOF input stops the core from starting, with the file,
+// the line and what was expected.
+#include <fstream>
+
+#include "core_fixture.hpp"
+
+namespace orv::host::test {
+namespace {
+
+using ::testing::HasSubstr;
+
+std::filesystem::path writeFile(const std::string& name, const std::string& content) {
+    std::filesystem::path file = std::filesystem::temp_directory_path() / (std::to_string(::getpid()) + name);
+    std::ofstream(file) << content;
+    return file;
+}
+
+std::string startupError(const CoreConfig& config) {
+    try {
+        BrokerCore core(config);
+    } catch (const std::runtime_error& error) {
+        return error.what();
+    }
+    return "started";
+}
+
+TEST(CoreConfigTest, MalformedMofStopsTheCoreWithFileAndLine) {
+    std::filesystem::path mof = writeFile("bad.mof", "class Broken {\n  string Name\n};\n");
+    CoreConfig config = rawConfig();
+    config.mofPaths = {mof};
+    std::string error = startupError(config);
+    EXPECT_THAT(error, HasSubstr(mof.string() + ":2: expected ';'"));
+    std::filesystem::remove(mof);
+}
+
+TEST(CoreConfigTest, MalformedRegistrationStopsTheCoreWithFileAndLine) {
+    std::filesystem::path reg = writeFile("bad.reg", "[Raw_Element]\n   provider: X\n   nonsense line\n");
+    CoreConfig config = rawConfig();
+    config.registrationFiles = {reg};
+    std::string error = startupError(config);
+    EXPECT_THAT(error, HasSubstr(reg.string() + ":3"));
+    std::filesystem::remove(reg);
+}
+
+TEST(CoreConfigTest, GoodInputStarts) { EXPECT_EQ(startupError(rawConfig()), "started"); }
+
+}  // namespace
+}  // namespace orv::host::test
