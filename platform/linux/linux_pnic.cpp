@@ -38,8 +38,8 @@ void LinuxPnic::refuse(const char* operation) const
 
 bool LinuxPnic::linkUp() const
 {
-    auto link = attributes();
-    return (link.flags & IFF_UP) && link.carrier.value_or(false);
+    const bool up = sysfs_.numberAttribute(name_, "flags") & IFF_UP;
+    return up && sysfs_.carrier(name_).value_or(false);
 }
 
 std::optional<ethtool_wolinfo> LinuxPnic::wakeOnLan() const
@@ -102,12 +102,12 @@ bool LinuxPnic::IsOperationalLinkUp() const
 
 bool LinuxPnic::IsAdministrativeLinkUp() const
 {
-    return guarded("IsAdministrativeLinkUp", [&] { return (attributes().flags & IFF_UP) != 0; });
+    return guarded("IsAdministrativeLinkUp", [&] { return (sysfs_.numberAttribute(name_, "flags") & IFF_UP) != 0; });
 }
 
 bool LinuxPnic::IsEnabled() const
 {
-    return guarded("IsEnabled", [&] { return (attributes().flags & IFF_UP) != 0; });
+    return guarded("IsEnabled", [&] { return (sysfs_.numberAttribute(name_, "flags") & IFF_UP) != 0; });
 }
 
 NN::LinkSpeed LinuxPnic::GetConfiguredLinkSpeed() const
@@ -201,7 +201,7 @@ void LinuxPnic::GetLldpInfo(NN::PnicDiscoveryInfo& info) const { info.fields.cle
 
 uint32_t LinuxPnic::GetMTU() const
 {
-    return guarded("GetMTU", [&] { return attributes().mtu; });
+    return guarded("GetMTU", [&] { return static_cast<uint32_t>(sysfs_.numberAttribute(name_, "mtu")); });
 }
 
 bool LinuxPnic::IsPseudoDevice() const { return false; }

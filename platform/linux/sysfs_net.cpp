@@ -93,20 +93,31 @@ SysfsLinkAttributes SysfsNet::linkAttributes(const std::string& name) const
 {
     const std::string dir = netDir(name);
     SysfsLinkAttributes attributes;
-    auto number = [&](const char* file) {
-        auto value = parseNumber(requireLine(dir + "/" + file));
-        if (!value) throw LinuxCallError("parse", dir + "/" + file, EINVAL);
-        return *value;
-    };
+    auto number = [&](const char* file) { return numberAttribute(name, file); };
     attributes.ifindex = static_cast<int>(number("ifindex"));
     attributes.flags = static_cast<std::uint32_t>(number("flags"));
     attributes.mtu = static_cast<std::uint32_t>(number("mtu"));
     attributes.operstate = requireLine(dir + "/operstate");
     attributes.address = requireLine(dir + "/address");
-    if (auto carrier = readNumber(dir + "/carrier")) attributes.carrier = *carrier != 0;
+    attributes.carrier = carrier(name);
     attributes.speed = readSignedNumber(dir + "/speed");
     attributes.duplex = readLine(dir + "/duplex").value_or("");
     return attributes;
+}
+
+std::uint64_t SysfsNet::numberAttribute(const std::string& name, const char* file) const
+{
+    const std::string path = netDir(name) + "/" + file;
+    auto value = parseNumber(requireLine(path));
+    if (!value) throw LinuxCallError("parse", path, EINVAL);
+    return *value;
+}
+
+std::optional<bool> SysfsNet::carrier(const std::string& name) const
+{
+    auto value = readNumber(netDir(name) + "/carrier");
+    if (!value) return std::nullopt;
+    return *value != 0;
 }
 
 }  // namespace orv::linuxhost

@@ -42,6 +42,10 @@ public:
     std::optional<PciDeviceInfo> pciDevice(const std::string& name) const;
     // Throws LinuxCallError when the device is gone.
     SysfsLinkAttributes linkAttributes(const std::string& name) const;
+    // One numeric attribute file ("mtu", "flags", ...); throws LinuxCallError.
+    std::uint64_t numberAttribute(const std::string& name, const char* file) const;
+    // Carrier of an interface; nothing while it is administratively down.
+    std::optional<bool> carrier(const std::string& name) const;
 
 private:
     std::string netDir(const std::string& name) const;
