@@ -1,0 +1,46 @@
+// Starts orv-cimhost as a child process on a free loopback port and stops it again.
+#pragma once
+
+#include <sys/types.h>
+
+#include <string>
+#include <vector>
+
+namespace orv::e2e {
+
+std::string buildDir();
+std::string sourceDir();
+// The raw test provider's host arguments: its MOF, the loadable registrations and the build's lib folder.
+std::vector<std::string> rawProviderArgs();
+
+class HostProcess {
+public:
+    // Runs orv-cimhost with `args` (plus --port 0 unless `args` names a port).
+    explicit HostProcess(std::vector<std::string> args, bool choosePort = true);
+    ~HostProcess();
+    HostProcess(const HostProcess&) = delete;
+    HostProcess& operator=(const HostProcess&) = delete;
+
+    // Waits up to 10 s for the "listening on" line; false when the host exited first.
+    bool waitReady();
+    int port() const noexcept { return port_; }
+    // Sends `signal` and waits up to 10 s; the exit status, or -1 on a timeout / a signal death.
+    int stop(int signal);
+    // Waits up to 10 s for the process to end on its own; its exit status or -1.
+    int waitExit();
+    // Everything the host wrote to standard error so far.
+    const std::string& output();
+
+private:
+    void readAvailable(int timeoutMs);
+
+    pid_t pid_ = -1;
+    int errFd_ = -1;
+    int port_ = -1;
+    std::string output_;
+};
+
+// Runs a shell command; its standard output and error, in that order.
+std::string runCommand(const std::string& command);
+
+}  // namespace orv::e2e

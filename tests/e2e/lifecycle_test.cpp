@@ -1,0 +1,141 @@
+// Starting and stopping orv-cimhost: clean stops on SIGTERM / SIGINT with the providers
+// cleaned up, and start failures that exit non-zero with one clear line.
+#include <gtest/gtest.h>
+#include <signal.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cstdio>
+#include <cstdlib>
+#include <fstream>
+#include <sstream>
+
+#include "host_process.hpp"
+
+namespace orv::e2e {
+namespace {
+
+std::string tempPath(const std::string& name) {
+    return "/tmp/orv-e2e-" + std::to_string(getpid()) + "-" + name;
+}
+
+std::string readFile(const std::string& path) {
+    std::ifstream in(path);
+    std::stringstream text;
+    text << in.rdbuf();
+    return text.str();
+}
+
+std::size_t lineCount(const std::string& text) {
+    return static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n'));
+}
+
+void enumerateOnce(int port) {
+    const std::string out = runCommand("timeout 20 wbemcli ein 'http://localhost:" + std::to_string(port) +
+                                       "/root/cimv2:Raw_Element'");
+    ASSERT_NE(out.find("Raw_Element-0"), std::string::npos) << out;
+}
+
+TEST(CimHostLifecycle, SigtermStopsWithExitZeroAfterProviderCleanupWithTermination) {
+    const std::string log = tempPath("provider.log");
+    std::remove(log.c_str());
+    setenv("RAW_PROVIDER_LOG", log.c_str(), 1);
+    HostProcess host(rawProviderArgs());
+    unsetenv("RAW_PROVIDER_LOG");
+    ASSERT_TRUE(host.waitReady()) << host.output();
+    enumerateOnce(host.port());
+    EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
+    EXPECT_NE(readFile(log).find("cleanup"), std::string::npos);
+    EXPECT_NE(readFile(log).find("terminating=1"), std::string::npos) << readFile(log);
+    std::remove(log.c_str());
+}
+
+TEST(CimHostLifecycle, SigintStopsWithExitZero) {
+    HostProcess host(rawProviderArgs());
+    ASSERT_TRUE(host.waitReady()) << host.output();
+    enumerateOnce(host.port());
+    EXPECT_EQ(host.stop(SIGINT), 0) << host.output();
+    EXPECT_NE(host.output().find("stopped"), std::string::npos);
+}
+
+TEST(CimHostLifecycle, SigtermRightAfterStartStillStops) {
+    HostProcess host(rawProviderArgs());
+    ASSERT_TRUE(host.waitReady()) << host.output();
+    EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
+}
+
+TEST(CimHostLifecycle, PortTakenFailsWithOneLine) {
+    HostProcess first(rawProviderArgs());
+    ASSERT_TRUE(first.waitReady()) << first.output();
+    auto args = rawProviderArgs();
+    args.insert(args.end(), {"--port", std::to_string(first.port())});
+    HostProcess second(args, false);
+    EXPECT_EQ(second.waitExit(), 1);
+    EXPECT_NE(second.output().find("cannot listen on 127.0.0.1:" + std::to_string(first.port())), std::string::npos)
+        << second.output();
+    EXPECT_EQ(lineCount(second.output()), 1U) << second.output();
+    EXPECT_EQ(first.stop(SIGTERM), 0);
+}
+
+TEST(CimHostLifecycle, MissingRegistrationFileFailsWithOneLine) {
+    auto args = rawProviderArgs();
+    args.insert(args.end(), {"--registration", "/nonexistent/orvprovider.reg"});
+    HostProcess host(args);
+    EXPECT_EQ(host.waitExit(), 1);
+    EXPECT_EQ(host.output(), "orv-cimhost: cannot start: registration file /nonexistent/orvprovider.reg does not exist\n");
+}
+
+TEST(CimHostLifecycle, UnloadableProviderFailsWithOneLine) {
+    auto args = rawProviderArgs();
+    args.insert(args.end(), {"--registration", sourceDir() + "/tests/rawprovider/rawprovider.reg"});
+    HostProcess host(args);
+    EXPECT_EQ(host.waitExit(), 1);
+    EXPECT_NE(host.output().find("provider library librawmissing.so not found in"), std::string::npos)
+        << host.output();
+    EXPECT_EQ(lineCount(host.output()), 1U) << host.output();
+}
+
+TEST(CimHostLifecycle, BadMofFailsWithOneLine) {
+    const std::string mof = tempPath("bad.mof");
+    std::ofstream(mof) << "class Broken {\n  uint32 ;\n";
+    auto args = rawProviderArgs();
+    args.insert(args.end(), {"--mof", mof});
+    HostProcess host(args);
+    EXPECT_EQ(host.waitExit(), 1);
+    EXPECT_NE(host.output().find(mof + ":"), std::string::npos) << host.output();
+    EXPECT_EQ(lineCount(host.output()), 1U) << host.output();
+    std::remove(mof.c_str());
+}
+
+TEST(CimHostLifecycle, BadOptionValueExitsTwoWithOneLine) {
+    HostProcess host({"--port", "seventy"}, false);
+    EXPECT_EQ(host.waitExit(), 2);
+    EXPECT_EQ(host.output(), "orv-cimhost: httpPort: 'seventy' is not a number from 0 to 65535\n");
+}
+
+TEST(CimHostLifecycle, UnknownConfigKeyNamesFileAndLine) {
+    const std::string config = tempPath("host.cfg");
+    std::ofstream(config) << "# test\nhttpPort: 0\ncolour: red\n";
+    HostProcess host({"--config", config}, false);
+    EXPECT_EQ(host.waitExit(), 2);
+    EXPECT_EQ(host.output(), "orv-cimhost: " + config + ":3: unknown key 'colour'\n");
+    std::remove(config.c_str());
+}
+
+TEST(CimHostLifecycle, ConfigFileKeysConfigureTheHost) {
+    const std::string config = tempPath("serve.cfg");
+    const std::string dir = sourceDir();
+    std::ofstream(config) << "httpPort: 0\nproviderDirs: " << buildDir() << "/lib\nregistrationFile: " << dir
+                          << "/tests/e2e/data/rawhost.reg\nmofFiles: " << dir
+                          << "/tests/rawprovider/rawprovider.mof\nlogLevel: debug\nthreads: 2\n";
+    HostProcess host({"--config", config}, false);
+    ASSERT_TRUE(host.waitReady()) << host.output();
+    enumerateOnce(host.port());
+    EXPECT_EQ(host.stop(SIGTERM), 0);
+    EXPECT_NE(host.output().find("debug: POST /cimom EnumerateInstanceNames -> 200"), std::string::npos)
+        << host.output();
+    std::remove(config.c_str());
+}
+
+}  // namespace
+}  // namespace orv::e2e

@@ -1,0 +1,257 @@
+// Requests no well-behaved client sends: each gets the right HTTP or CIM error, and the
+// host keeps serving afterwards.
+#include <gtest/gtest.h>
+#include <httplib.h>
+#include <netinet/in.h>
+#include <signal.h>
+#include <sys/socket.h>
+#include <unistd.h>
+
+#include "host_process.hpp"
+
+namespace orv::e2e {
+namespace {
+
+const char* kEnumerateClassNames =
+    "<?xml version=\"1.0\" encoding=\"utf-8\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
+    "<MESSAGE ID=\"7\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><IMETHODCALL NAME=\"EnumerateClassNames\">"
+    "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/></LOCALNAMESPACEPATH>"
+    "%PARAMS%</IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
+
+std::string requestWith(const std::string& params, const std::string& method = "EnumerateClassNames") {
+    std::string body = kEnumerateClassNames;
+    body.replace(body.find("%PARAMS%"), 8, params);
+    body.replace(body.find("EnumerateClassNames"), 19, method);
+    return body;
+}
+
+class RawHttpTest : public ::testing::Test {
+protected:
+    static void SetUpTestSuite() {
+        auto args = rawProviderArgs();
+        args.insert(args.end(), {"--max-request-bytes", "65536", "--credentials",
+                                 sourceDir() + "/tests/e2e/data/credentials"});
+        host_ = new HostProcess(args);
+        ASSERT_TRUE(host_->waitReady()) << host_->output();
+    }
+    static void TearDownTestSuite() {
+        EXPECT_EQ(host_->stop(SIGTERM), 0);
+        delete host_;
+    }
+    void TearDown() override {
+        // Whatever the test sent, the host still answers a proper request.
+        auto result = post(requestWith(""), headers("EnumerateClassNames"));
+        ASSERT_TRUE(result) << "host stopped answering";
+        EXPECT_EQ(result->status, 200);
+    }
+
+    static httplib::Headers headers(const std::string& method, const std::string& object = "root%2Fcimv2") {
+        return {{"CIMOperation", "MethodCall"}, {"CIMMethod", method}, {"CIMObject", object},
+                {"CIMProtocolVersion", "1.0"}};
+    }
+    static httplib::Result post(const std::string& body, const httplib::Headers& hdrs, bool authenticate = true) {
+        httplib::Client client("127.0.0.1", host_->port());
+        client.set_read_timeout(10);
+        if (authenticate) {
+            client.set_basic_auth("user", "secret");
+        }
+        return client.Post("/cimom", hdrs, body, "application/xml; charset=\"utf-8\"");
+    }
+    static std::string cimError(const httplib::Result& result) {
+        return result ? result->get_header_value("CIMError") : "no response";
+    }
+    static HostProcess* host_;
+};
+
+HostProcess* RawHttpTest::host_ = nullptr;
+
+TEST_F(RawHttpTest, ValidRequestAnswersMethodResponse) {
+    auto result = post(requestWith(""), headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 200);
+    EXPECT_EQ(result->get_header_value("CIMOperation"), "MethodResponse");
+    EXPECT_NE(result->body.find("<CLASSNAME NAME=\"Raw_Base\"></CLASSNAME>"), std::string::npos) << result->body;
+}
+
+TEST_F(RawHttpTest, MissingCimOperationHeaderAnswers400UnsupportedOperation) {
+    auto hdrs = headers("EnumerateClassNames");
+    hdrs.erase("CIMOperation");
+    auto result = post(requestWith(""), hdrs);
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 400);
+    EXPECT_EQ(cimError(result), "unsupported-operation");
+}
+
+TEST_F(RawHttpTest, WrongCimOperationValueAnswers400UnsupportedOperation) {
+    auto hdrs = headers("EnumerateClassNames");
+    hdrs.erase("CIMOperation");
+    hdrs.emplace("CIMOperation", "MethodResponse");
+    auto result = post(requestWith(""), hdrs);
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 400);
+    EXPECT_EQ(cimError(result), "unsupported-operation");
+}
+
+TEST_F(RawHttpTest, MissingCimMethodHeaderAnswers400HeaderMismatch) {
+    auto hdrs = headers("EnumerateClassNames");
+    hdrs.erase("CIMMethod");
+    auto result = post(requestWith(""), hdrs);
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 400);
+    EXPECT_EQ(cimError(result), "header-mismatch");
+}
+
+TEST_F(RawHttpTest, CimObjectOfAnotherNamespaceAnswers400HeaderMismatch) {
+    auto result = post(requestWith(""), headers("EnumerateClassNames", "root%2Finterop"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 400);
+    EXPECT_EQ(cimError(result), "header-mismatch");
+}
+
+TEST_F(RawHttpTest, MalformedXmlAnswers400RequestNotWellFormed) {
+    auto result = post("<CIM CIMVERSION=\"2.0\"><MESSAGE>", headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 400);
+    EXPECT_EQ(cimError(result), "request-not-well-formed");
+}
+
+TEST_F(RawHttpTest, EmptyBodyAnswers400RequestNotWellFormed) {
+    auto result = post("", headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 400);
+    EXPECT_EQ(cimError(result), "request-not-well-formed");
+}
+
+TEST_F(RawHttpTest, EntityExpansionIsRejectedAsNotWellFormed) {
+    const std::string bomb =
+        "<?xml version=\"1.0\"?><!DOCTYPE CIM [<!ENTITY a \"aaaaaaaaaa\"><!ENTITY b \"&a;&a;&a;&a;&a;&a;\">]>"
+        "<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">&b;</CIM>";
+    auto result = post(bomb, headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 400);
+    EXPECT_EQ(cimError(result), "request-not-well-formed");
+}
+
+TEST_F(RawHttpTest, DeeplyNestedXmlAnswers400RequestNotWellFormed) {
+    std::string deep;
+    for (int i = 0; i < 1000; ++i) {
+        deep += "<A>";
+    }
+    auto result = post(deep, headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 400);
+    EXPECT_EQ(cimError(result), "request-not-well-formed");
+}
+
+TEST_F(RawHttpTest, WellFormedButInvalidCimXmlAnswers400RequestNotValid) {
+    auto result = post("<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"><FOO/></CIM>", headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 400);
+    EXPECT_EQ(cimError(result), "request-not-valid");
+}
+
+TEST_F(RawHttpTest, OversizedBodyAnswers413) {
+    std::string body = requestWith(std::string(70000, ' '));
+    auto result = post(body, headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 413);
+}
+
+TEST_F(RawHttpTest, UnsupportedProtocolVersionAnswers501) {
+    std::string body = requestWith("");
+    body.replace(body.find("PROTOCOLVERSION=\"1.0\""), 21, "PROTOCOLVERSION=\"2.0\"");
+    auto result = post(body, headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 501);
+    EXPECT_EQ(cimError(result), "unsupported-protocol-version");
+}
+
+TEST_F(RawHttpTest, MultipleRequestsAnswer501) {
+    const std::string body =
+        "<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"><MESSAGE ID=\"1\" PROTOCOLVERSION=\"1.0\"><MULTIREQ/></MESSAGE></CIM>";
+    auto result = post(body, headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 501);
+    EXPECT_EQ(cimError(result), "multiple-requests-unsupported");
+}
+
+TEST_F(RawHttpTest, UnknownOperationAnswersCimErrNotSupported) {
+    auto result = post(requestWith("", "FrobnicateInstances"), headers("FrobnicateInstances"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 200);
+    EXPECT_NE(result->body.find("<ERROR CODE=\"7\""), std::string::npos) << result->body;
+}
+
+TEST_F(RawHttpTest, WrongParameterTypeAnswersCimErrInvalidParameter) {
+    auto result = post(requestWith("<IPARAMVALUE NAME=\"DeepInheritance\"><CLASSNAME NAME=\"X\"/></IPARAMVALUE>"),
+                       headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 200);
+    EXPECT_NE(result->body.find("<ERROR CODE=\"4\""), std::string::npos) << result->body;
+}
+
+TEST_F(RawHttpTest, NonBooleanValueAnswersCimErrInvalidParameter) {
+    auto result = post(requestWith("<IPARAMVALUE NAME=\"DeepInheritance\"><VALUE>maybe</VALUE></IPARAMVALUE>"),
+                       headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_NE(result->body.find("<ERROR CODE=\"4\""), std::string::npos) << result->body;
+}
+
+TEST_F(RawHttpTest, UnknownParameterAnswersCimErrInvalidParameter) {
+    auto result = post(requestWith("<IPARAMVALUE NAME=\"Colour\"><VALUE>red</VALUE></IPARAMVALUE>"),
+                       headers("EnumerateClassNames"));
+    ASSERT_TRUE(result);
+    EXPECT_NE(result->body.find("<ERROR CODE=\"4\""), std::string::npos) << result->body;
+}
+
+TEST_F(RawHttpTest, KeyValueOfWrongTypeAnswersCimErrInvalidParameter) {
+    const std::string params =
+        "<IPARAMVALUE NAME=\"InstanceName\"><INSTANCENAME CLASSNAME=\"Raw_Assoc\"><KEYBINDING NAME=\"Left\">"
+        "<KEYVALUE VALUETYPE=\"string\">not a path</KEYVALUE></KEYBINDING></INSTANCENAME></IPARAMVALUE>";
+    auto result = post(requestWith(params, "GetInstance"), headers("GetInstance"));
+    ASSERT_TRUE(result);
+    EXPECT_NE(result->body.find("<ERROR CODE=\"4\""), std::string::npos) << result->body;
+}
+
+TEST_F(RawHttpTest, GetAnswers405) {
+    httplib::Client client("127.0.0.1", host_->port());
+    auto result = client.Get("/cimom");
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 405);
+}
+
+TEST_F(RawHttpTest, MissingCredentialsAnswer401WithChallenge) {
+    auto result = post(requestWith(""), headers("EnumerateClassNames"), false);
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 401);
+    EXPECT_EQ(result->get_header_value("WWW-Authenticate"), "Basic realm=\"orv-cimhost\"");
+}
+
+TEST_F(RawHttpTest, WrongPasswordAnswers401) {
+    httplib::Client client("127.0.0.1", host_->port());
+    client.set_basic_auth("user", "wrong");
+    auto result = client.Post("/cimom", headers("EnumerateClassNames"), requestWith(""), "application/xml");
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 401);
+}
+
+TEST_F(RawHttpTest, MalformedHttpRequestLineAnswers400) {
+    const int fd = socket(AF_INET, SOCK_STREAM, 0);
+    sockaddr_in address{};
+    address.sin_family = AF_INET;
+    address.sin_port = htons(static_cast<uint16_t>(host_->port()));
+    address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
+    ASSERT_EQ(connect(fd, reinterpret_cast<sockaddr*>(&address), sizeof address), 0);
+    const std::string garbage = "THIS IS NOT HTTP\r\n\r\n";
+    ASSERT_EQ(write(fd, garbage.data(), garbage.size()), static_cast<ssize_t>(garbage.size()));
+    char buffer[256] = {};
+    timeval timeout{5, 0};
+    setsockopt(fd, SOL_SOCKET, SO_RCVTIMEO, &timeout, sizeof timeout);
+    const ssize_t n = read(fd, buffer, sizeof buffer - 1);
+    close(fd);
+    ASSERT_GT(n, 0);
+    EXPECT_EQ(std::string(buffer).substr(0, 12), "HTTP/1.1 400");
+}
+
+}  // namespace
+}  // namespace orv::e2e
