@@ -1,0 +1,103 @@
+// CIM-XML output: escaping, the response envelope and class encoding from MOF.
+#include <gtest/gtest.h>
+
+#include "orv/cimxml/class_encoder.hpp"
+#include "orv/cimxml/cmpi_value.hpp"
+#include "orv/cimxml/response_writer.hpp"
+#include "orv/cimxml/xml_tree.hpp"
+#include "orv/repository/class_repository.hpp"
+
+namespace orv::cimxml {
+namespace {
+
+TEST(XmlWriter, EscapesMarkupAndControlCharacters) {
+    XmlWriter out;
+    out.open("V").attr("A", "<\"&'>").text("a\tb\x01").close();
+    EXPECT_EQ(out.take(), "<V A=\"&lt;&quot;&amp;&apos;&gt;\">a&#9;b</V>");
+}
+
+TEST(ResponseWriter, ErrorResponseCarriesCodeAndDescription) {
+    const std::string doc = errorResponse("9", "GetInstance", true, 7, "not here");
+    EXPECT_NE(doc.find("<IMETHODRESPONSE NAME=\"GetInstance\"><ERROR CODE=\"7\" DESCRIPTION=\"not here\"></ERROR>"),
+              std::string::npos) << doc;
+    EXPECT_NO_THROW(parseXmlDocument(doc));
+}
+
+TEST(CmpiValue, ScalarsUseCimXmlText) {
+    CMPIData data{};
+    data.type = CMPI_boolean;
+    data.value.boolean = 1;
+    EXPECT_EQ(scalarText(data), "TRUE");
+    data.type = CMPI_sint8;
+    data.value.sint8 = -5;
+    EXPECT_EQ(scalarText(data), "-5");
+    data.type = CMPI_real64;
+    data.value.real64 = 0.1;
+    EXPECT_EQ(scalarText(data), "0.1");
+    data.type = CMPI_char16;
+    data.value.char16 = 0x20AC;
+    EXPECT_EQ(scalarText(data), "\xE2\x82\xAC");
+    data.state = CMPI_nullValue;
+    EXPECT_EQ(scalarText(data), std::nullopt);
+}
+
+TEST(CmpiValue, KeyValueTypes) {
+    EXPECT_EQ(keyValueType(CMPI_uint16), "numeric");
+    EXPECT_EQ(keyValueType(CMPI_boolean), "boolean");
+    EXPECT_EQ(keyValueType(CMPI_string), "string");
+    EXPECT_EQ(keyValueType(CMPI_char16), "string");
+    EXPECT_EQ(keyValueType(CMPI_dateTime), "string");
+}
+
+class ClassEncoderTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        classes.loadText(
+            "Qualifier Key : boolean = false, Scope(property, reference), Flavor(DisableOverride, ToSubclass);\n"
+            "Qualifier In : boolean = true, Scope(parameter), Flavor(DisableOverride, ToSubclass);\n"
+            "class Base { [Key] string Name; uint16 Codes[] = {1, 2}; };\n"
+            "class Child : Base { Base REF Other; boolean Flag = true; uint32 Go([In] string Why); };\n",
+            "test.mof");
+    }
+    std::string encode(const ClassEncoding& encoding) {
+        XmlWriter out;
+        writeClass(out, *classes.getClass("root/cimv2", "Child"), encoding);
+        return out.take();
+    }
+    repository::ClassRepository classes;
+};
+
+TEST_F(ClassEncoderTest, LocalOnlyLeavesInheritedPropertiesOut) {
+    ClassEncoding encoding;
+    encoding.localOnly = true;
+    const std::string xml = encode(encoding);
+    EXPECT_EQ(xml.find("NAME=\"Name\""), std::string::npos) << xml;
+    EXPECT_NE(xml.find("<PROPERTY.REFERENCE NAME=\"Other\" REFERENCECLASS=\"Base\">"), std::string::npos) << xml;
+    EXPECT_NE(xml.find("<PROPERTY NAME=\"Flag\" TYPE=\"boolean\"><VALUE>TRUE</VALUE></PROPERTY>"), std::string::npos);
+    EXPECT_NE(xml.find("<METHOD NAME=\"Go\" TYPE=\"uint32\"><PARAMETER NAME=\"Why\" TYPE=\"string\">"), std::string::npos)
+        << xml;
+}
+
+TEST_F(ClassEncoderTest, FullClassCarriesInheritedArraysOriginsAndQualifiers) {
+    ClassEncoding encoding;
+    encoding.localOnly = false;
+    encoding.includeClassOrigin = true;
+    const std::string xml = encode(encoding);
+    EXPECT_NE(xml.find("<CLASS NAME=\"Child\" SUPERCLASS=\"Base\">"), std::string::npos) << xml;
+    EXPECT_NE(xml.find("<PROPERTY.ARRAY NAME=\"Codes\" TYPE=\"uint16\" CLASSORIGIN=\"Base\" PROPAGATED=\"true\">"
+                       "<VALUE.ARRAY><VALUE>1</VALUE><VALUE>2</VALUE></VALUE.ARRAY>"),
+              std::string::npos) << xml;
+    EXPECT_NE(xml.find("<QUALIFIER NAME=\"Key\" TYPE=\"boolean\""), std::string::npos) << xml;
+}
+
+TEST_F(ClassEncoderTest, PropertyListKeepsOnlyNamedProperties) {
+    ClassEncoding encoding;
+    encoding.localOnly = false;
+    encoding.propertyList = std::vector<std::string>{"flag"};
+    const std::string xml = encode(encoding);
+    EXPECT_EQ(xml.find("NAME=\"Name\""), std::string::npos);
+    EXPECT_NE(xml.find("NAME=\"Flag\""), std::string::npos);
+}
+
+}  // namespace
+}  // namespace orv::cimxml
