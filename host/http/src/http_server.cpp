@@ -98,6 +98,8 @@ void HttpServer::Impl::configure() {
     const std::size_t threads = options.threads == 0 ? 1 : options.threads;
     server.new_task_queue = [threads] { return new httplib::ThreadPool(threads); };
     server.set_socket_options(listeningSocketOptions);
+    // Responses go out as headers then body; without this Nagle holds the body back.
+    server.set_tcp_nodelay(true);
     server.set_payload_max_length(options.maxRequestBytes);
     server.set_read_timeout(options.readTimeout);
     server.set_write_timeout(options.writeTimeout);
