@@ -1,0 +1,67 @@
+// A running simulated host follows its fixture file.
+#include <gtest/gtest.h>
+
+#include "KsiHelpers.h"
+#include "SimHost.h"
+#include "tmkctl/network/NetworkInfoImpl.h"
+#include "tmkctl/util/AutoVector.h"
+
+namespace orv::platform::test {
+namespace {
+
+using TmkCtl::Network::NetworkInfoImpl;
+
+TEST(FixtureReread, ChangedFileIsSeenByTheNextRequest)
+{
+    Json fixture = defaultHost();
+    SimHost host(fixture);
+    EXPECT_EQ(TmkCtl::Util::AutoVector<NodeMgr::Network::Pnic>(NetworkInfoImpl().GetPnics()).size(), 4u);
+    fixture["nics"].erase(3);
+    host.rewrite(fixture);
+    EXPECT_EQ(TmkCtl::Util::AutoVector<NodeMgr::Network::Pnic>(NetworkInfoImpl().GetPnics()).size(), 3u);
+}
+
+TEST(FixtureReread, WithinOneBatchTheDataStaysAsItWas)
+{
+    Json fixture = defaultHost();
+    SimHost host(fixture);
+    ASSERT_EQ(checkSignature(), KSI_OK);
+    fixture["cpu"]["powerPolicy"]["shortName"] = "static";
+    host.rewrite(fixture);
+    PowerKsi_Policy policy;
+    ASSERT_EQ(KSI_Get(KSI_NODE_power_currentPolicy, nullptr, &policy, sizeof policy), KSI_OK);
+    EXPECT_STREQ(policy.shortName, "dynamic");
+    ASSERT_EQ(checkSignature(), KSI_OK);
+    ASSERT_EQ(KSI_Get(KSI_NODE_power_currentPolicy, nullptr, &policy, sizeof policy), KSI_OK);
+    EXPECT_STREQ(policy.shortName, "static");
+}
+
+TEST(FixtureReread, BrokenThenFixedFileRecovers)
+{
+    Json fixture = defaultHost();
+    SimHost host(fixture);
+    testing::internal::CaptureStderr();
+    host.rewriteText("{ broken");
+    EXPECT_NE(checkSignature(), KSI_OK);
+    EXPECT_NE(checkSignature(), KSI_OK);  // unchanged: not reported again
+    const std::string reported = testing::internal::GetCapturedStderr();
+    EXPECT_EQ(reported.find("rejected"), reported.rfind("rejected")) << reported;
+    EXPECT_NE(reported.find("rejected"), std::string::npos) << reported;
+    host.rewrite(fixture);
+    EXPECT_EQ(checkSignature(), KSI_OK);
+}
+
+TEST(FixtureReread, FaultCountersStartAgainWithANewFile)
+{
+    Json fixture = defaultHost();
+    addFault(fixture, {{"call", "KSI_CheckSig"}, {"nth", 1}});
+    SimHost host(fixture);
+    EXPECT_NE(checkSignature(), KSI_OK);
+    EXPECT_EQ(checkSignature(), KSI_OK);
+    fixture["host"]["name"] = "renamed";
+    host.rewrite(fixture);
+    EXPECT_NE(checkSignature(), KSI_OK);
+}
+
+} // namespace
+} // namespace orv::platform::test
