@@ -277,19 +277,20 @@ private:
         if (tok_.kind != TokenKind::Identifier) {
             fail("expected a data type " + std::string(what));
         }
-        const Token first = tok_;
+        const std::string_view firstWord = tok_.spelling;
+        const int firstLine = tok_.line;
         advance();
         if (tok_.isWord("ref")) {
             advance();
             DataType t;
             t.type = CimType::Reference;
-            t.referenceClass = std::string(first.spelling);
+            t.referenceClass = std::string(firstWord);
             return t;
         }
-        const auto type = cimTypeFromName(first.spelling);
+        const auto type = cimTypeFromName(firstWord);
         if (!type) {
-            throw MofError(lexer_.fileName(), first.line,
-                           "unknown data type '" + std::string(first.spelling) + "' " +
+            throw MofError(lexer_.fileName(), firstLine,
+                           "unknown data type '" + std::string(firstWord) + "' " +
                                std::string(what));
         }
         DataType t;
