@@ -41,7 +41,7 @@ public:
         return enumInstances(ctx, paths, cop, nullptr);
     }
 
-    CmpiStatus getInstance(const CmpiContext&, CmpiResult& rslt, const CmpiObjectPath& cop,
+    CmpiStatus getInstance(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
                            const char** properties) override {
         const std::string name = static_cast<const char*>(cop.getKey("Name"));
         if (name == "throw-status") throw CmpiStatus(CMPI_RC_ERR_NOT_FOUND, "no such element");
@@ -56,6 +56,7 @@ public:
             inst.setProperty("InitializeCalls", CMPIUint32(initializeCalls_));
             inst.setProperty("Serial", CMPIUint32(serial_));
             inst.setProperty("UseCount", CMPISint32(getProviderBase()->getUseCount()));
+            inst.setProperty("HostExtensions", CmpiBooleanData(ctx.hasThreadMemoryRelease()));
         }
         rslt.returnData(inst);
         rslt.returnDone();
