@@ -9,6 +9,9 @@ class CmpiBaseMI;
 class CmpiProviderBase {
 public:
     CmpiProviderBase() = default;
+    // At unload, deletes a provider object that no cleanup released (a broker
+    // that cleans up one provider name per library leaves the others behind).
+    ~CmpiProviderBase();
     CmpiProviderBase(const CmpiProviderBase&) = delete;
     CmpiProviderBase& operator=(const CmpiProviderBase&) = delete;
 

@@ -1,0 +1,4 @@
+#include <cmpi/CmpiBaseMI.h>
+#include <cmpi/CmpiProviderBase.h>
+
+CmpiProviderBase::~CmpiProviderBase() { delete baseMI; }
