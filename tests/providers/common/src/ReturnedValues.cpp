@@ -66,6 +66,22 @@ std::string scalarText(const CMPIData& data) {
     }
 }
 
+// Every (name, value) of an object that counts them and hands them out by index.
+template <typename Count, typename At>
+std::vector<NamedValue> namedValues(Count count, At at) {
+    CMPIStatus st{CMPI_RC_OK, nullptr};
+    const CMPICount total = count(&st);
+    check(st, "counting values");
+    std::vector<NamedValue> values;
+    for (CMPICount i = 0; i < total; ++i) {
+        CMPIString* name = nullptr;
+        const CMPIData data = at(i, &name, &st);
+        check(st, "reading a value by index");
+        values.push_back(NamedValue{stringText(name), data.type, valueText(data)});
+    }
+    return values;
+}
+
 }  // namespace
 
 std::ostream& operator<<(std::ostream& os, const NamedValue& value) {
@@ -110,17 +126,11 @@ std::string valueText(const CMPIData& data) {
 }
 
 std::vector<NamedValue> propertiesOf(const CMPIInstance* instance) {
-    CMPIStatus st{CMPI_RC_OK, nullptr};
-    const CMPICount count = instance->ft->getPropertyCount(instance, &st);
-    check(st, "getPropertyCount");
-    std::vector<NamedValue> values;
-    for (CMPICount i = 0; i < count; ++i) {
-        CMPIString* name = nullptr;
-        const CMPIData data = instance->ft->getPropertyAt(instance, i, &name, &st);
-        check(st, "getPropertyAt");
-        values.push_back(NamedValue{stringText(name), data.type, valueText(data)});
-    }
-    return values;
+    return namedValues(
+        [instance](CMPIStatus* st) { return instance->ft->getPropertyCount(instance, st); },
+        [instance](CMPICount i, CMPIString** name, CMPIStatus* st) {
+            return instance->ft->getPropertyAt(instance, i, name, st);
+        });
 }
 
 std::vector<std::string> propertyNamesOf(const CMPIInstance* instance) {
@@ -141,17 +151,10 @@ std::optional<NamedValue> propertyOf(const CMPIInstance* instance, std::string_v
 }
 
 std::vector<NamedValue> keysOf(const CMPIObjectPath* path) {
-    CMPIStatus st{CMPI_RC_OK, nullptr};
-    const CMPICount count = path->ft->getKeyCount(path, &st);
-    check(st, "getKeyCount");
-    std::vector<NamedValue> keys;
-    for (CMPICount i = 0; i < count; ++i) {
-        CMPIString* name = nullptr;
-        const CMPIData data = path->ft->getKeyAt(path, i, &name, &st);
-        check(st, "getKeyAt");
-        keys.push_back(NamedValue{stringText(name), data.type, valueText(data)});
-    }
-    return keys;
+    return namedValues([path](CMPIStatus* st) { return path->ft->getKeyCount(path, st); },
+                       [path](CMPICount i, CMPIString** name, CMPIStatus* st) {
+                           return path->ft->getKeyAt(path, i, name, st);
+                       });
 }
 
 std::string classNameOf(const CMPIObjectPath* path) {
