@@ -189,8 +189,8 @@ void EthernetPortProvider::deliverClass(const CmpiContext& ctx, CmpiResult& resu
     }
 }
 
-// The only class whose instances honour the request's property list; the
-// list applies to the keys too.
+// The only class whose instances honour the request's property list, applied
+// without a key list of its own.
 void EthernetPortProvider::deliverPort(const CmpiContext& ctx, CmpiResult& result, const CmpiString& ns, Pnic* pnic,
                                        const char** properties, Delivery delivery) {
     const std::string name = pnic->GetName();
