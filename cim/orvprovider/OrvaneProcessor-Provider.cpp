@@ -67,6 +67,21 @@ long packagePosition(const CmpiObjectPath& ref) {
     return std::strtol(number, nullptr, 10);
 }
 
+// What a request for a class finds.
+enum class Collection { OtherClass, NoPackages, Packages };
+
+// Collects the host's packages when `cop` names the processor class (in any
+// letter case). A failed collection counts as no packages.
+Collection collectFor(const CmpiObjectPath& cop, std::vector<CpuDetails>& records) {
+    if (!cop.getClassName().equalsIgnoreCase(kProcessorClass)) {
+        return Collection::OtherClass;
+    }
+    if (OrvaneProcessor::getCpuDetails(records) != 0 || records.empty()) {
+        return Collection::NoPackages;
+    }
+    return Collection::Packages;
+}
+
 class OrvaneProcessorProvider : public CmpiInstanceMI {
 public:
     OrvaneProcessorProvider(const CmpiBroker& mbp, const CmpiContext& ctx)
@@ -81,13 +96,9 @@ public:
     // reported: the answer is then OK with nothing and no returnDone.
     CmpiStatus enumInstances(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
                              const char** properties) override {
-        const CmpiString className = cop.getClassName();
         CmpiString nameSpace = cop.getNameSpace();
-        if (!className.equalsIgnoreCase(kProcessorClass)) {
-            return CmpiStatus(CMPI_RC_OK);
-        }
         std::vector<CpuDetails> records;
-        if (OrvaneProcessor::getCpuDetails(records) != 0 || records.empty()) {
+        if (collectFor(cop, records) != Collection::Packages) {
             return CmpiStatus(CMPI_RC_OK);
         }
         for (CpuDetails& record : records) {
@@ -101,16 +112,13 @@ public:
     // keys are not compared.
     CmpiStatus getInstance(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
                            const char** properties) override {
-        const CmpiString className = cop.getClassName();
         CmpiString nameSpace = cop.getNameSpace();
-        if (!className.equalsIgnoreCase(kProcessorClass)) {
+        std::vector<CpuDetails> records;
+        const Collection collection = collectFor(cop, records);
+        if (collection == Collection::OtherClass) {
             return CmpiStatus(CMPI_RC_OK);
         }
-        std::vector<CpuDetails> records;
-        if (OrvaneProcessor::getCpuDetails(records) != 0 || records.empty()) {
-            return CmpiStatus(CMPI_RC_ERR_NOT_FOUND);
-        }
-        const long position = packagePosition(cop);
+        const long position = collection == Collection::Packages ? packagePosition(cop) : -1;
         if (position < 0 || static_cast<unsigned long>(position) >= records.size()) {
             return CmpiStatus(CMPI_RC_ERR_NOT_FOUND);
         }

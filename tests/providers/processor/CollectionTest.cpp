@@ -110,47 +110,42 @@ INSTANTIATE_TEST_SUITE_P(AnyOtherGivesSupportedNotEnabled, PowerPolicyTest,
                                            PolicyCase{"of", 1, 0}, PolicyCase{"dynami", 1, 0},
                                            PolicyCase{"", 1, 0}));
 
-TEST(DecidePCTLStatusTest, ComparesOnlyTheLeadingCharacters) {
+using Flags = std::pair<int, int>;  // (supported, enabled)
+
+Flags powerFlags(const char* shortName) {
     PowerKsi_Policy policy{};
+    std::snprintf(policy.shortName, sizeof policy.shortName, "%s", shortName);
     uint8_t supported = 9;
     uint8_t enabled = 9;
-    std::snprintf(policy.shortName, sizeof policy.shortName, "%s", "Dynamic balanced");
     OrvaneProcessor::decidePCTLStatus(policy, supported, enabled);
-    EXPECT_EQ(supported, 1);
-    EXPECT_EQ(enabled, 1);
-    std::snprintf(policy.shortName, sizeof policy.shortName, "%s", "Off");
-    OrvaneProcessor::decidePCTLStatus(policy, supported, enabled);
-    EXPECT_EQ(supported, 0);
-    EXPECT_EQ(enabled, 0);
+    return {supported, enabled};
+}
+
+// The flags decided for `state` when the enabled flag holds `enabledOnEntry`.
+Flags hyperthreadingFlags(Hardware_HTStateEnum state, uint8_t enabledOnEntry) {
+    uint8_t supported = 9;
+    uint8_t enabled = enabledOnEntry;
+    OrvaneProcessor::decideHTStatus(state, supported, enabled);
+    return {supported, enabled};
+}
+
+TEST(DecidePCTLStatusTest, ComparesOnlyTheLeadingCharacters) {
+    EXPECT_EQ(powerFlags("Dynamic balanced"), Flags(1, 1));
+    EXPECT_EQ(powerFlags("Off"), Flags(0, 0));
+    EXPECT_EQ(powerFlags("balanced dynamic"), Flags(1, 0));
 }
 
 TEST(DecideHTStatusTest, NotPresentClearsBothFlags) {
-    uint8_t supported = 1;
-    uint8_t enabled = 1;
-    OrvaneProcessor::decideHTStatus(HTNotPresent, supported, enabled);
-    EXPECT_EQ(supported, 0);
-    EXPECT_EQ(enabled, 0);
+    EXPECT_EQ(hyperthreadingFlags(HTNotPresent, 1), Flags(0, 0));
+    EXPECT_EQ(hyperthreadingFlags(HTNotPresent, 0), Flags(0, 0));
 }
 
 TEST(DecideHTStatusTest, EnabledIsComparedWithTheFlagNotWithTheEnabledState) {
-    uint8_t supported = 0;
-    uint8_t enabled = 0;
-    OrvaneProcessor::decideHTStatus(HTEnabled, supported, enabled);
-    EXPECT_EQ(supported, 1);
-    EXPECT_EQ(enabled, 0);
-
-    enabled = 3;
-    OrvaneProcessor::decideHTStatus(HTEnabled, supported, enabled);
-    EXPECT_EQ(enabled, 1);
-
-    enabled = 1;
-    OrvaneProcessor::decideHTStatus(HTBIOSDisabled, supported, enabled);
-    EXPECT_EQ(supported, 1);
-    EXPECT_EQ(enabled, 1);
-
-    enabled = 2;
-    OrvaneProcessor::decideHTStatus(HTTMKDisabled, supported, enabled);
-    EXPECT_EQ(enabled, 1);
+    EXPECT_EQ(hyperthreadingFlags(HTEnabled, 0), Flags(1, 0));
+    EXPECT_EQ(hyperthreadingFlags(HTEnabled, 3), Flags(1, 1));
+    EXPECT_EQ(hyperthreadingFlags(HTBIOSDisabled, 1), Flags(1, 1));
+    EXPECT_EQ(hyperthreadingFlags(HTTMKDisabled, 2), Flags(1, 1));
+    EXPECT_EQ(hyperthreadingFlags(HTBIOSDisabled, 0), Flags(1, 0));
 }
 
 TEST_F(CollectionTest, HyperthreadingEnabledHostGivesSupportedButNeverEnabled) {

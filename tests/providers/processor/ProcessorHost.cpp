@@ -24,6 +24,15 @@ Json leafJson(const uint32_t (&registers)[4]) {
     return Json::array({hex(registers[0]), hex(registers[1]), hex(registers[2]), hex(registers[3])});
 }
 
+// Leaf 0 naming a vendor; every other register 0.
+Leaves vendorOnly(uint32_t ebx, uint32_t edx, uint32_t ecx) {
+    Leaves leaves;
+    leaves.id0[1] = ebx;
+    leaves.id0[2] = ecx;
+    leaves.id0[3] = edx;
+    return leaves;
+}
+
 Json zeroLeaf() { return Json::array({0, 0, 0, 0}); }
 
 Json cpuidJson(const Leaves& leaves) {
@@ -51,10 +60,7 @@ Json packagesJson(const std::optional<std::vector<Package>>& packages) {
 }  // namespace
 
 Leaves intelLeaves(uint32_t id1Ebx, uint32_t id1Ecx, uint32_t id81Edx) {
-    Leaves leaves;
-    leaves.id0[1] = kIntelEbx;
-    leaves.id0[2] = kIntelEcx;
-    leaves.id0[3] = kIntelEdx;
+    Leaves leaves = vendorOnly(kIntelEbx, kIntelEdx, kIntelEcx);
     leaves.id1[1] = id1Ebx;
     leaves.id1[2] = id1Ecx;
     leaves.id81[3] = id81Edx;
@@ -62,10 +68,7 @@ Leaves intelLeaves(uint32_t id1Ebx, uint32_t id1Ecx, uint32_t id81Edx) {
 }
 
 Leaves amdLeaves(uint32_t id1Ebx, uint32_t id81Ecx, uint32_t id81Edx) {
-    Leaves leaves;
-    leaves.id0[1] = kAmdEbx;
-    leaves.id0[2] = kAmdEcx;
-    leaves.id0[3] = kAmdEdx;
+    Leaves leaves = vendorOnly(kAmdEbx, kAmdEdx, kAmdEcx);
     leaves.id1[1] = id1Ebx;
     leaves.id81[2] = id81Ecx;
     leaves.id81[3] = id81Edx;
@@ -73,10 +76,7 @@ Leaves amdLeaves(uint32_t id1Ebx, uint32_t id81Ecx, uint32_t id81Edx) {
 }
 
 Leaves vendorLeaves(uint32_t ebx, uint32_t edx, uint32_t ecx) {
-    Leaves leaves;
-    leaves.id0[1] = ebx;
-    leaves.id0[2] = ecx;
-    leaves.id0[3] = edx;
+    Leaves leaves = vendorOnly(ebx, edx, ecx);
     for (uint32_t& reg : leaves.id1) {
         reg = 0xFFFFFFFF;
     }
