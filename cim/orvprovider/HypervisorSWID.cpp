@@ -102,6 +102,13 @@ void requireServedClass(const CmpiObjectPath& cop, const char* operation) {
     }
 }
 
+// An instance on path restricted to the requested properties (the key kept).
+CmpiInstance filteredInstance(const CmpiObjectPath& path, const char** properties) {
+    CmpiInstance instance(path);
+    instance.setPropertyFilter(properties, kKeyNames);
+    return instance;
+}
+
 void setDate(CmpiInstance& instance, const char* name, CMPIUint64 microseconds) {
     instance.setProperty(name, CmpiData(CmpiDateTime(microseconds, false)));
 }
@@ -163,8 +170,7 @@ public:
         }
         populateVersionInfo();
         for (const VersionRecord* record : records()) {
-            CmpiInstance instance(cop);
-            instance.setPropertyFilter(properties, kKeyNames);
+            CmpiInstance instance = filteredInstance(cop, properties);
             fillInstance(instance, *record);
             rslt.returnData(instance);
         }
@@ -177,8 +183,7 @@ public:
         OMC::MutexLock lock(_infolock);
         requireServedClass(cop, "getInstance");
         populateVersionInfo();
-        CmpiInstance instance(CmpiObjectPath(cop.getNameSpace(), kServedClass));
-        instance.setPropertyFilter(properties, kKeyNames);
+        CmpiInstance instance = filteredInstance(CmpiObjectPath(cop.getNameSpace(), kServedClass), properties);
         const CmpiData key = cop.getKey("InstanceID");
         const char* instanceId = key;
         const VersionRecord* record = recordWithId(instanceId == nullptr ? "" : instanceId);
