@@ -35,8 +35,12 @@ function(orv_add_gtest name)
   add_executable(${name} ${ARG_SOURCES})
   orv_project_target(${name})
   target_link_libraries(${name} PRIVATE ${ARG_LIBS} GTest::gtest GTest::gtest_main GTest::gmock Threads::Threads)
-  gtest_discover_tests(${name} DISCOVERY_TIMEOUT 60
-    PROPERTIES ENVIRONMENT "ORV_BUILD_DIR=${CMAKE_BINARY_DIR};ORV_SOURCE_DIR=${CMAKE_SOURCE_DIR}")
+  # The suite runs (and is listed) through env(1) so that it sees where the build
+  # and the sources are. A list-valued ENVIRONMENT test property would lose all but
+  # its first entry on its way through gtest_discover_tests.
+  set_target_properties(${name} PROPERTIES CROSSCOMPILING_EMULATOR
+    "/usr/bin/env;ORV_BUILD_DIR=${CMAKE_BINARY_DIR};ORV_SOURCE_DIR=${CMAKE_SOURCE_DIR}")
+  gtest_discover_tests(${name} DISCOVERY_TIMEOUT 60)
 endfunction()
 
 # Adds every sub-folder of the current folder that has a CMakeLists.txt, in name order.
