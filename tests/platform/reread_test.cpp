@@ -65,3 +65,47 @@ TEST(FixtureReread, FaultCountersStartAgainWithANewFile)
 
 } // namespace
 } // namespace orv::platform::test
+
+#include <atomic>
+#include <thread>
+
+namespace orv::platform::test {
+namespace {
+
+TEST(FixtureReread, ConcurrentRequestsWhileTheFileChanges)
+{
+    Json fixture = defaultHost();
+    SimHost host(fixture);
+    std::atomic<bool> stop{false};
+    std::atomic<int> requests{0};
+    auto worker = [&] {
+        while (!stop.load()) {
+            TmkCtl::Util::AutoVector<NodeMgr::Network::Pnic> pnics = NetworkInfoImpl().GetPnics();
+            EXPECT_GE(pnics.size(), 3u);
+            for (NodeMgr::Network::Pnic* pnic : pnics) {
+                EXPECT_FALSE(pnic->GetName().empty());
+            }
+            EXPECT_EQ(checkSignature(), KSI_OK);
+            ++requests;
+        }
+    };
+    std::thread first(worker);
+    std::thread second(worker);
+    for (int i = 0; i < 20; ++i) {
+        fixture["nics"][0]["mtu"] = 1500 + i;
+        if (i % 2 == 0) {
+            fixture["nics"].push_back(defaultHost()["nics"][0]);
+            fixture["nics"].back()["name"] = "extra" + std::to_string(i);
+        }
+        host.rewrite(fixture);
+    }
+    while (requests.load() < 50) {
+        std::this_thread::yield();
+    }
+    stop = true;
+    first.join();
+    second.join();
+}
+
+} // namespace
+} // namespace orv::platform::test

@@ -15,7 +15,12 @@ typedef uint32_t KSI_HEX_U32;
 /* The host CPU model name: 48 bytes, not necessarily NUL-terminated. */
 typedef char KSI_HardwareCharArray48[48];
 
+/* 4 bytes; in C++ any int value is a valid value of the type. */
+#ifdef __cplusplus
+typedef enum Hardware_HTStateEnum : int {
+#else
 typedef enum Hardware_HTStateEnum {
+#endif
     HTNotPresent = 0,
     HTBIOSDisabled = 1,
     HTTMKDisabled = 2,

@@ -1,5 +1,6 @@
 // Enumerations of the physical-NIC interface. The numeric values are part of
-// the interface: link speeds are in megabits per second.
+// the interface: link speeds are in megabits per second. Each is an int, so
+// a value the library does not list (a newer speed, say) is still a valid value.
 #pragma once
 
 #include <cstdint>
@@ -8,7 +9,7 @@
 namespace NodeMgr {
 namespace Network {
 
-enum LinkSpeed {
+enum LinkSpeed : int {
     CONNECTION_AUTO = 0,
     CONNECTION_10 = 10,
     CONNECTION_100 = 100,
@@ -24,13 +25,13 @@ enum LinkSpeed {
     CONNECTION_100000 = 100000
 };
 
-enum Duplex {
+enum Duplex : int {
     DUPLEX_MODE_AUTO = 0,
     DUPLEX_MODE_FULL = 1,
     DUPLEX_MODE_HALF = 2
 };
 
-enum PnicPortMode {
+enum PnicPortMode : int {
     PNICPORT_MODE_TP = 0,
     PNICPORT_MODE_AUI = 1,
     PNICPORT_MODE_BNC = 2,
@@ -40,13 +41,13 @@ enum PnicPortMode {
     PNICPORT_MODE_UNKNOWN = 6
 };
 
-enum TransceiverMode {
+enum TransceiverMode : int {
     TRANSCEIVER_MODE_INTERNAL = 0,
     TRANSCEIVER_MODE_EXTERNAL = 1,
     TRANSCEIVER_MODE_UNKNOWN = 2
 };
 
-enum WakeOnMode {
+enum WakeOnMode : int {
     WAKEON_MODE_PHY = 0,
     WAKEON_MODE_UCAST = 1,
     WAKEON_MODE_MCAST = 2,
@@ -59,7 +60,7 @@ enum WakeOnMode {
 };
 
 // Result of the pause-frame auto-negotiation.
-enum PauseAutoNegResult {
+enum PauseAutoNegResult : int {
     AUTO_NEG_NOT_AVAIL = 0,
     AUTO_NEG_ON = 1,
     AUTO_NEG_OFF = 2
