@@ -1,8 +1,7 @@
 // The broker core serving the built provider library, for provider tests.
 //
-// It loads build/lib/liborvprovider.so (ORV_BUILD_DIR) with the project's
-// registration cim/mof/orvprovider.reg and classes cim/mof/orvprovider.mof
-// (ORV_SOURCE_DIR), exactly as orv-cimhost does, and sends requests through
+// It loads build/lib/liborvprovider.so with the project's registration
+// cim/mof/orvprovider.reg and classes cim/mof/orvprovider.mof, exactly as orv-cimhost does, and sends requests through
 // the ordinary CMPI function tables. Paths made by the helpers live as long as
 // the ProviderCore; each Reply owns what it returned.
 //
@@ -43,7 +42,8 @@ struct ProviderCoreOptions {
 
 class ProviderCore {
 public:
-    // ORV_BUILD_DIR and ORV_SOURCE_DIR, which ctest sets for every test.
+    // ORV_BUILD_DIR and ORV_SOURCE_DIR when set, else the build and source
+    // folders this fixture was compiled in.
     static std::filesystem::path buildDir();
     static std::filesystem::path sourceDir();
     static std::filesystem::path registrationFile();  // cim/mof/orvprovider.reg
