@@ -18,7 +18,6 @@ namespace orv::cimhost {
 namespace fs = std::filesystem;
 
 struct CimHost::Impl {
-    repository::ClassRepository classes;
     std::unique_ptr<host::BrokerCore> core;
     std::unique_ptr<CimDispatcher> dispatcher;
     std::unique_ptr<http::HttpServer> server;
@@ -76,15 +75,15 @@ host::CoreConfig coreConfig(const HostConfig& config) {
 
 CimHost::CimHost(const HostConfig& config) : impl_(std::make_unique<Impl>()) {
     detail::selectPlatform(config);
-    detail::checkProviders(config);
-    detail::loadClasses(impl_->classes, config);
+    detail::checkInputFiles(config);
     try {
         impl_->core = std::make_unique<host::BrokerCore>(coreConfig(config));
     } catch (const std::exception& error) {
-        throw std::runtime_error(std::string("broker core: ") + error.what());
+        throw std::runtime_error(error.what());
     }
+    detail::preloadProviders(*impl_->core);
     impl_->dispatcher = std::make_unique<CimDispatcher>(
-        *impl_->core, impl_->classes, config.hostName.empty() ? machineName() : config.hostName);
+        *impl_->core, impl_->core->classes(), config.hostName.empty() ? machineName() : config.hostName);
     const CimDispatcher* dispatcher = impl_->dispatcher.get();
     impl_->server = std::make_unique<http::HttpServer>(
         serverOptions(config),

@@ -1,13 +1,7 @@
 #include "startup_checks.hpp"
 
-#include <dlfcn.h>
-
-#include <algorithm>
 #include <cstdlib>
-#include <set>
 #include <stdexcept>
-
-#include "orv/repository/registration.hpp"
 
 namespace orv::cimhost::detail {
 
@@ -19,42 +13,12 @@ namespace {
     throw std::runtime_error(message);
 }
 
-// The first provider folder holding lib<location>.so, as the core searches them.
-fs::path findLibrary(const HostConfig& config, const std::string& location) {
-    const std::string fileName = "lib" + location + ".so";
-    for (const auto& dir : config.providerDirs) {
-        if (fs::exists(dir / fileName)) {
-            return dir / fileName;
+void requireExisting(const std::vector<fs::path>& paths, const char* what) {
+    for (const auto& path : paths) {
+        if (!fs::exists(path)) {
+            startFailure(std::string(what) + " " + path.string() + " does not exist");
         }
     }
-    std::string searched;
-    for (const auto& dir : config.providerDirs) {
-        searched += (searched.empty() ? "" : ", ") + dir.string();
-    }
-    startFailure("provider library " + fileName + " not found in " + (searched.empty() ? "(no folder)" : searched));
-}
-
-void checkLoadable(const fs::path& library) {
-    void* handle = dlopen(library.c_str(), RTLD_LAZY | RTLD_LOCAL);
-    if (handle == nullptr) {
-        const char* why = dlerror();
-        startFailure("provider library " + library.string() + " does not load: " + (why ? why : "unknown error"));
-    }
-    dlclose(handle);
-}
-
-std::vector<fs::path> mofFilesOf(const fs::path& path) {
-    if (!fs::is_directory(path)) {
-        return {path};
-    }
-    std::vector<fs::path> files;
-    for (const auto& entry : fs::directory_iterator(path)) {
-        if (entry.path().extension() == ".mof") {
-            files.push_back(entry.path());
-        }
-    }
-    std::sort(files.begin(), files.end());
-    return files;
 }
 
 }  // namespace
@@ -71,38 +35,15 @@ void selectPlatform(const HostConfig& config) {
     }
 }
 
-void checkProviders(const HostConfig& config) {
-    std::set<std::string> locations;
-    for (const auto& file : config.registrationFiles) {
-        if (!fs::exists(file)) {
-            startFailure("registration file " + file.string() + " does not exist");
-        }
-        try {
-            const repository::RegistrationSet registrations = repository::RegistrationSet::parseFile(file);
-            for (const auto& entry : registrations.all()) {
-                locations.insert(entry.location);
-            }
-        } catch (const std::exception& error) {
-            startFailure(error.what());
-        }
-    }
-    for (const auto& location : locations) {
-        checkLoadable(findLibrary(config, location));
-    }
+void checkInputFiles(const HostConfig& config) {
+    requireExisting(config.registrationFiles, "registration file");
+    requireExisting(config.mofFiles, "MOF file");
 }
 
-void loadClasses(repository::ClassRepository& classes, const HostConfig& config) {
-    for (const auto& path : config.mofFiles) {
-        if (!fs::exists(path)) {
-            startFailure("MOF file " + path.string() + " does not exist");
-        }
-        for (const auto& file : mofFilesOf(path)) {
-            try {
-                classes.loadFile(file, config.mofNamespace);
-            } catch (const std::exception& error) {
-                startFailure(error.what());
-            }
-        }
+void preloadProviders(host::BrokerCore& core) {
+    const std::vector<std::string> failures = core.preloadProviders();
+    if (!failures.empty()) {
+        startFailure(failures.front());
     }
 }
 

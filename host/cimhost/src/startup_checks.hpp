@@ -2,16 +2,17 @@
 #pragma once
 
 #include "orv/cimhost/host_config.hpp"
-#include "orv/repository/class_repository.hpp"
+#include "orv/host/broker_core.hpp"
 
 namespace orv::cimhost::detail {
 
 // Exports ORV_PLATFORM and ORV_SIM_FIXTURE when configured; the fixture must exist.
 void selectPlatform(const HostConfig& config);
-// Every registration file exists and parses, and every library it names is found in a
-// provider folder and loads.
-void checkProviders(const HostConfig& config);
-// Reads the MOF files (or folders of *.mof files, in name order) into `classes`.
-void loadClasses(repository::ClassRepository& classes, const HostConfig& config);
+// Every registration file and MOF path named by the configuration exists.
+void checkInputFiles(const HostConfig& config);
+// Loads every registered provider library through the core (each exactly once: the
+// libraries stay loaded for the requests); the first one that fails to load stops
+// the start with the dynamic loader's text.
+void preloadProviders(host::BrokerCore& core);
 
 }  // namespace orv::cimhost::detail

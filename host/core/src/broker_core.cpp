@@ -111,6 +111,10 @@ BrokerCore::~BrokerCore() { shutdown(); }
 
 const CMPIBroker* BrokerCore::broker() const noexcept { return impl_->services.broker(); }
 
+const orv::repository::ClassRepository& BrokerCore::classes() const noexcept { return impl_->services.classes(); }
+
+std::vector<std::string> BrokerCore::preloadProviders() { return impl_->services.preloadProviders(); }
+
 namespace {
 
 Reply send(detail::CoreServices& services, Request request, const CallOptions& opts) {

@@ -1,6 +1,7 @@
 #include "core.hpp"
 
 #include <algorithm>
+#include <set>
 #include <stdexcept>
 
 #include "broker_tables.hpp"
@@ -54,6 +55,19 @@ CoreServices::CoreServices(const CoreConfig& config) : broker_(makeBroker(this))
 }
 
 CoreServices::~CoreServices() { loader_->shutdown(); }
+
+std::vector<std::string> CoreServices::preloadProviders() {
+    std::vector<std::string> failures;
+    std::set<std::string> seen;
+    for (const ProviderRegistration* reg : registrations_) {
+        if (seen.insert(reg->location).second) {
+            if (std::string error = loader_->preload(reg->location); !error.empty()) {
+                failures.push_back(std::move(error));
+            }
+        }
+    }
+    return failures;
+}
 
 const std::vector<std::string>* CoreServices::keyNames(std::string_view ns, std::string_view className) const {
     std::string cacheKey = lowerCase(ns) + ":" + lowerCase(className);

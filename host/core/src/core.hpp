@@ -94,6 +94,8 @@ public:
     CMPIStatus deliver(const char* ns, const CMPIInstance* indication);
 
     ProviderLoader& loader() noexcept { return *loader_; }
+    // Loads each registered library once; the errors of those that failed.
+    std::vector<std::string> preloadProviders();
 
     // ClassSource
     const std::vector<std::string>* keyNames(std::string_view ns, std::string_view className) const override;

@@ -157,6 +157,14 @@ void* ProviderLoader::mi(const ProviderRegistration& reg, ProviderKind kind, std
     return found->second.mi;
 }
 
+std::string ProviderLoader::preload(const std::string& location) {
+    std::lock_guard lock(mutex_);
+    if (shutDown_) {
+        return "the broker core has been shut down";
+    }
+    return library(location).error;
+}
+
 ProviderEntry* ProviderLoader::provider(const std::string& name) {
     std::lock_guard lock(mutex_);
     auto found = providers_.find(name);

@@ -55,6 +55,9 @@ public:
     // The MI of the registration's provider for `kind`, created on first use.
     // On failure: nullptr and `error` holds the reason (with dlerror's text).
     void* mi(const ProviderRegistration& reg, ProviderKind kind, std::string* error);
+    // Loads the library of `location` now (once, as mi() would); its load
+    // error, or "" when it is loaded.
+    std::string preload(const std::string& location);
     // The provider's record (after mi() succeeded once), for indication state.
     ProviderEntry* provider(const std::string& name);
 

@@ -33,6 +33,8 @@
 #include <string_view>
 #include <vector>
 
+#include "orv/repository/class_repository.hpp"
+
 namespace orv::host {
 
 // What the core is built from. Bad MOF or registration input makes the
@@ -142,6 +144,13 @@ public:
 
     // The broker handed to providers (factory tables usable by clients too).
     const CMPIBroker* broker() const noexcept;
+    // The classes read from the MOF files, shared read-only with front ends.
+    const orv::repository::ClassRepository& classes() const noexcept;
+
+    // Loads every library the registrations name (each once, as a request would)
+    // so that a host can refuse to start on a broken one. Returns one line per
+    // library that failed: "cannot load provider library <path>: <dlerror text>".
+    std::vector<std::string> preloadProviders();
 
     // Instance operations. The namespace is the path's namespace.
     Reply enumerateInstances(const CMPIObjectPath* classPath, const CallOptions& opts = {});
