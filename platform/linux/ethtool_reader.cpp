@@ -1,10 +1,12 @@
 #include "ethtool_reader.hpp"
 
+#include "ethtool_messages.hpp"
 #include "linux_call_error.hpp"
 
 #include <algorithm>
 #include <cerrno>
 #include <cstring>
+#include <linux/ethtool_netlink.h>
 #include <memory>
 
 namespace orv::linuxhost {
@@ -21,6 +23,13 @@ LinkModeMask maskFromWords(const std::uint32_t* words, std::size_t count)
     return mask;
 }
 
+// The refusals that send a query back to the ioctl: no ethtool family in the
+// kernel, or a message type it does not know.
+bool netlinkUnavailable(int error)
+{
+    return error == ENOENT || error == EOPNOTSUPP || error == EINVAL;
+}
+
 // A buffer for commands that end in a variable array, zeroed, 8-byte aligned.
 struct CommandBuffer {
     explicit CommandBuffer(std::size_t length) : bytes((length + 7) / 8, 0), size(length) {}
@@ -32,22 +41,32 @@ struct CommandBuffer {
 
 }  // namespace
 
-bool LinkModeMask::test(unsigned bit) const
+EthtoolReader::EthtoolReader(EthtoolChannel& channel, std::string ifname, EthtoolNetlinkChannel* netlink)
+    : channel_(channel), ifname_(std::move(ifname)), netlink_(netlink)
 {
-    std::size_t word = bit / 32;
-    return word < words.size() && (words[word] >> (bit % 32)) & 1u;
 }
 
-void LinkModeMask::set(unsigned bit)
+template <typename Answer>
+bool EthtoolReader::fromNetlink(std::uint8_t message, const char* name,
+                                bool (*parse)(const NetlinkMessage&, Answer&), Answer& answer) const
 {
-    std::size_t word = bit / 32;
-    if (words.size() <= word) words.resize(word + 1, 0);
-    words[word] |= 1u << (bit % 32);
+    if (!netlink_) return false;
+    NetlinkMessage reply;
+    const int error = netlink_->query(message, ifname_, reply);
+    if (netlinkUnavailable(error)) return false;
+    if (error) throw LinuxCallError(name, ifname_, error);
+    if (!parse(reply, answer)) throw LinuxCallError(name, ifname_, EPROTO);
+    return true;
 }
 
-EthtoolReader::EthtoolReader(EthtoolChannel& channel, std::string ifname)
-    : channel_(channel), ifname_(std::move(ifname))
+template <typename Answer>
+Answer EthtoolReader::preferNetlink(std::uint8_t message, const char* messageName,
+                                   bool (*parse)(const NetlinkMessage&, Answer&), std::uint32_t command,
+                                   const char* commandName) const
 {
+    Answer answer{};
+    if (fromNetlink(message, messageName, parse, answer)) return answer;
+    return simple<Answer>(command, commandName);
 }
 
 void EthtoolReader::exchange(void* buffer, std::size_t size, const char* command) const
@@ -65,6 +84,23 @@ Answer EthtoolReader::simple(std::uint32_t command, const char* name) const
 }
 
 LinkSettings EthtoolReader::linkSettings() const
+{
+    if (auto settings = netlinkSettings()) return *settings;
+    return ioctlSettings();
+}
+
+std::optional<LinkSettings> EthtoolReader::netlinkSettings() const
+{
+    LinkSettings settings;
+    if (!fromNetlink(ETHTOOL_MSG_LINKINFO_GET, "ETHTOOL_MSG_LINKINFO_GET", parseLinkInfo, settings)) return std::nullopt;
+    if (!fromNetlink(ETHTOOL_MSG_LINKMODES_GET, "ETHTOOL_MSG_LINKMODES_GET", parseLinkModes, settings)) {
+        return std::nullopt;
+    }
+    settings.source = LinkSettingsSource::Netlink;
+    return settings;
+}
+
+LinkSettings EthtoolReader::ioctlSettings() const
 {
     const std::size_t headerSize = sizeof(ethtool_link_settings);
     CommandBuffer buffer(headerSize + 3 * kMaxMaskWords * sizeof(std::uint32_t));
@@ -124,22 +160,26 @@ ethtool_drvinfo EthtoolReader::driverInfo() const
 
 ethtool_wolinfo EthtoolReader::wakeOnLan() const
 {
-    return simple<ethtool_wolinfo>(ETHTOOL_GWOL, "ETHTOOL_GWOL");
+    return preferNetlink<ethtool_wolinfo>(ETHTOOL_MSG_WOL_GET, "ETHTOOL_MSG_WOL_GET", parseWakeOnLan, ETHTOOL_GWOL,
+                              "ETHTOOL_GWOL");
 }
 
 ethtool_coalesce EthtoolReader::coalesce() const
 {
-    return simple<ethtool_coalesce>(ETHTOOL_GCOALESCE, "ETHTOOL_GCOALESCE");
+    return preferNetlink<ethtool_coalesce>(ETHTOOL_MSG_COALESCE_GET, "ETHTOOL_MSG_COALESCE_GET", parseCoalesce, ETHTOOL_GCOALESCE,
+                              "ETHTOOL_GCOALESCE");
 }
 
 ethtool_pauseparam EthtoolReader::pause() const
 {
-    return simple<ethtool_pauseparam>(ETHTOOL_GPAUSEPARAM, "ETHTOOL_GPAUSEPARAM");
+    return preferNetlink<ethtool_pauseparam>(ETHTOOL_MSG_PAUSE_GET, "ETHTOOL_MSG_PAUSE_GET", parsePause, ETHTOOL_GPAUSEPARAM,
+                              "ETHTOOL_GPAUSEPARAM");
 }
 
 ethtool_ringparam EthtoolReader::rings() const
 {
-    return simple<ethtool_ringparam>(ETHTOOL_GRINGPARAM, "ETHTOOL_GRINGPARAM");
+    return preferNetlink<ethtool_ringparam>(ETHTOOL_MSG_RINGS_GET, "ETHTOOL_MSG_RINGS_GET", parseRings, ETHTOOL_GRINGPARAM,
+                              "ETHTOOL_GRINGPARAM");
 }
 
 std::uint32_t EthtoolReader::messageLevel() const

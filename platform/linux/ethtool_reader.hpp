@@ -4,21 +4,17 @@
 #pragma once
 
 #include "ethtool_channel.hpp"
+#include "ethtool_netlink_channel.hpp"
+#include "link_mode_mask.hpp"
 
 #include <cstdint>
+#include <optional>
 #include <linux/ethtool.h>
 #include <string>
 #include <utility>
 #include <vector>
 
 namespace orv::linuxhost {
-
-// A link-mode bit mask in the kernel's word layout: bit n is bit n%32 of word n/32.
-struct LinkModeMask {
-    std::vector<std::uint32_t> words;
-    bool test(unsigned bit) const;
-    void set(unsigned bit);
-};
 
 enum class LinkSettingsSource { Netlink, LinkSettingsIoctl, LegacyIoctl };
 
@@ -42,10 +38,15 @@ struct DriverStatistic {
 
 class EthtoolReader {
 public:
-    EthtoolReader(EthtoolChannel& channel, std::string ifname);
+    // With a netlink channel, link settings, wake-on-LAN, coalescing, pause and
+    // rings are asked through ethtool netlink first; a kernel without the
+    // ethtool family (ENOENT) or that does not know the message type
+    // (EOPNOTSUPP, EINVAL) is asked through the ioctl instead, for that call only.
+    EthtoolReader(EthtoolChannel& channel, std::string ifname, EthtoolNetlinkChannel* netlink = nullptr);
 
+    // ETHTOOL_MSG_LINKINFO_GET and ETHTOOL_MSG_LINKMODES_GET; else
     // ETHTOOL_GLINKSETTINGS with the mask-size handshake; ETHTOOL_GSET when the
-    // kernel or driver does not know the newer command.
+    // kernel or driver does not know that command either.
     LinkSettings linkSettings() const;
     ethtool_drvinfo driverInfo() const;
     ethtool_wolinfo wakeOnLan() const;
@@ -65,6 +66,14 @@ private:
     void exchange(void* buffer, std::size_t size, const char* command) const;
     template <typename Answer>
     Answer simple(std::uint32_t command, const char* name) const;
+    template <typename Answer>
+    bool fromNetlink(std::uint8_t message, const char* name, bool (*parse)(const NetlinkMessage&, Answer&),
+                     Answer& answer) const;
+    template <typename Answer>
+    Answer preferNetlink(std::uint8_t message, const char* messageName, bool (*parse)(const NetlinkMessage&, Answer&),
+                         std::uint32_t command, const char* commandName) const;
+    std::optional<LinkSettings> netlinkSettings() const;
+    LinkSettings ioctlSettings() const;
     LinkSettings legacySettings() const;
     std::uint32_t statisticsCount() const;
     std::vector<std::string> statisticNames(std::uint32_t count) const;
@@ -72,6 +81,7 @@ private:
 
     EthtoolChannel& channel_;
     std::string ifname_;
+    EthtoolNetlinkChannel* netlink_;
 };
 
 }  // namespace orv::linuxhost

@@ -8,7 +8,7 @@
 namespace orv::linuxhost {
 
 LinuxBackend::LinuxBackend(LinuxRoots roots, std::string fileRoot, bool hypervisorKernel)
-    : network_(roots.sys, std::make_shared<IoctlEthtoolChannel>()),
+    : network_(roots.sys, std::make_shared<IoctlEthtoolChannel>(), std::make_shared<GenlEthtoolChannel>()),
       ksi_(roots),
       version_(std::move(fileRoot), hypervisorKernel)
 {

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "ethtool_channel.hpp"
+#include "ethtool_netlink_channel.hpp"
 #include "linux_ksi.hpp"
 #include "os_version.hpp"
 
@@ -14,13 +15,16 @@ namespace orv::linuxhost {
 // The physical NICs: net devices with a bus device, in interface-index order.
 class LinuxNetwork final : public orv::platform::NetworkBackend {
 public:
-    LinuxNetwork(std::string sysRoot, std::shared_ptr<EthtoolChannel> channel);
+    // Without a netlink channel every ethtool query goes through the ioctls.
+    LinuxNetwork(std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
+                 std::shared_ptr<EthtoolNetlinkChannel> netlink = nullptr);
     std::vector<NodeMgr::Network::Pnic*> getPnics() override;
     NodeMgr::Network::Pnic* getPnicByName(const std::string& name) override;
 
 private:
     std::string sysRoot_;
     std::shared_ptr<EthtoolChannel> channel_;
+    std::shared_ptr<EthtoolNetlinkChannel> netlink_;
 };
 
 // Version record from os-release and uname; host type from configuration.

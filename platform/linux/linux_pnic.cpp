@@ -16,8 +16,9 @@ namespace orv::linuxhost {
 namespace NN = NodeMgr::Network;
 using NodeMgr::Lib::NodeMgrException;
 
-LinuxPnic::LinuxPnic(std::string name, std::string sysRoot, std::shared_ptr<EthtoolChannel> channel)
-    : name_(std::move(name)), sysfs_(std::move(sysRoot)), channel_(std::move(channel))
+LinuxPnic::LinuxPnic(std::string name, std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
+                     std::shared_ptr<EthtoolNetlinkChannel> netlink)
+    : name_(std::move(name)), sysfs_(std::move(sysRoot)), channel_(std::move(channel)), netlink_(std::move(netlink))
 {
 }
 

@@ -31,7 +31,8 @@ private:
 
 class LinuxPnic final : public NodeMgr::Network::Pnic {
 public:
-    LinuxPnic(std::string name, std::string sysRoot, std::shared_ptr<EthtoolChannel> channel);
+    LinuxPnic(std::string name, std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
+              std::shared_ptr<EthtoolNetlinkChannel> netlink = nullptr);
 
     void Refresh() override;
     void SaveConfig() override;
@@ -98,7 +99,7 @@ private:
     template <typename Operation>
     auto guarded(const char* operation, Operation&& body) const -> decltype(body());
     [[noreturn]] void refuse(const char* operation) const;
-    EthtoolReader ethtool() const { return EthtoolReader(*channel_, name_); }
+    EthtoolReader ethtool() const { return EthtoolReader(*channel_, name_, netlink_.get()); }
     SysfsLinkAttributes attributes() const { return sysfs_.linkAttributes(name_); }
     bool linkUp() const;
     std::optional<ethtool_wolinfo> wakeOnLan() const;
@@ -106,6 +107,7 @@ private:
     std::string name_;
     SysfsNet sysfs_;
     std::shared_ptr<EthtoolChannel> channel_;
+    std::shared_ptr<EthtoolNetlinkChannel> netlink_;
     mutable std::unique_ptr<LinuxPciDevice> pci_;
 };
 

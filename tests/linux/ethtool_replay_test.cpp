@@ -4,6 +4,7 @@
 #include "linux_call_error.hpp"
 #include "pnic_records.hpp"
 #include "support/ethtool_replay.hpp"
+#include "support/test_data.hpp"
 
 #include <cerrno>
 #include <fstream>
@@ -12,14 +13,14 @@
 
 using namespace orv::linuxhost;
 using orv::linuxtest::ReplayChannel;
+using orv::linuxtest::errorOf;
 namespace NN = NodeMgr::Network;
 
 namespace {
 
 std::string fixture(const std::string& name)
 {
-    const char* source = std::getenv("ORV_SOURCE_DIR");
-    return std::string(source ? source : ".") + "/tests/linux/data/ethtool/" + name;
+    return orv::linuxtest::testData("ethtool/" + name);
 }
 
 NetlinkMessage readHexFile(const std::string& path)
@@ -28,16 +29,6 @@ NetlinkMessage readHexFile(const std::string& path)
     NetlinkMessage bytes;
     for (std::string word; in >> word;) bytes.push_back(static_cast<std::uint8_t>(std::stoul(word, nullptr, 16)));
     return bytes;
-}
-
-int errorOf(const std::function<void()>& call)
-{
-    try {
-        call();
-    } catch (const LinuxCallError& error) {
-        return error.error();
-    }
-    return 0;
 }
 
 }  // namespace

@@ -1,12 +1,11 @@
 #include "ethtool_replay.hpp"
 
+#include "capture_file.hpp"
+
 #include <cerrno>
 #include <cstdint>
 #include <cstdio>
 #include <cstring>
-#include <fstream>
-#include <iomanip>
-#include <sstream>
 #include <stdexcept>
 #include <vector>
 
@@ -39,17 +38,9 @@ int RecordingChannel::exchange(const std::string& ifname, void* buffer, std::siz
 {
     const unsigned command = commandOf(buffer);
     int error = inner_.exchange(ifname, buffer, size);
-    std::ofstream out(fileFor(directory_, command, counts_[command]++));
-    if (error) {
-        out << "errno " << error << "\n";
-        return error;
-    }
-    const auto* bytes = static_cast<const std::uint8_t*>(buffer);
-    for (std::size_t i = 0; i < size; ++i) {
-        out << std::hex << std::setw(2) << std::setfill('0') << unsigned(bytes[i]) << ((i % 16 == 15) ? "\n" : " ");
-    }
-    out << "\n";
-    return 0;
+    writeCapture(fileFor(directory_, command, counts_[command]++), error, static_cast<const std::uint8_t*>(buffer),
+                 size);
+    return error;
 }
 
 ReplayChannel::ReplayChannel(std::string directory) : directory_(std::move(directory)) {}
@@ -63,19 +54,10 @@ unsigned ReplayChannel::exchanges(unsigned command) const
 int ReplayChannel::exchange(const std::string&, void* buffer, std::size_t size)
 {
     const unsigned command = commandOf(buffer);
-    std::ifstream in(fileFor(directory_, command, counts_[command]++));
-    if (!in) return EOPNOTSUPP;
-    std::string first;
-    in >> first;
-    if (first == "errno") {
-        int error = 0;
-        in >> error;
-        return error;
-    }
+    int error = 0;
     std::vector<std::uint8_t> bytes;
-    for (std::string word = first; !word.empty(); word.clear(), in >> word) {
-        bytes.push_back(static_cast<std::uint8_t>(std::stoul(word, nullptr, 16)));
-    }
+    if (!readCapture(fileFor(directory_, command, counts_[command]++), error, bytes)) return EOPNOTSUPP;
+    if (error) return error;
     if (bytes.size() > size) throw std::runtime_error("captured answer larger than the request buffer");
     std::memcpy(buffer, bytes.data(), bytes.size());
     return 0;
