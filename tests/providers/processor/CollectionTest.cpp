@@ -88,6 +88,10 @@ struct PolicyCase {
     uint8_t enabled;
 };
 
+std::ostream& operator<<(std::ostream& os, const PolicyCase& policy) {
+    return os << '"' << policy.shortName << "\" -> (" << int{policy.supported} << ", " << int{policy.enabled} << ")";
+}
+
 class PowerPolicyTest : public CollectionTest, public ::testing::WithParamInterface<PolicyCase> {};
 
 TEST_P(PowerPolicyTest, ShortNameDecidesThePowerFlags) {

@@ -141,6 +141,10 @@ CpuHost faultTargetHost() {
     return host;
 }
 
+std::ostream& operator<<(std::ostream& os, const CollectionFault& fault) {
+    return os << fault.name << ' ' << fault.rule.dump();
+}
+
 std::vector<CollectionFault> collectionFaults() {
     return {
         {"SignatureCheck", fault("KSI_CheckSig")},

@@ -7,6 +7,7 @@
 
 #include <cstdint>
 #include <optional>
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -88,6 +89,9 @@ struct CollectionFault {
 // every core halted without load, so that each core's statistics and load
 // are both read and every call of the collection is made.
 CpuHost faultTargetHost();
+
+// The fault's name and rule, for test messages.
+std::ostream& operator<<(std::ostream& os, const CollectionFault& fault);
 
 // Every call of the collection on faultTargetHost() that fails it: the
 // signature check, each node, each parameter-list creation, the instance
