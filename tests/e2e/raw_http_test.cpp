@@ -25,6 +25,17 @@ std::string requestWith(const std::string& params, const std::string& method = "
     return body;
 }
 
+// A METHODCALL of Raw_Element.Name="e1" with the given PARAMVALUEs.
+std::string methodCall(const std::string& method, const std::string& params) {
+    return "<?xml version=\"1.0\" encoding=\"utf-8\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
+           "<MESSAGE ID=\"9\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><METHODCALL NAME=\"" +
+           method +
+           "\"><LOCALINSTANCEPATH><LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/>"
+           "</LOCALNAMESPACEPATH><INSTANCENAME CLASSNAME=\"Raw_Element\"><KEYBINDING NAME=\"Name\">"
+           "<KEYVALUE VALUETYPE=\"string\">e1</KEYVALUE></KEYBINDING></INSTANCENAME></LOCALINSTANCEPATH>" +
+           params + "</METHODCALL></SIMPLEREQ></MESSAGE></CIM>";
+}
+
 class RawHttpTest : public ::testing::Test {
 protected:
     static void SetUpTestSuite() {
@@ -209,6 +220,53 @@ TEST_F(RawHttpTest, KeyValueOfWrongTypeAnswersCimErrInvalidParameter) {
         "<IPARAMVALUE NAME=\"InstanceName\"><INSTANCENAME CLASSNAME=\"Raw_Assoc\"><KEYBINDING NAME=\"Left\">"
         "<KEYVALUE VALUETYPE=\"string\">not a path</KEYVALUE></KEYBINDING></INSTANCENAME></IPARAMVALUE>";
     auto result = post(requestWith(params, "GetInstance"), headers("GetInstance"));
+    ASSERT_TRUE(result);
+    EXPECT_NE(result->body.find("<ERROR CODE=\"4\""), std::string::npos) << result->body;
+}
+
+TEST_F(RawHttpTest, MethodCallAnswersReturnValueAndOutputParameters) {
+    const std::string params = "<PARAMVALUE NAME=\"Number\" PARAMTYPE=\"uint32\"><VALUE>7</VALUE></PARAMVALUE>"
+                               "<PARAMVALUE NAME=\"text\"><VALUE>a &amp; b</VALUE></PARAMVALUE>";
+    auto result = post(methodCall("Echo", params), headers("Echo", "root%2Fcimv2%3ARaw_Element.Name%3D%22e1%22"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 200);
+    EXPECT_NE(result->body.find("<METHODRESPONSE NAME=\"Echo\"><RETURNVALUE PARAMTYPE=\"uint32\"><VALUE>42</VALUE>"
+                                "</RETURNVALUE><PARAMVALUE NAME=\"Number\" PARAMTYPE=\"uint32\"><VALUE>7</VALUE>"
+                                "</PARAMVALUE><PARAMVALUE NAME=\"Text\" PARAMTYPE=\"string\"><VALUE>a &amp; b"
+                                "</VALUE></PARAMVALUE></METHODRESPONSE>"),
+              std::string::npos)
+        << result->body;
+}
+
+TEST_F(RawHttpTest, MethodCallOfUndeclaredMethodAnswersCimErrMethodNotFound) {
+    auto result = post(methodCall("Frobnicate", ""), headers("Frobnicate", "root%2Fcimv2%3ARaw_Element"));
+    ASSERT_TRUE(result);
+    EXPECT_NE(result->body.find("<METHODRESPONSE NAME=\"Frobnicate\"><ERROR CODE=\"17\" "
+                                "DESCRIPTION=\"class Raw_Element has no method Frobnicate\""),
+              std::string::npos)
+        << result->body;
+}
+
+TEST_F(RawHttpTest, MethodCallWithUnknownParameterAnswersCimErrInvalidParameter) {
+    const std::string params = "<PARAMVALUE NAME=\"Colour\"><VALUE>red</VALUE></PARAMVALUE>";
+    auto result = post(methodCall("Echo", params), headers("Echo", "root%2Fcimv2%3ARaw_Element"));
+    ASSERT_TRUE(result);
+    EXPECT_NE(result->body.find("DESCRIPTION=\"method Echo has no input parameter Colour\""), std::string::npos)
+        << result->body;
+}
+
+TEST_F(RawHttpTest, MethodCallWithArrayForScalarParameterAnswersCimErrInvalidParameter) {
+    const std::string params = "<PARAMVALUE NAME=\"Number\"><VALUE.ARRAY><VALUE>1</VALUE></VALUE.ARRAY></PARAMVALUE>";
+    auto result = post(methodCall("Echo", params), headers("Echo", "root%2Fcimv2%3ARaw_Element"));
+    ASSERT_TRUE(result);
+    EXPECT_NE(result->body.find("<ERROR CODE=\"4\" DESCRIPTION=\"parameter Number must be a single value\""),
+              std::string::npos)
+        << result->body;
+}
+
+TEST_F(RawHttpTest, MethodCallWithNonNumberAnswersCimErrInvalidParameter) {
+    const std::string params = "<PARAMVALUE NAME=\"Number\"><VALUE>seven</VALUE></PARAMVALUE>";
+    auto result = post(methodCall("Echo", params), headers("Echo", "root%2Fcimv2%3ARaw_Element"));
     ASSERT_TRUE(result);
     EXPECT_NE(result->body.find("<ERROR CODE=\"4\""), std::string::npos) << result->body;
 }

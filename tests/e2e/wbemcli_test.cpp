@@ -73,6 +73,8 @@ const WbemcliCase kCases[] = {
     {"ai", "user", "ai", "cimv2:Raw_Element.Name=\"e1\"", ""},
     {"rin", "user", "rin", "cimv2:Raw_Element.Name=\"e1\"", ""},
     {"ri", "user", "ri", "cimv2:Raw_Element.Name=\"e1\"", ""},
+    {"cm_echo", "user", "cm", "cimv2:Raw_Element.Name=\"e1\"", "'Echo.Text=hi there,Number=7'"},
+    {"cm_unknown_method", "user", "cm", "cimv2:Raw_Element.Name=\"e1\"", "Nope"},
     {"ci_refused", "error", "ci", "cimv2:Raw_Element.Name=\"e1\"", "'Name=\"e1\",Counter=3'"},
     {"mi_refused", "error", "mi", "cimv2:Raw_Element.Name=\"e1\"", "'Counter=4'"},
     {"di_refused", "error", "di", "cimv2:Raw_Element.Name=\"e1\"", ""},

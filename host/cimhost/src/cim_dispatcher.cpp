@@ -58,23 +58,29 @@ std::string CimDispatcher::respond(const cimxml::CimRequest& request, const std:
     const auto fail = [&request](int code, std::string_view description) {
         return cimxml::errorResponse(request.messageId, request.methodName, request.intrinsic, code, description);
     };
-    const Operation* operation = request.intrinsic ? findOperation(request.methodName) : nullptr;
-    if (operation == nullptr) {
-        return fail(static_cast<int>(CimStatus::NotSupported),
-                    "operation " + request.methodName + " is not supported");
+    detail::OperationHandler handler = detail::invokeMethod;
+    if (request.intrinsic) {
+        const Operation* operation = findOperation(request.methodName);
+        if (operation == nullptr) {
+            return fail(static_cast<int>(CimStatus::NotSupported),
+                        "operation " + request.methodName + " is not supported");
+        }
+        handler = operation->handler;
     }
     if (!classes_.hasNamespace(request.nameSpace)) {
         return fail(static_cast<int>(CimStatus::InvalidNamespace),
                     "namespace " + request.nameSpace + " does not exist");
     }
     cimxml::XmlWriter out;
-    cimxml::openResponse(out, request.messageId, request.methodName, true);
-    out.open("IRETURNVALUE");
+    cimxml::openResponse(out, request.messageId, request.methodName, request.intrinsic);
+    if (request.intrinsic) {
+        out.open("IRETURNVALUE");
+    }
     try {
         host::ObjectScope scope;
         detail::OperationContext context{core_, classes_, request, principal,
                                          cimxml::PathDefaults{hostName_, request.nameSpace}, out};
-        operation->handler(context);
+        handler(context);
     } catch (const CimError& error) {
         return fail(error.code(), error.description());
     }

@@ -211,13 +211,9 @@ CMPIType propertyType(const repository::PropertyDecl* declared, const cimxml::Pr
     return declared != nullptr ? cmpiType(declared->type.type) : typeFromXmlName(property.type);
 }
 
-void setArrayProperty(const CMPIBroker* broker, CMPIInstance* instance, const cimxml::PropertyModel& property,
-                      CMPIType elementType) {
-    if (!property.elements) {
-        instance->ft->setProperty(instance, property.name.c_str(), nullptr, elementType | CMPI_ARRAY);
-        return;
-    }
-    const auto& items = *property.elements;
+// An array of `elementType` from the client's element texts (nullopt elements stay null).
+CMPIArray* buildArray(const CMPIBroker* broker, const std::string& name,
+                      const std::vector<std::optional<std::string>>& items, CMPIType elementType) {
     const CMPIType arrayElementType = elementType == CMPI_string ? CMPI_chars : elementType;
     CMPIArray* array = broker->eft->newArray(broker, static_cast<CMPICount>(items.size()), arrayElementType, nullptr);
     for (std::size_t i = 0; i < items.size(); ++i) {
@@ -226,12 +222,25 @@ void setArrayProperty(const CMPIBroker* broker, CMPIInstance* instance, const ci
         }
         Converted converted;
         converted.type = elementType;
-        convertText(broker, converted, property.name, *items[i]);
+        convertText(broker, converted, name, *items[i]);
         array->ft->setElementAt(array, static_cast<CMPICount>(i), converted.pointer(), converted.type);
     }
+    return array;
+}
+
+CMPIType arrayType(CMPIType elementType) {
+    return (elementType == CMPI_string ? CMPI_chars : elementType) | CMPI_ARRAY;
+}
+
+void setArrayProperty(const CMPIBroker* broker, CMPIInstance* instance, const cimxml::PropertyModel& property,
+                      CMPIType elementType) {
+    if (!property.elements) {
+        instance->ft->setProperty(instance, property.name.c_str(), nullptr, elementType | CMPI_ARRAY);
+        return;
+    }
     CMPIValue value{};
-    value.array = array;
-    instance->ft->setProperty(instance, property.name.c_str(), &value, arrayElementType | CMPI_ARRAY);
+    value.array = buildArray(broker, property.name, *property.elements, elementType);
+    instance->ft->setProperty(instance, property.name.c_str(), &value, arrayType(elementType));
 }
 
 void setProperty(const CMPIBroker* broker, const repository::ClassRepository& classes, std::string_view nameSpace,
@@ -259,7 +268,67 @@ void setProperty(const CMPIBroker* broker, const repository::ClassRepository& cl
     instance->ft->setProperty(instance, property.name.c_str(), converted.pointer(), converted.type);
 }
 
+// Where an argument is going: the builder's inputs and the parameter's declaration.
+struct ArgTarget {
+    const CMPIBroker* broker;
+    const repository::ClassRepository& classes;
+    std::string_view nameSpace;
+    const repository::ParameterDecl& decl;
+};
+
+[[noreturn]] void wrongKind(const std::string& name, std::string_view expected) {
+    throw CimError(CimStatus::InvalidParameter, "parameter " + name + " must be " + std::string(expected));
+}
+
+// One argument converted from its PARAMVALUE to the declared type.
+void addArgument(CMPIArgs* args, const ArgTarget& target, const std::string& name, const cimxml::ParamValue& value) {
+    const CMPIType type = cmpiType(target.decl.type.type);
+    const char* argName = target.decl.name.c_str();
+    if (std::holds_alternative<std::monostate>(value)) {
+        args->ft->addArg(args, argName, nullptr, target.decl.type.isArray ? type | CMPI_ARRAY : type);
+        return;
+    }
+    Converted converted;
+    converted.type = type;
+    if (target.decl.type.isArray) {
+        const auto* items = std::get_if<std::vector<std::optional<std::string>>>(&value);
+        if (items == nullptr || type == CMPI_ref) {
+            wrongKind(name, "an array of values");
+        }
+        converted.value.array = buildArray(target.broker, name, *items, type);
+        converted.type = arrayType(type);
+    } else if (type == CMPI_ref) {
+        const auto* path = std::get_if<cimxml::ObjectPathModel>(&value);
+        if (path == nullptr) {
+            wrongKind(name, "a reference");
+        }
+        converted.value.ref = buildObjectPath(target.broker, target.classes, target.nameSpace, *path);
+    } else if (const auto* text = std::get_if<std::string>(&value)) {
+        convertText(target.broker, converted, name, *text);
+    } else {
+        wrongKind(name, "a single value");
+    }
+    args->ft->addArg(args, argName, converted.pointer(), converted.type);
+}
+
 }  // namespace
+
+CMPIArgs* buildArgs(const CMPIBroker* broker, const repository::ClassRepository& classes, std::string_view nameSpace,
+                    const repository::MethodDecl& method,
+                    const std::vector<std::pair<std::string, cimxml::ParamValue>>& params) {
+    CMPIArgs* args = broker->eft->newArgs(broker, nullptr);
+    if (args == nullptr) {
+        throw CimError(CimStatus::Failed, "cannot create the argument list");
+    }
+    for (const auto& [name, value] : params) {
+        const repository::ParameterDecl* decl = method.findParameter(name);
+        if (decl == nullptr || !decl->isIn()) {
+            throw CimError(CimStatus::InvalidParameter, "method " + method.name + " has no input parameter " + name);
+        }
+        addArgument(args, ArgTarget{broker, classes, nameSpace, *decl}, name, value);
+    }
+    return args;
+}
 
 CMPIObjectPath* buildObjectPath(const CMPIBroker* broker, const repository::ClassRepository& classes,
                                 std::string_view nameSpace, const cimxml::ObjectPathModel& model) {

@@ -5,7 +5,10 @@
 #include <cmpidt.h>
 #include <cmpift.h>
 
+#include <string>
 #include <string_view>
+#include <utility>
+#include <vector>
 
 #include "orv/cimxml/request.hpp"
 #include "orv/repository/class_repository.hpp"
@@ -23,5 +26,12 @@ CMPIObjectPath* buildObjectPath(const CMPIBroker* broker, const repository::Clas
 CMPIInstance* buildInstance(const CMPIBroker* broker, const repository::ClassRepository& classes,
                             std::string_view nameSpace, const cimxml::InstanceModel& model,
                             const CMPIObjectPath* path);
+
+// The input arguments of `method` from the PARAMVALUEs of a method call, each converted
+// to its declared type. Unknown or output-only parameters and values of the wrong kind
+// throw CimError(CIM_ERR_INVALID_PARAMETER).
+CMPIArgs* buildArgs(const CMPIBroker* broker, const repository::ClassRepository& classes, std::string_view nameSpace,
+                    const repository::MethodDecl& method,
+                    const std::vector<std::pair<std::string, cimxml::ParamValue>>& params);
 
 }  // namespace orv::cimhost::detail

@@ -19,7 +19,7 @@ struct OperationContext {
     const cimxml::CimRequest& request;
     const std::string& principal;
     cimxml::PathDefaults defaults;  // host and request namespace
-    cimxml::XmlWriter& out;         // positioned inside IRETURNVALUE
+    cimxml::XmlWriter& out;         // inside IRETURNVALUE (intrinsic) or METHODRESPONSE
 };
 
 using OperationHandler = void (*)(OperationContext& context);
@@ -43,6 +43,9 @@ void associators(OperationContext& context);
 void associatorNames(OperationContext& context);
 void references(OperationContext& context);
 void referenceNames(OperationContext& context);
+
+// Extrinsic method calls (broker core).
+void invokeMethod(OperationContext& context);
 
 // Shared helpers.
 // Throws CIM_ERR_INVALID_CLASS when the request namespace has no such class.

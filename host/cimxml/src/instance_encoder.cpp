@@ -4,6 +4,7 @@
 
 #include "orv/cimxml/cmpi_value.hpp"
 #include "orv/cimxml/object_encoder.hpp"
+#include "value_encoding.hpp"
 
 namespace orv::cimxml {
 
@@ -19,17 +20,6 @@ bool selected(const std::optional<std::vector<std::string>>& propertyList, const
         }
     }
     return false;
-}
-
-// The text a VALUE carries for one item: scalars, or the markup of an embedded instance.
-std::optional<std::string> itemText(const CMPIData& item) {
-    if (item.type == CMPI_instance) {
-        if (isNullData(item) || item.value.inst == nullptr) {
-            return std::nullopt;
-        }
-        return instanceText(item.value.inst);
-    }
-    return scalarText(item);
 }
 
 struct PropertyHeader {
@@ -57,21 +47,6 @@ void openProperty(XmlWriter& out, const PropertyHeader& header, CMPIType type) {
     if ((type & ~CMPI_ARRAY) == CMPI_instance) {
         out.attr("EmbeddedObject", "instance");
     }
-}
-
-void writeValueArray(XmlWriter& out, const CMPIArray* array) {
-    out.open("VALUE.ARRAY");
-    const CMPICount size = array->ft->getSize(array, nullptr);
-    for (CMPICount i = 0; i < size; ++i) {
-        const CMPIData item = array->ft->getElementAt(array, i, nullptr);
-        std::optional<std::string> text = itemText(item);
-        if (text) {
-            out.leaf("VALUE", *text);
-        } else {
-            out.open("VALUE.NULL").close();
-        }
-    }
-    out.close();
 }
 
 void writeProperty(XmlWriter& out, const PropertyHeader& header, const CMPIData& data) {
@@ -108,6 +83,32 @@ void writeProperty(XmlWriter& out, const PropertyHeader& header, const CMPIData&
 }
 
 }  // namespace
+
+// The text a VALUE carries for one item: scalars, or the markup of an embedded instance.
+std::optional<std::string> itemText(const CMPIData& item) {
+    if (item.type == CMPI_instance) {
+        if (isNullData(item) || item.value.inst == nullptr) {
+            return std::nullopt;
+        }
+        return instanceText(item.value.inst);
+    }
+    return scalarText(item);
+}
+
+void writeValueArray(XmlWriter& out, const CMPIArray* array) {
+    out.open("VALUE.ARRAY");
+    const CMPICount size = array->ft->getSize(array, nullptr);
+    for (CMPICount i = 0; i < size; ++i) {
+        const CMPIData item = array->ft->getElementAt(array, i, nullptr);
+        std::optional<std::string> text = itemText(item);
+        if (text) {
+            out.leaf("VALUE", *text);
+        } else {
+            out.open("VALUE.NULL").close();
+        }
+    }
+    out.close();
+}
 
 void writeInstance(XmlWriter& out, const CMPIInstance* instance, const InstanceEncoding& encoding) {
     const std::string className = instanceClassName(instance);
