@@ -41,7 +41,7 @@ void SubstitutePerNic(benchmark::State& state)
 {
     const std::string name = firstNic();
     if (name.empty()) return state.SkipWithError("no NIC on a bus");
-    LinuxNetwork network("/sys", std::make_shared<IoctlEthtoolChannel>());
+    LinuxNetwork network("/sys", std::make_shared<IoctlEthtoolChannel>(), std::make_shared<GenlEthtoolChannel>());
     for (auto _ : state) {
         std::unique_ptr<NN::Pnic> pnic(network.getPnicByName(name));
         NN::PnicInfo info;
