@@ -92,6 +92,31 @@ TEST(ProviderLibraryTest, KernelEndpointProviderIsRegisteredForInstancesInRootCi
     EXPECT_EQ(registrations.all().front().className, kKernelParent);
 }
 
+TEST(ProviderLibraryTest, InstanceFactoryCalledTwiceSharesOneProviderObjectAndTracesBothCalls) {
+    orv::providertest::ProviderCore provider;  // only for its broker
+    std::unique_ptr<void, int (*)(void*)> library(::dlopen(libraryFile().c_str(), RTLD_NOW | RTLD_LOCAL), ::dlclose);
+    ASSERT_NE(library, nullptr) << ::dlerror();
+    using Factory = CMPIInstanceMI* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
+    const auto factory = reinterpret_cast<Factory>(::dlsym(library.get(), "KernelIPProtocolEndpointProvider_Create_InstanceMI"));
+    ASSERT_NE(factory, nullptr);
+    CMPIStatus st{CMPI_RC_OK, nullptr};
+    orv::testsupport::StderrCapture capture;
+    CMPIInstanceMI* first = factory(provider.broker(), nullptr, &st);
+    CMPIInstanceMI* second = factory(provider.broker(), nullptr, &st);
+    EXPECT_EQ(capture.finish(), "--- _Create_InstanceMI() P10CmpiBaseMI\n--- _Create_InstanceMI() P10CmpiBaseMI\n");
+    ASSERT_NE(first, nullptr);
+    EXPECT_EQ(first, second);
+    EXPECT_NE(first->hdl, nullptr);
+    EXPECT_EQ(st.rc, CMPI_RC_OK);
+    EXPECT_EQ(first->ft->ftVersion, 200);
+    EXPECT_EQ(first->ft->miVersion, 200);
+    EXPECT_STREQ(first->ft->miName, "instanceKernelIPProtocolEndpointProvider");
+    // Two uses: the first terminating cleanup only releases one, the second
+    // cleans up and deletes the object.
+    EXPECT_EQ(first->ft->cleanup(first, nullptr, 1).rc, CMPI_RC_OK);
+    EXPECT_EQ(first->ft->cleanup(first, nullptr, 1).rc, CMPI_RC_OK);
+}
+
 class ProviderLoadTest : public KernelIPTest {};
 
 TEST_F(ProviderLoadTest, MofAndRegistrationLoadIntoTheBrokerCoreWhichServesTheProvider) {
