@@ -40,7 +40,7 @@ class RawHttpTest : public ::testing::Test {
 protected:
     static void SetUpTestSuite() {
         auto args = rawProviderArgs();
-        args.insert(args.end(), {"--max-request-bytes", "65536", "--credentials",
+        args.insert(args.end(), {"--host-name", "testhost", "--max-request-bytes", "65536", "--credentials",
                                  sourceDir() + "/tests/e2e/data/credentials"});
         host_ = new HostProcess(args);
         ASSERT_TRUE(host_->waitReady()) << host_->output();
@@ -269,6 +269,72 @@ TEST_F(RawHttpTest, MethodCallWithNonNumberAnswersCimErrInvalidParameter) {
     auto result = post(methodCall("Echo", params), headers("Echo", "root%2Fcimv2%3ARaw_Element"));
     ASSERT_TRUE(result);
     EXPECT_NE(result->body.find("<ERROR CODE=\"4\""), std::string::npos) << result->body;
+}
+
+// An association operation on the class Raw_SubElement, with more parameters after ObjectName.
+std::string classAssociationRequest(const std::string& method, const std::string& params = "") {
+    return requestWith("<IPARAMVALUE NAME=\"ObjectName\"><CLASSNAME NAME=\"raw_subelement\"/></IPARAMVALUE>" + params,
+                       method);
+}
+
+std::string classPathOf(const std::string& className) {
+    return "<CLASSPATH><NAMESPACEPATH><HOST>testhost</HOST><LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"></NAMESPACE>"
+           "<NAMESPACE NAME=\"cimv2\"></NAMESPACE></LOCALNAMESPACEPATH></NAMESPACEPATH><CLASSNAME NAME=\"" +
+           className + "\"></CLASSNAME></CLASSPATH>";
+}
+
+std::string returnedValue(const httplib::Result& result) {
+    const std::string& body = result->body;
+    const std::size_t start = body.find("<IRETURNVALUE>");
+    const std::size_t end = body.find("</IRETURNVALUE>");
+    if (start == std::string::npos || end == std::string::npos) {
+        return body;
+    }
+    return body.substr(start + 14, end - start - 14);
+}
+
+TEST_F(RawHttpTest, AssociatorNamesOfClassAnswersTheFarClassesFromTheRepository) {
+    auto result = post(classAssociationRequest("AssociatorNames"), headers("AssociatorNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(returnedValue(result), "<OBJECTPATH>" + classPathOf("Raw_Element") + "</OBJECTPATH>");
+}
+
+TEST_F(RawHttpTest, ReferenceNamesOfClassAnswersEveryAssociationClassReferringToIt) {
+    auto result = post(classAssociationRequest("ReferenceNames"), headers("ReferenceNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(returnedValue(result), "<OBJECTPATH>" + classPathOf("Raw_Assoc") + "</OBJECTPATH><OBJECTPATH>" +
+                                         classPathOf("Raw_SubAssoc") + "</OBJECTPATH>");
+}
+
+TEST_F(RawHttpTest, ReferenceNamesOfClassKeepsOnlyTheResultClassAndItsSubclasses) {
+    const std::string params = "<IPARAMVALUE NAME=\"ResultClass\"><CLASSNAME NAME=\"Raw_SubAssoc\"/></IPARAMVALUE>";
+    auto result = post(classAssociationRequest("ReferenceNames", params), headers("ReferenceNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(returnedValue(result), "<OBJECTPATH>" + classPathOf("Raw_SubAssoc") + "</OBJECTPATH>");
+}
+
+TEST_F(RawHttpTest, AssociatorNamesOfClassWithUnknownRoleAnswersNothing) {
+    const std::string params = "<IPARAMVALUE NAME=\"Role\"><VALUE>Middle</VALUE></IPARAMVALUE>";
+    auto result = post(classAssociationRequest("AssociatorNames", params), headers("AssociatorNames"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(returnedValue(result), "");
+}
+
+TEST_F(RawHttpTest, AssociatorsOfClassAnswersClassPathsWithTheirClasses) {
+    auto result = post(classAssociationRequest("Associators"), headers("Associators"));
+    ASSERT_TRUE(result);
+    const std::string value = returnedValue(result);
+    EXPECT_EQ(value.rfind("<VALUE.OBJECTWITHPATH>" + classPathOf("Raw_Element") + "<CLASS NAME=\"Raw_Element\" "
+                          "SUPERCLASS=\"Raw_Base\">", 0), 0U) << value;
+    EXPECT_NE(value.find("<PROPERTY NAME=\"Name\""), std::string::npos) << "inherited properties are included";
+}
+
+TEST_F(RawHttpTest, ReferencesOfClassAnswersTheAssociationClasses) {
+    auto result = post(classAssociationRequest("References"), headers("References"));
+    ASSERT_TRUE(result);
+    const std::string value = returnedValue(result);
+    EXPECT_NE(value.find(classPathOf("Raw_Assoc") + "<CLASS NAME=\"Raw_Assoc\""), std::string::npos) << value;
+    EXPECT_NE(value.find(classPathOf("Raw_SubAssoc") + "<CLASS NAME=\"Raw_SubAssoc\""), std::string::npos) << value;
 }
 
 TEST_F(RawHttpTest, GetAnswers405) {

@@ -62,6 +62,14 @@ std::string instanceClassName(const CMPIInstance* instance) {
     return pathClassName(instance->ft->getObjectPath(instance, nullptr));
 }
 
+void writeClassPath(XmlWriter& out, std::string_view host, std::string_view nameSpace,
+                    std::string_view className) {
+    out.open("CLASSPATH");
+    writeNamespacePath(out, host, nameSpace);
+    out.open("CLASSNAME").attr("NAME", className).close();
+    out.close();
+}
+
 void writeInstanceName(XmlWriter& out, const CMPIObjectPath* path) {
     out.open("INSTANCENAME").attr("CLASSNAME", pathClassName(path));
     const CMPICount count = path->ft->getKeyCount(path, nullptr);

@@ -39,6 +39,8 @@ struct PathDefaults {
     std::string nameSpace;
 };
 
+// <CLASSPATH><NAMESPACEPATH><HOST/><LOCALNAMESPACEPATH/></NAMESPACEPATH><CLASSNAME/>.
+void writeClassPath(XmlWriter& out, std::string_view host, std::string_view nameSpace, std::string_view className);
 // <INSTANCENAME CLASSNAME=...> with one KEYBINDING per key.
 void writeInstanceName(XmlWriter& out, const CMPIObjectPath* path);
 // <INSTANCEPATH><NAMESPACEPATH><HOST/><LOCALNAMESPACEPATH/></NAMESPACEPATH><INSTANCENAME/>.
