@@ -73,21 +73,47 @@ void writeClassesWithPath(OperationContext& context, const std::vector<std::stri
     }
 }
 
+// The source and filters of a request.
+struct Source {
+    cimxml::ObjectPathModel model;
+    AssociationFilters filters;
+};
+
+Source readSource(const OperationContext& context) {
+    return Source{sourceModel(context), readFilters(context.request)};
+}
+
+using ClassFinder = std::vector<std::string> (*)(const repository::ClassRepository&, const std::string&,
+                                                 const std::string&, const AssociationFilters&);
+
+// When the source is a class, writes the classes `find` names (paths alone, or with
+// their classes when `flags` is given) and returns true.
+bool answeredForClass(OperationContext& context, const Source& source, ClassFinder find, const ObjectFlags* flags) {
+    if (!source.model.keys.empty()) {
+        return false;
+    }
+    const auto names = find(context.classes, context.request.nameSpace, source.model.className, source.filters);
+    if (flags != nullptr) {
+        writeClassesWithPath(context, names, *flags);
+    } else {
+        writeClassPaths(context, names);
+    }
+    return true;
+}
+
 }  // namespace
 
 void associators(OperationContext& context) {
     const auto& request = context.request;
     cimxml::checkParameterNames(request, {"ObjectName", "AssocClass", "ResultClass", "Role", "ResultRole",
                                           "IncludeQualifiers", "IncludeClassOrigin", "PropertyList"});
-    const AssociationFilters filters = readFilters(request);
     const ObjectFlags flags = objectFlags(request);
-    const cimxml::ObjectPathModel source = sourceModel(context);
-    if (source.keys.empty()) {
-        writeClassesWithPath(context, associatedClasses(context.classes, request.nameSpace, source.className, filters),
-                             flags);
+    const Source source = readSource(context);
+    if (answeredForClass(context, source, associatedClasses, &flags)) {
         return;
     }
-    host::Reply reply = context.core.associators(sourcePath(context, source), cstr(filters.assocClass),
+    const AssociationFilters& filters = source.filters;
+    host::Reply reply = context.core.associators(sourcePath(context, source.model), cstr(filters.assocClass),
                                                  cstr(filters.resultClass), cstr(filters.role),
                                                  cstr(filters.resultRole), objectOptions(context, flags));
     throwIfFailed(reply);
@@ -97,13 +123,12 @@ void associators(OperationContext& context) {
 void associatorNames(OperationContext& context) {
     const auto& request = context.request;
     cimxml::checkParameterNames(request, {"ObjectName", "AssocClass", "ResultClass", "Role", "ResultRole"});
-    const AssociationFilters filters = readFilters(request);
-    const cimxml::ObjectPathModel source = sourceModel(context);
-    if (source.keys.empty()) {
-        writeClassPaths(context, associatedClasses(context.classes, request.nameSpace, source.className, filters));
+    const Source source = readSource(context);
+    if (answeredForClass(context, source, associatedClasses, nullptr)) {
         return;
     }
-    host::Reply reply = context.core.associatorNames(sourcePath(context, source), cstr(filters.assocClass),
+    const AssociationFilters& filters = source.filters;
+    host::Reply reply = context.core.associatorNames(sourcePath(context, source.model), cstr(filters.assocClass),
                                                      cstr(filters.resultClass), cstr(filters.role),
                                                      cstr(filters.resultRole),
                                                      callOptions(context, false, false, false, false, {}));
@@ -115,15 +140,13 @@ void references(OperationContext& context) {
     const auto& request = context.request;
     cimxml::checkParameterNames(request, {"ObjectName", "ResultClass", "Role", "IncludeQualifiers",
                                           "IncludeClassOrigin", "PropertyList"});
-    const AssociationFilters filters = readFilters(request);
     const ObjectFlags flags = objectFlags(request);
-    const cimxml::ObjectPathModel source = sourceModel(context);
-    if (source.keys.empty()) {
-        writeClassesWithPath(context, referencingClasses(context.classes, request.nameSpace, source.className, filters),
-                             flags);
+    const Source source = readSource(context);
+    if (answeredForClass(context, source, referencingClasses, &flags)) {
         return;
     }
-    host::Reply reply = context.core.references(sourcePath(context, source), cstr(filters.resultClass), cstr(filters.role),
+    const AssociationFilters& filters = source.filters;
+    host::Reply reply = context.core.references(sourcePath(context, source.model), cstr(filters.resultClass), cstr(filters.role),
                                                 objectOptions(context, flags));
     throwIfFailed(reply);
     writeObjectsWithPath(context, reply, instanceEncoding(context, flags.includeClassOrigin, flags.propertyList));
@@ -132,13 +155,12 @@ void references(OperationContext& context) {
 void referenceNames(OperationContext& context) {
     const auto& request = context.request;
     cimxml::checkParameterNames(request, {"ObjectName", "ResultClass", "Role"});
-    const AssociationFilters filters = readFilters(request);
-    const cimxml::ObjectPathModel source = sourceModel(context);
-    if (source.keys.empty()) {
-        writeClassPaths(context, referencingClasses(context.classes, request.nameSpace, source.className, filters));
+    const Source source = readSource(context);
+    if (answeredForClass(context, source, referencingClasses, nullptr)) {
         return;
     }
-    host::Reply reply = context.core.referenceNames(sourcePath(context, source), cstr(filters.resultClass),
+    const AssociationFilters& filters = source.filters;
+    host::Reply reply = context.core.referenceNames(sourcePath(context, source.model), cstr(filters.resultClass),
                                                     cstr(filters.role),
                                                     callOptions(context, false, false, false, false, {}));
     throwIfFailed(reply);
