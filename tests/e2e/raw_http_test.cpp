@@ -337,6 +337,32 @@ TEST_F(RawHttpTest, ReferencesOfClassAnswersTheAssociationClasses) {
     EXPECT_NE(value.find(classPathOf("Raw_SubAssoc") + "<CLASS NAME=\"Raw_SubAssoc\""), std::string::npos) << value;
 }
 
+std::string getInstanceWithLocalOnly(const std::string& localOnly) {
+    return requestWith("<IPARAMVALUE NAME=\"InstanceName\"><INSTANCENAME CLASSNAME=\"Raw_Element\"><KEYBINDING "
+                       "NAME=\"Name\"><KEYVALUE VALUETYPE=\"string\">e1</KEYVALUE></KEYBINDING></INSTANCENAME>"
+                       "</IPARAMVALUE><IPARAMVALUE NAME=\"LocalOnly\"><VALUE>" +
+                           localOnly + "</VALUE></IPARAMVALUE>",
+                       "GetInstance");
+}
+
+TEST_F(RawHttpTest, DeprecatedLocalOnlyIsTreatedAsFalseForInstances) {
+    auto result = post(getInstanceWithLocalOnly("true"), headers("GetInstance"));
+    ASSERT_TRUE(result);
+    const std::string value = returnedValue(result);
+    EXPECT_NE(value.find("<PROPERTY NAME=\"Name\" TYPE=\"string\"><VALUE>e1</VALUE>"), std::string::npos)
+        << "the inherited key stays: " << value;
+    EXPECT_NE(value.find("<PROPERTY NAME=\"Text\" TYPE=\"string\">"), std::string::npos) << value;
+    auto asFalse = post(getInstanceWithLocalOnly("false"), headers("GetInstance"));
+    ASSERT_TRUE(asFalse);
+    EXPECT_EQ(returnedValue(asFalse), value);
+}
+
+TEST_F(RawHttpTest, NonBooleanLocalOnlyAnswersCimErrInvalidParameter) {
+    auto result = post(getInstanceWithLocalOnly("maybe"), headers("GetInstance"));
+    ASSERT_TRUE(result);
+    EXPECT_NE(result->body.find("<ERROR CODE=\"4\""), std::string::npos) << result->body;
+}
+
 TEST_F(RawHttpTest, GetAnswers405) {
     httplib::Client client("127.0.0.1", host_->port());
     auto result = client.Get("/cimom");

@@ -49,7 +49,7 @@ ObjectFlags objectFlags(const cimxml::CimRequest& request) {
 }
 
 host::CallOptions objectOptions(const OperationContext& context, const ObjectFlags& flags) {
-    return callOptions(context, false, false, flags.includeQualifiers, flags.includeClassOrigin, flags.propertyList);
+    return callOptions(context, false, flags.includeQualifiers, flags.includeClassOrigin, flags.propertyList);
 }
 
 // OBJECTPATH (CLASSPATH) per class.
@@ -131,7 +131,7 @@ void associatorNames(OperationContext& context) {
     host::Reply reply = context.core.associatorNames(sourcePath(context, source.model), cstr(filters.assocClass),
                                                      cstr(filters.resultClass), cstr(filters.role),
                                                      cstr(filters.resultRole),
-                                                     callOptions(context, false, false, false, false, {}));
+                                                     callOptions(context, false, false, false, {}));
     throwIfFailed(reply);
     writeObjectPaths(context, reply);
 }
@@ -162,7 +162,7 @@ void referenceNames(OperationContext& context) {
     const AssociationFilters& filters = source.filters;
     host::Reply reply = context.core.referenceNames(sourcePath(context, source.model), cstr(filters.resultClass),
                                                     cstr(filters.role),
-                                                    callOptions(context, false, false, false, false, {}));
+                                                    callOptions(context, false, false, false, {}));
     throwIfFailed(reply);
     writeObjectPaths(context, reply);
 }

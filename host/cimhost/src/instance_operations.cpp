@@ -13,17 +13,20 @@ using cimxml::CimStatus;
 
 namespace {
 
-// The flags every instance read takes.
+// The flags every instance read takes. LocalOnly is deprecated for instances by
+// DSP0200 1.3 because servers applied it inconsistently; this host treats it as
+// false whatever the client sends: the value is checked to be a boolean, every
+// property (inherited ones too) is returned, subject to PropertyList and
+// DeepInheritance, and providers never see CMPI_FLAG_LocalOnly.
 struct ReadFlags {
-    bool localOnly;
     bool includeQualifiers;
     bool includeClassOrigin;
     std::optional<std::vector<std::string>> propertyList;
 };
 
 ReadFlags readFlags(const cimxml::CimRequest& request) {
-    return ReadFlags{cimxml::boolParam(request, "LocalOnly", true),
-                     cimxml::boolParam(request, "IncludeQualifiers", false),
+    static_cast<void>(cimxml::boolParam(request, "LocalOnly", false));
+    return ReadFlags{cimxml::boolParam(request, "IncludeQualifiers", false),
                      cimxml::boolParam(request, "IncludeClassOrigin", false),
                      cimxml::propertyListParam(request, "PropertyList")};
 }
@@ -71,7 +74,7 @@ void getInstance(OperationContext& context) {
     const ReadFlags flags = readFlags(request);
     CMPIObjectPath* path = instancePath(context, cimxml::instanceNameParam(request, "InstanceName"));
     host::Reply reply = context.core.getInstance(
-        path, callOptions(context, flags.localOnly, false, flags.includeQualifiers, flags.includeClassOrigin,
+        path, callOptions(context, false, flags.includeQualifiers, flags.includeClassOrigin,
                           flags.propertyList));
     throwIfFailed(reply);
     const auto instances = reply.instances();
@@ -92,7 +95,7 @@ void enumerateInstances(OperationContext& context) {
     const repository::ClassDecl& cls = requireClass(context, className);
     host::Reply reply = context.core.enumerateInstances(
         classPath(context, cls.name),
-        callOptions(context, flags.localOnly, deep, flags.includeQualifiers, flags.includeClassOrigin,
+        callOptions(context, deep, flags.includeQualifiers, flags.includeClassOrigin,
                     flags.propertyList));
     throwIfFailed(reply);
     auto kept = deep ? flags.propertyList : shallowPropertyList(cls, flags.propertyList);
@@ -105,7 +108,7 @@ void enumerateInstanceNames(OperationContext& context) {
     const std::string className = cimxml::classNameParam(request, "ClassName").value_or("");
     const repository::ClassDecl& cls = requireClass(context, className);
     host::Reply reply = context.core.enumerateInstanceNames(classPath(context, cls.name),
-                                                            callOptions(context, false, true, false, false, {}));
+                                                            callOptions(context, true, false, false, {}));
     throwIfFailed(reply);
     writeInstanceNames(context, reply);
 }
@@ -118,7 +121,7 @@ void createInstance(OperationContext& context) {
     CMPIObjectPath* path = classPath(context, model.className);
     CMPIInstance* instance =
         buildInstance(context.core.broker(), context.classes, request.nameSpace, model, path);
-    host::Reply reply = context.core.createInstance(path, instance, callOptions(context, false, false, false, false, {}));
+    host::Reply reply = context.core.createInstance(path, instance, callOptions(context, false, false, false, {}));
     throwIfFailed(reply);
     writeInstanceNames(context, reply);
 }
@@ -133,7 +136,7 @@ void modifyInstance(OperationContext& context) {
         buildInstance(context.core.broker(), context.classes, request.nameSpace, model.instance, path);
     host::Reply reply = context.core.modifyInstance(
         path, instance,
-        callOptions(context, false, false, includeQualifiers, false,
+        callOptions(context, false, includeQualifiers, false,
                     cimxml::propertyListParam(request, "PropertyList")));
     throwIfFailed(reply);
 }
@@ -142,7 +145,7 @@ void deleteInstance(OperationContext& context) {
     const auto& request = context.request;
     cimxml::checkParameterNames(request, {"InstanceName"});
     CMPIObjectPath* path = instancePath(context, cimxml::instanceNameParam(request, "InstanceName"));
-    host::Reply reply = context.core.deleteInstance(path, callOptions(context, false, false, false, false, {}));
+    host::Reply reply = context.core.deleteInstance(path, callOptions(context, false, false, false, {}));
     throwIfFailed(reply);
 }
 
@@ -153,7 +156,7 @@ void execQuery(OperationContext& context) {
     const std::string query = requiredString(request, "Query");
     CMPIObjectPath* nsPath = classPath(context, "");
     host::Reply reply = context.core.execQuery(nsPath, query.c_str(), language.c_str(),
-                                               callOptions(context, false, true, false, false, {}));
+                                               callOptions(context, true, false, false, {}));
     throwIfFailed(reply);
     writeObjectsWithPath(context, reply, instanceEncoding(context, false, std::nullopt));
 }

@@ -42,7 +42,7 @@ void invokeMethod(OperationContext& context) {
     CMPIObjectPath* target = buildObjectPath(broker, context.classes, request.nameSpace, request.target);
     CMPIArgs* in = buildArgs(broker, context.classes, request.nameSpace, method, request.params);
     host::Reply reply = context.core.invokeMethod(target, method.name.c_str(), in,
-                                                  callOptions(context, false, false, false, false, {}));
+                                                  callOptions(context, false, false, false, {}));
     throwIfFailed(reply);
     if (const CMPIData* value = returnedValue(reply)) {
         cimxml::writeReturnValue(context.out, *value);

@@ -52,8 +52,8 @@ void invokeMethod(OperationContext& context);
 const repository::ClassDecl& requireClass(const OperationContext& context, const std::string& className);
 // Throws CimError with the reply's code and message unless it is OK.
 void throwIfFailed(const host::Reply& reply);
-// CMPI invocation flags and property list of a request.
-host::CallOptions callOptions(const OperationContext& context, bool localOnly, bool deepInheritance,
+// CMPI invocation flags and property list of a request (never LocalOnly: see instance_operations.cpp).
+host::CallOptions callOptions(const OperationContext& context, bool deepInheritance,
                               bool includeQualifiers, bool includeClassOrigin,
                               const std::optional<std::vector<std::string>>& propertyList);
 // Encoding of returned instances: class origins and property list from the request.

@@ -21,12 +21,12 @@ void throwIfFailed(const host::Reply& reply) {
     }
 }
 
-host::CallOptions callOptions(const OperationContext& context, bool localOnly, bool deepInheritance,
+host::CallOptions callOptions(const OperationContext& context, bool deepInheritance,
                               bool includeQualifiers, bool includeClassOrigin,
                               const std::optional<std::vector<std::string>>& propertyList) {
     host::CallOptions options;
     options.principal = context.principal;
-    options.flags = (localOnly ? CMPI_FLAG_LocalOnly : 0U) | (deepInheritance ? CMPI_FLAG_DeepInheritance : 0U) |
+    options.flags = (deepInheritance ? CMPI_FLAG_DeepInheritance : 0U) |
                     (includeQualifiers ? CMPI_FLAG_IncludeQualifiers : 0U) |
                     (includeClassOrigin ? CMPI_FLAG_IncludeClassOrigin : 0U);
     options.properties = propertyList;
