@@ -77,14 +77,34 @@ json ring(unsigned rx, unsigned tx)
     return out;
 }
 
+// Two functions per adapter, adapters on buses 3 to 255; a host with more
+// adapters than that goes on to the next PCI segment, so every address stays
+// within the 8-bit bus number and is unique.
+struct PciAddress {
+    unsigned segment;
+    unsigned bus;
+    unsigned function;
+};
+
+constexpr unsigned kFirstBus = 3;
+constexpr unsigned kBusesPerSegment = 256 - kFirstBus;
+
+PciAddress pciAddress(unsigned index)
+{
+    const unsigned adapter = index / 2;
+    return {adapter / kBusesPerSegment, kFirstBus + adapter % kBusesPerSegment, index % 2};
+}
+
 json nic(const HostShape& shape, unsigned index)
 {
     const bool hasPci = index + shape.nicsWithoutPci < shape.nics;
     const bool tenGig = index < 2;
+    const PciAddress address = pciAddress(index);
     json out;
     out["name"] = format("vmnic%u", index);
-    out["pci"] = hasPci ? json{{"segment", 0}, {"bus", 3 + index / 2}, {"slot", 0}, {"function", index % 2},
-                               {"vendorId", 0x8086}, {"deviceId", tenGig ? 0x10fb : 0x1521}}
+    out["pci"] = hasPci ? json{{"segment", address.segment}, {"bus", address.bus}, {"slot", 0},
+                               {"function", address.function}, {"vendorId", 0x8086},
+                               {"deviceId", tenGig ? 0x10fb : 0x1521}}
                         : json(nullptr);
     out["mac"] = format("00:50:56:%02x:%02x:%02x", (index >> 16) & 0xff, (index >> 8) & 0xff, index & 0xff);
     out["enabled"] = true;
@@ -94,7 +114,8 @@ json nic(const HostShape& shape, unsigned index)
     out["mtu"] = tenGig ? 9000 : 1500;
     out["wakeOnLan"] = {{"supported", !tenGig}, {"enabled", false}};
     out["info"] = nicInfo(index, tenGig);
-    const std::string bus = hasPci ? format("0000:%02x:00.%u", 3 + index / 2, index % 2) : "N/A";
+    const std::string bus =
+        hasPci ? format("%04x:%02x:00.%u", address.segment, address.bus, address.function) : "N/A";
     out["driver"] = {{"name", tenGig ? "ixgben" : "igbn"}, {"version", tenGig ? "1.7.1" : "0.1.1.0"},
                      {"firmwareVersion", format("0x%08x", 0x80000000u + index)}, {"busInfo", bus}};
     json stats;
