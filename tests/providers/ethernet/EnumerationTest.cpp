@@ -4,6 +4,8 @@
 
 #include <algorithm>
 
+#include "orv/platform/simgen/HostGenerator.h"
+
 namespace ethernet {
 namespace {
 
@@ -131,6 +133,22 @@ TEST_F(EnumerationTest, HostWithoutNicsGivesEmptySuccessForEveryClass) {
             EXPECT_EQ(reply.doneCount(), 1u) << cls;
         }
     }
+}
+
+// The size the benchmark measures: past 506 NICs a generated host needs a
+// second PCI segment.
+TEST_F(EnumerationTest, GeneratedHostOf1024NicsGivesEveryClassOneItemPerNic) {
+    orv::platform::simgen::HostShape shape;
+    shape.nics = 1024;
+    serve(orv::platform::simgen::generateHost(shape));
+    for (const std::string& cls : servedClasses()) {
+        Reply reply = provider().enumerateInstances(cls);
+        EXPECT_EQ(reply.rc(), CMPI_RC_OK) << cls << ": " << reply.message();
+        EXPECT_EQ(reply.items().size(), 1024u) << cls;
+    }
+    Reply last = provider().getInstance(kPort, {{"DeviceID", "vmnic1023"}});
+    ASSERT_EQ(last.instances().size(), 1u);
+    EXPECT_EQ(orv::providertest::propertyOf(last.instances()[0], "DeviceID")->text, "vmnic1023");
 }
 
 TEST_F(EnumerationTest, FailedNicListFailsWithoutDone) {
