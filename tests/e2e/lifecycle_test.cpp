@@ -5,6 +5,7 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <chrono>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
@@ -109,6 +110,25 @@ TEST(CimHostLifecycle, BrokenProviderLibraryFailsWithOneLineFromTheDynamicLoader
                                  dir + "/libbroken.so: invalid ELF header\n");
     std::filesystem::remove_all(dir);
     std::remove(reg.c_str());
+}
+
+TEST(CimHostLifecycle, RequestOverrunningTheProviderCallLimitAnswersCimErrFailedAndStopWaitsForTheCall) {
+    setenv("SLOW_PROVIDER_MS", "3000", 1);
+    HostProcess host({"--provider-dir", buildDir() + "/lib", "--registration",
+                      sourceDir() + "/tests/e2e/data/slowhost.reg", "--mof",
+                      sourceDir() + "/tests/rawprovider/rawprovider.mof", "--provider-call-limit", "1"});
+    unsetenv("SLOW_PROVIDER_MS");
+    ASSERT_TRUE(host.waitReady()) << host.output();
+    const auto start = std::chrono::steady_clock::now();
+    const std::string out = runCommand("timeout 20 wbemcli ein 'http://localhost:" + std::to_string(host.port()) +
+                                       "/root/cimv2:Raw_Element'");
+    const auto waited = std::chrono::steady_clock::now() - start;
+    EXPECT_EQ(out, "*\n* wbemcli: Cim: (1) CIM_ERR_FAILED: the request did not finish within the provider call "
+                   "limit of 1 s; the provider call goes on in the background and its result is dropped\n*\n");
+    EXPECT_LT(waited, std::chrono::milliseconds(2500)) << "the answer came when the limit ran out";
+    EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
+    EXPECT_GT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(2900))
+        << "the stop waited for the provider call still running";
 }
 
 TEST(CimHostLifecycle, BadMofFailsWithOneLine) {

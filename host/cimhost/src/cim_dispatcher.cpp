@@ -5,6 +5,7 @@
 #include <array>
 #include <utility>
 
+#include "call_limiter.hpp"
 #include "operation_context.hpp"
 #include "orv/cimxml/cim_status.hpp"
 #include "orv/cimxml/response_writer.hpp"
@@ -51,10 +52,31 @@ const Operation* findOperation(const std::string& name) {
 }  // namespace
 
 CimDispatcher::CimDispatcher(host::BrokerCore& core, const repository::ClassRepository& classes,
-                             std::string hostName)
-    : core_(core), classes_(classes), hostName_(std::move(hostName)) {}
+                             std::string hostName, std::chrono::milliseconds callLimit)
+    : core_(core),
+      classes_(classes),
+      hostName_(std::move(hostName)),
+      limiter_(std::make_unique<detail::CallLimiter>(callLimit)) {}
+
+CimDispatcher::~CimDispatcher() = default;
+
+void CimDispatcher::drain() { limiter_->drain(); }
 
 std::string CimDispatcher::respond(const cimxml::CimRequest& request, const std::string& principal) const {
+    std::optional<std::string> answer =
+        limiter_->run([this, request, principal] { return respondNow(request, principal); });
+    if (answer) {
+        return std::move(*answer);
+    }
+    const auto limit = std::chrono::duration_cast<std::chrono::seconds>(limiter_->limit());
+    return cimxml::errorResponse(request.messageId, request.methodName, request.intrinsic,
+                                 static_cast<int>(CimStatus::Failed),
+                                 "the request did not finish within the provider call limit of " +
+                                     std::to_string(limit.count()) +
+                                     " s; the provider call goes on in the background and its result is dropped");
+}
+
+std::string CimDispatcher::respondNow(const cimxml::CimRequest& request, const std::string& principal) const {
     const auto fail = [&request](int code, std::string_view description) {
         return cimxml::errorResponse(request.messageId, request.methodName, request.intrinsic, code, description);
     };

@@ -83,7 +83,8 @@ CimHost::CimHost(const HostConfig& config) : impl_(std::make_unique<Impl>()) {
     }
     detail::preloadProviders(*impl_->core);
     impl_->dispatcher = std::make_unique<CimDispatcher>(
-        *impl_->core, impl_->core->classes(), config.hostName.empty() ? machineName() : config.hostName);
+        *impl_->core, impl_->core->classes(), config.hostName.empty() ? machineName() : config.hostName,
+        config.providerCallLimit);
     const CimDispatcher* dispatcher = impl_->dispatcher.get();
     impl_->server = std::make_unique<http::HttpServer>(
         serverOptions(config),
@@ -94,6 +95,9 @@ CimHost::CimHost(const HostConfig& config) : impl_(std::make_unique<Impl>()) {
 
 CimHost::~CimHost() {
     stop();
+    if (impl_->dispatcher) {
+        impl_->dispatcher->drain();
+    }
     if (impl_->core) {
         impl_->core->shutdown();
     }
@@ -109,6 +113,7 @@ void CimHost::run() {
         impl_->server->run();
     }
     impl_->runFinished.store(true);
+    impl_->dispatcher->drain();
     impl_->core->shutdown();
 }
 

@@ -97,6 +97,11 @@ constexpr std::array kKeys = {
               }},
     ConfigKey{"threads", "threads", "worker threads serving requests (8)",
               [](HostConfig& c, std::string_view v, Base) { c.threads = parseNumber<std::size_t>(v, 1, 256); }},
+    ConfigKey{"providerCallLimit", "provider-call-limit",
+              "seconds a request may wait for its providers before CIM_ERR_FAILED (60; 0: no limit)",
+              [](HostConfig& c, std::string_view v, Base) {
+                  c.providerCallLimit = std::chrono::seconds(parseNumber<long>(v, 0, 3600));
+              }},
     ConfigKey{"hostName", "host-name", "HOST written in instance paths (this machine's name)",
               [](HostConfig& c, std::string_view v, Base) { c.hostName = std::string(v); }},
 };

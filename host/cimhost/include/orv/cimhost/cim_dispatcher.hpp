@@ -2,6 +2,8 @@
 // instance and association operations through the broker core.
 #pragma once
 
+#include <chrono>
+#include <memory>
 #include <string>
 
 #include "orv/cimxml/request.hpp"
@@ -10,20 +12,37 @@
 
 namespace orv::cimhost {
 
+namespace detail {
+class CallLimiter;
+}
+
 class CimDispatcher {
 public:
-    // `hostName` is the HOST of instance paths whose provider left it out.
-    CimDispatcher(host::BrokerCore& core, const repository::ClassRepository& classes, std::string hostName);
+    // `hostName` is the HOST of instance paths whose provider left it out. A non-zero
+    // `callLimit` caps how long a request may wait for the providers (see respond).
+    CimDispatcher(host::BrokerCore& core, const repository::ClassRepository& classes, std::string hostName,
+                  std::chrono::milliseconds callLimit = {});
+    ~CimDispatcher();
+    CimDispatcher(const CimDispatcher&) = delete;
+    CimDispatcher& operator=(const CimDispatcher&) = delete;
 
     // The whole CIM-XML response document. Failures of the operation become an ERROR
     // element: CIM_ERR_NOT_SUPPORTED for unknown methods, CIM_ERR_INVALID_NAMESPACE,
     // CIM_ERR_INVALID_PARAMETER for wrong parameters, the provider's code and message.
+    // A request that overruns the call limit is answered CIM_ERR_FAILED; its provider
+    // call cannot be stopped and goes on in the background, its result dropped.
     std::string respond(const cimxml::CimRequest& request, const std::string& principal) const;
+    // Waits for every provider call still running (overrunning ones included); the
+    // host calls it after the server stopped and before the providers are cleaned up.
+    void drain();
 
 private:
+    std::string respondNow(const cimxml::CimRequest& request, const std::string& principal) const;
+
     host::BrokerCore& core_;
     const repository::ClassRepository& classes_;
     std::string hostName_;
+    std::unique_ptr<detail::CallLimiter> limiter_;
 };
 
 }  // namespace orv::cimhost

@@ -31,6 +31,8 @@ struct HostConfig {
     std::chrono::seconds keepAliveTimeout{5};
     std::size_t keepAliveMaxRequests = 100;
     std::size_t threads = 8;
+    // Longest a request may wait for its providers (0: no limit); see CimDispatcher.
+    std::chrono::seconds providerCallLimit{60};
     std::string hostName;  // HOST of instance paths in responses; empty: this machine's name
 };
 
