@@ -2,7 +2,7 @@
 // request for a fixed time; prints requests per second and p50 / p99 latency.
 //
 //   cimhost_load --port 5988 --clients 8 --seconds 5 --op ei --class Raw_Element
-//   cimhost_load --op gi --class Orvane_EthernetPort --key DeviceID=vmnic0 ...
+//   cimhost_load --op gi --class Orvane_EthernetPort --key DeviceID=vmnic0,SystemName=h ...
 #include <httplib.h>
 
 #include <algorithm>
@@ -23,18 +23,34 @@ struct Options {
     int seconds = 5;
     std::string op = "ei";
     std::string className = "Raw_Element";
-    std::string key;  // Name=value for gi
+    std::string key;  // Name=value[,Name=value...] for gi
     std::string user;
     std::string password;
 };
 
+// KEYBINDING elements of string keys given as "Name=value,Name=value".
+std::string keyBindings(const std::string& keys) {
+    std::string out;
+    std::size_t start = 0;
+    while (start < keys.size()) {
+        std::size_t comma = keys.find(',', start);
+        if (comma == std::string::npos) {
+            comma = keys.size();
+        }
+        const std::string binding = keys.substr(start, comma - start);
+        const auto equals = binding.find('=');
+        out += "<KEYBINDING NAME=\"" + binding.substr(0, equals) + "\"><KEYVALUE VALUETYPE=\"string\">" +
+               binding.substr(equals + 1) + "</KEYVALUE></KEYBINDING>";
+        start = comma + 1;
+    }
+    return out;
+}
+
 std::string requestBody(const Options& options) {
     std::string params;
     if (options.op == "gi") {
-        const auto equals = options.key.find('=');
-        params = "<IPARAMVALUE NAME=\"InstanceName\"><INSTANCENAME CLASSNAME=\"" + options.className +
-                 "\"><KEYBINDING NAME=\"" + options.key.substr(0, equals) + "\"><KEYVALUE VALUETYPE=\"string\">" +
-                 options.key.substr(equals + 1) + "</KEYVALUE></KEYBINDING></INSTANCENAME></IPARAMVALUE>";
+        params = "<IPARAMVALUE NAME=\"InstanceName\"><INSTANCENAME CLASSNAME=\"" + options.className + "\">" +
+                 keyBindings(options.key) + "</INSTANCENAME></IPARAMVALUE>";
     } else {
         params = "<IPARAMVALUE NAME=\"ClassName\"><CLASSNAME NAME=\"" + options.className + "\"/></IPARAMVALUE>";
     }
