@@ -10,8 +10,8 @@
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
-#include <sstream>
 
+#include "golden_file.hpp"
 #include "host_process.hpp"
 
 namespace orv::e2e {
@@ -19,13 +19,6 @@ namespace {
 
 std::string tempPath(const std::string& name) {
     return "/tmp/orv-e2e-" + std::to_string(getpid()) + "-" + name;
-}
-
-std::string readFile(const std::string& path) {
-    std::ifstream in(path);
-    std::stringstream text;
-    text << in.rdbuf();
-    return text.str();
 }
 
 std::size_t lineCount(const std::string& text) {

@@ -3,11 +3,9 @@
 #include <gtest/gtest.h>
 #include <signal.h>
 
-#include <cstdlib>
-#include <fstream>
 #include <regex>
-#include <sstream>
 
+#include "golden_file.hpp"
 #include "host_process.hpp"
 
 namespace orv::e2e {
@@ -39,24 +37,13 @@ protected:
 
 HostProcess* WbemcliTest::host_ = nullptr;
 
-std::string readFile(const std::string& path) {
-    std::ifstream in(path);
-    std::stringstream text;
-    text << in.rdbuf();
-    return text.str();
-}
-
 TEST_P(WbemcliTest, OutputMatchesGolden) {
     const WbemcliCase& c = GetParam();
     const std::string port = std::to_string(host_->port());
     const std::string url = std::string("'http://") + c.user + ":secret@localhost:" + port + "/root/" + c.object + "'";
     std::string output = runCommand(std::string("timeout 20 wbemcli ") + c.command + " " + url + " " + c.extra);
     output = std::regex_replace(output, std::regex("localhost:" + port), "localhost:PORT");
-    const std::string golden = sourceDir() + "/tests/e2e/golden/" + c.name + ".txt";
-    if (std::getenv("ORV_UPDATE_GOLDEN") != nullptr) {
-        std::ofstream(golden) << output;
-    }
-    EXPECT_EQ(output, readFile(golden)) << c.name;
+    EXPECT_EQ(output, goldenText(sourceDir() + "/tests/e2e/golden/" + c.name + ".txt", output)) << c.name;
 }
 
 const WbemcliCase kCases[] = {

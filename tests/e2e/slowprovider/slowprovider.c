@@ -1,6 +1,8 @@
 /* A provider that takes its time: every instance enumeration of Raw_Element sleeps
  * for SLOW_PROVIDER_MS milliseconds (default 2000) and then returns nothing. The
  * end-to-end tests use it to overrun the host's provider call limit. */
+#define _POSIX_C_SOURCE 200809L /* nanosleep */
+
 #include <cmpidt.h>
 #include <cmpift.h>
 #include <stdlib.h>
