@@ -1,10 +1,8 @@
 #include "call_limiter.hpp"
 
-#include <thread>
-
 namespace orv::cimhost::detail {
 
-// What the waiting request and the call's thread share.
+// What the waiting request and the call thread share.
 struct CallLimiter::Call {
     std::mutex mutex;
     std::condition_variable done;
@@ -14,7 +12,17 @@ struct CallLimiter::Call {
 
 CallLimiter::CallLimiter(std::chrono::milliseconds limit) : limit_(limit) {}
 
-CallLimiter::~CallLimiter() { drain(); }
+CallLimiter::~CallLimiter() {
+    drain();
+    {
+        std::lock_guard lock(mutex_);
+        stopping_ = true;
+    }
+    jobReady_.notify_all();
+    for (std::thread& thread : threads_) {
+        thread.join();
+    }
+}
 
 std::optional<std::string> CallLimiter::run(std::function<std::string()> work) {
     if (limit_.count() == 0) {
@@ -24,18 +32,12 @@ std::optional<std::string> CallLimiter::run(std::function<std::string()> work) {
     {
         std::lock_guard lock(mutex_);
         ++running_;
-    }
-    std::thread([this, call, work = std::move(work)] {
-        std::string result = work();
-        bool overran = false;
-        {
-            std::lock_guard lock(call->mutex);
-            call->result = std::move(result);
-            overran = call->abandoned;
-            call->done.notify_one();
+        queue_.push_back(Job{std::move(work), call});
+        if (waitingThreads_ < queue_.size()) {
+            threads_.emplace_back([this] { serve(); });
         }
-        finished(overran);
-    }).detach();
+    }
+    jobReady_.notify_one();
     std::unique_lock lock(call->mutex);
     if (!call->done.wait_for(lock, limit_, [&call] { return call->result.has_value(); })) {
         call->abandoned = true;
@@ -46,13 +48,34 @@ std::optional<std::string> CallLimiter::run(std::function<std::string()> work) {
     return std::move(call->result);
 }
 
-void CallLimiter::finished(bool overran) {
-    std::lock_guard lock(mutex_);
-    --running_;
-    if (overran) {
-        --overrunning_;
+void CallLimiter::serve() {
+    std::unique_lock lock(mutex_);
+    for (;;) {
+        ++waitingThreads_;
+        jobReady_.wait(lock, [this] { return stopping_ || !queue_.empty(); });
+        --waitingThreads_;
+        if (queue_.empty()) {
+            return;  // stopping
+        }
+        Job job = std::move(queue_.front());
+        queue_.pop_front();
+        lock.unlock();
+        std::string result = job.work();
+        bool overran = false;
+        {
+            std::lock_guard callLock(job.call->mutex);
+            job.call->result = std::move(result);
+            overran = job.call->abandoned;
+            job.call->done.notify_one();
+        }
+        job = Job{};
+        lock.lock();
+        --running_;
+        if (overran) {
+            --overrunning_;
+        }
+        idle_.notify_all();
     }
-    idle_.notify_all();
 }
 
 void CallLimiter::drain() {
