@@ -27,6 +27,8 @@
 
 #include <tmkctl/network/NetworkInfoImpl.h>
 
+#include "orv/platform/backend/Selector.h"
+
 #include "orv/platform/simgen/HostGenerator.h"
 #include "orv/providertest/ProviderCore.h"
 #include "orv/providertest/SimHost.h"
@@ -47,10 +49,15 @@ void pointAtTheBuild() {
     setenv("ORV_BUILD_DIR", ORV_ETHERNET_BUILD_DIR, 0);
 }
 
+// The platform library linked into this program picked its substitute when
+// the program started, before the SimHost pointed it at the fixture; it is
+// asked to pick again so that GetPnicByName below sees the simulated host.
 void serveHost(const orv::providertest::SimHost& host, unsigned nics) {
     orv::platform::simgen::HostShape shape;
     shape.nics = nics;
     host.write(orv::platform::simgen::generateHost(shape));
+    static const bool reselected = (orv::platform::reselectBackend(), true);
+    (void)reselected;
 }
 
 std::string nicName(unsigned index) { return "vmnic" + std::to_string(index); }
@@ -94,6 +101,10 @@ struct Bench {
         if (!provider) {
             provider = std::make_unique<orv::providertest::ProviderCore>();
         }
+        // Both platform copies (the provider library's and this program's)
+        // read the new fixture now, not inside the first timed request.
+        getPort(*provider, nicName(0));
+        pnicByName(nicName(0));
     }
     orv::providertest::SimHost host;
     std::unique_ptr<orv::providertest::ProviderCore> provider;
