@@ -7,7 +7,7 @@ struct CallLimiter::Call {
     std::mutex mutex;
     std::condition_variable done;
     std::optional<std::string> result;
-    bool abandoned = false;  // the request stopped waiting
+    bool abandoned = false;  // the request stopped waiting; guarded by CallLimiter::mutex_
 };
 
 CallLimiter::CallLimiter(std::chrono::milliseconds limit) : limit_(limit) {}
@@ -38,20 +38,27 @@ std::optional<std::string> CallLimiter::run(std::function<std::string()> work) {
         }
     }
     jobReady_.notify_one();
-    std::unique_lock lock(call->mutex);
-    if (!call->done.wait_for(lock, limit_, [&call] { return call->result.has_value(); })) {
-        call->abandoned = true;
-        std::lock_guard count(mutex_);
-        ++overrunning_;
-        return std::nullopt;
+    {
+        std::unique_lock callLock(call->mutex);
+        if (call->done.wait_for(callLock, limit_, [&call] { return call->result.has_value(); })) {
+            return std::move(call->result);
+        }
     }
-    return std::move(call->result);
+    // The result is published under mutex_ too: either it arrived just now, or the
+    // call thread will see `abandoned` when it returns.
+    std::lock_guard lock(mutex_);
+    if (call->result) {
+        return std::move(call->result);
+    }
+    call->abandoned = true;
+    ++overrunning_;
+    return std::nullopt;
 }
 
 void CallLimiter::serve() {
     std::unique_lock lock(mutex_);
+    ++waitingThreads_;
     for (;;) {
-        ++waitingThreads_;
         jobReady_.wait(lock, [this] { return stopping_ || !queue_.empty(); });
         --waitingThreads_;
         if (queue_.empty()) {
@@ -61,19 +68,18 @@ void CallLimiter::serve() {
         queue_.pop_front();
         lock.unlock();
         std::string result = job.work();
-        bool overran = false;
+        job.work = nullptr;  // what the request owned goes before the lock is taken
+        lock.lock();
+        --running_;
+        ++waitingThreads_;  // counted before the result is out, so the next request finds this thread
+        if (job.call->abandoned) {
+            --overrunning_;
+        }
         {
             std::lock_guard callLock(job.call->mutex);
             job.call->result = std::move(result);
-            overran = job.call->abandoned;
-            job.call->done.notify_one();
         }
-        job = Job{};
-        lock.lock();
-        --running_;
-        if (overran) {
-            --overrunning_;
-        }
+        job.call->done.notify_one();
         idle_.notify_all();
     }
 }
