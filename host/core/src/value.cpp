@@ -208,8 +208,7 @@ ValueList::ValueList(const ValueList& other) {
     }
 }
 
-const NamedValue* ValueList::find(std::string_view name) const noexcept {
-    std::uint32_t hash = hashNoCase(name);
+const NamedValue* ValueList::findHashed(std::string_view name, std::uint32_t hash) const noexcept {
     for (const NamedValue& item : items_) {
         if (item.hash == hash && equalsNoCase(item.name, name)) {
             return &item;
@@ -217,6 +216,8 @@ const NamedValue* ValueList::find(std::string_view name) const noexcept {
     }
     return nullptr;
 }
+
+const NamedValue* ValueList::find(std::string_view name) const noexcept { return findHashed(name, hashNoCase(name)); }
 
 CMPIrc ValueList::set(std::string_view name, const CMPIValue* value, CMPIType type) {
     CMPIData stored{};
@@ -227,13 +228,16 @@ CMPIrc ValueList::set(std::string_view name, const CMPIValue* value, CMPIType ty
     return rc;
 }
 
+// The name is hashed once, for the lookup and for the new entry.
 void ValueList::setStored(std::string_view name, CMPIData stored) {
-    if (auto* existing = const_cast<NamedValue*>(find(name)); existing != nullptr) {
-        retireValue(existing->data);
-        existing->data = stored;
+    std::uint32_t hash = hashNoCase(name);
+    if (const NamedValue* found = findHashed(name, hash); found != nullptr) {
+        NamedValue& existing = items_[static_cast<std::size_t>(found - items_.data())];
+        retireValue(existing.data);
+        existing.data = stored;
         return;
     }
-    items_.push_back(NamedValue{std::string(name), hashNoCase(name), stored});
+    items_.push_back(NamedValue{std::string(name), hash, stored});
 }
 
 CMPIData ValueList::get(std::string_view name, CMPIStatus* rc, CMPIValueState missing) const {

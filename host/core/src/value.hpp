@@ -86,6 +86,9 @@ public:
     CMPIData at(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const;
 
 private:
+    // The entry named `name`, whose hashNoCase is `hash`, or null.
+    const NamedValue* findHashed(std::string_view name, std::uint32_t hash) const noexcept;
+
     std::vector<NamedValue> items_;
 };
 
