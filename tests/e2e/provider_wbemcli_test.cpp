@@ -23,7 +23,7 @@ const std::string kPort =
     "Orvane_EthernetPort.DeviceID=\"vmnic0\",SystemCreationClassName=\"OMC_UnitaryComputerSystem\","
     "SystemName=\"orvhost01.lab.example.com\",CreationClassName=\"Orvane_EthernetPort\"";
 const std::string kEndpoint =
-    "Orvane_KernelIPv4ProtocolEndpoint.Name=\"vmk0\",SystemCreationClassName=\"OMC_UnitaryComputerSystem\","
+    "Orvane_KernelIPv4ProtocolEndpoint.Name=\"vif0\",SystemCreationClassName=\"OMC_UnitaryComputerSystem\","
     "SystemName=\"orvhost01.lab.example.com\",CreationClassName=\"Orvane_KernelIPv4ProtocolEndpoint\"";
 const std::string kProcessor =
     "Orvane_Processor.ElementName=\"cpu-1\",SystemCreationClassName=\"OMC_UnitaryComputerSystem\","

@@ -117,13 +117,13 @@ TEST(KsiFault, NodeFailsForANamedParameterOnItsNthRead)
 TEST(KsiFault, AppendingTheLastNicsNameFails)
 {
     Json fixture = defaultHost();
-    addFault(fixture, {{"call", "KSI_ParamListAddString"}, {"param", "vmk1"}});
+    addFault(fixture, {{"call", "KSI_ParamListAddString"}, {"param", "vif1"}});
     SimHost host(fixture);
     ListPtr list(KSI_ParamListCreate(1, 1));
     EXPECT_EQ(KSI_ParamListAddString(list.get(), "defaultTcpipStack"), KSI_OK);
-    EXPECT_EQ(KSI_ParamListAddString(list.get(), "vmk0"), KSI_OK);
+    EXPECT_EQ(KSI_ParamListAddString(list.get(), "vif0"), KSI_OK);
     EXPECT_EQ(KSI_ParamListRemoveLastParam(list.get()), KSI_OK);
-    EXPECT_EQ(KSI_ParamListAddString(list.get(), "vmk1"), KSI_ERR_FAILURE);
+    EXPECT_EQ(KSI_ParamListAddString(list.get(), "vif1"), KSI_ERR_FAILURE);
     EXPECT_EQ(KSI_ParamListUsedCount(list.get()), 1u);
 }
 
@@ -131,14 +131,14 @@ TEST(KsiFault, InstanceListOfANamedVnicFails)
 {
     Json fixture = defaultHost();
     addFault(fixture, {{"call", "KSI_GetInstanceListAlloc"}, {"node", "KSI_NODE_net_tcpip_instances_vNics_v6_addresses"},
-                       {"param", "vmk0"}, {"status", KSI_ERR_NOT_FOUND}});
+                       {"param", "vif0"}, {"status", KSI_ERR_NOT_FOUND}});
     SimHost host(fixture);
     KSI_ParamList* raw = nullptr;
-    ListPtr vmk0 = stringParams({"defaultTcpipStack", "vmk0"});
-    EXPECT_EQ(KSI_GetInstanceListAlloc(KSI_NODE_net_tcpip_instances_vNics_v6_addresses, vmk0.get(), &raw),
+    ListPtr vif0 = stringParams({"defaultTcpipStack", "vif0"});
+    EXPECT_EQ(KSI_GetInstanceListAlloc(KSI_NODE_net_tcpip_instances_vNics_v6_addresses, vif0.get(), &raw),
               KSI_ERR_NOT_FOUND);
-    ListPtr vmk1 = stringParams({"defaultTcpipStack", "vmk1"});
-    EXPECT_EQ(KSI_GetInstanceListAlloc(KSI_NODE_net_tcpip_instances_vNics_v6_addresses, vmk1.get(), &raw), KSI_OK);
+    ListPtr vif1 = stringParams({"defaultTcpipStack", "vif1"});
+    EXPECT_EQ(KSI_GetInstanceListAlloc(KSI_NODE_net_tcpip_instances_vNics_v6_addresses, vif1.get(), &raw), KSI_OK);
     ListPtr owned(raw);
 }
 
@@ -157,7 +157,7 @@ TEST(KsiFault, ListReadsCanFail)
 {
     Json fixture = defaultHost();
     addFault(fixture, {{"call", "KSI_ParamListGetInt32"}, {"param", "1"}});
-    addFault(fixture, {{"call", "KSI_ParamGetString"}, {"param", "vmk0"}});
+    addFault(fixture, {{"call", "KSI_ParamGetString"}, {"param", "vif0"}});
     SimHost host(fixture);
     KSI_ParamList* raw = nullptr;
     ASSERT_EQ(KSI_GetInstanceListAlloc(KSI_NODE_hardware_cpu_packageList, nullptr, &raw), KSI_OK);
@@ -165,7 +165,7 @@ TEST(KsiFault, ListReadsCanFail)
     int32_t instance = -1;
     EXPECT_EQ(KSI_ParamListGetInt32(raw, 0, &instance), KSI_OK);
     EXPECT_EQ(KSI_ParamListGetInt32(raw, 1, &instance), KSI_ERR_FAILURE);
-    EXPECT_EQ(instanceNames(stringParams({"vmk0", "vmk1"}).get()), (std::vector<std::string>{"", "vmk1"}));
+    EXPECT_EQ(instanceNames(stringParams({"vif0", "vif1"}).get()), (std::vector<std::string>{"", "vif1"}));
 }
 
 TEST(VersionFault, ServiceFailsWithTheGivenCodeAndText)

@@ -31,7 +31,7 @@ TEST(SimKsi, VnicListIsTheStacksVnicsWithEmptySlots)
     ASSERT_EQ(KSI_GetInstanceListAlloc(KSI_NODE_net_tcpip_instances_vNics, stack.get(), &raw), KSI_OK);
     ListPtr vnics(raw);
     ASSERT_EQ(KSI_ParamListUsedCount(vnics.get()), 3u);
-    EXPECT_EQ(instanceNames(vnics.get()), (std::vector<std::string>{"vmk0", "vmk1", ""}));
+    EXPECT_EQ(instanceNames(vnics.get()), (std::vector<std::string>{"vif0", "vif1", ""}));
     EXPECT_EQ(KSI_ParamListGetParam(vnics.get(), 2), nullptr);
 }
 
@@ -49,14 +49,14 @@ TEST(SimKsi, Ipv4AddressAndNetmaskInNetworkByteOrder)
     Json fixture = defaultHost();
     fixture["tcpipStacks"]["defaultTcpipStack"]["vnics"][1]["ipv4"] = {{"address", "0.0.0.0"}, {"netmask", "255.255.0.0"}};
     SimHost host(fixture);
-    ListPtr params = stringParams({"defaultTcpipStack", "vmk0"});
+    ListPtr params = stringParams({"defaultTcpipStack", "vif0"});
     uint32_t address = 0;
     uint32_t netmask = 0;
     ASSERT_EQ(KSI_Get(KSI_NODE_net_tcpip_instances_vNics_v4_ipaddr, params.get(), &address, 4), KSI_OK);
     ASSERT_EQ(KSI_Get(KSI_NODE_net_tcpip_instances_vNics_v4_netmask, params.get(), &netmask, 4), KSI_OK);
     EXPECT_STREQ(inet_ntoa(in_addr{address}), "10.0.0.10");
     EXPECT_STREQ(inet_ntoa(in_addr{netmask}), "255.255.255.0");
-    ListPtr second = stringParams({"defaultTcpipStack", "vmk1"});
+    ListPtr second = stringParams({"defaultTcpipStack", "vif1"});
     ASSERT_EQ(KSI_Get(KSI_NODE_net_tcpip_instances_vNics_v4_ipaddr, second.get(), &address, 4), KSI_OK);
     EXPECT_EQ(address, 0u);
 }
@@ -66,7 +66,7 @@ TEST(SimKsi, VnicWithoutIpv4FailsTheAddressRead)
     Json fixture = defaultHost();
     fixture["tcpipStacks"]["defaultTcpipStack"]["vnics"][0].erase("ipv4");
     SimHost host(fixture);
-    ListPtr params = stringParams({"defaultTcpipStack", "vmk0"});
+    ListPtr params = stringParams({"defaultTcpipStack", "vif0"});
     uint32_t address = 0;
     EXPECT_EQ(KSI_Get(KSI_NODE_net_tcpip_instances_vNics_v4_ipaddr, params.get(), &address, 4), KSI_ERR_NOT_FOUND);
 }
@@ -74,7 +74,7 @@ TEST(SimKsi, VnicWithoutIpv4FailsTheAddressRead)
 TEST(SimKsi, Ipv6AddressesAndTheirSummaries)
 {
     SimHost host(defaultHost());
-    ListPtr params = stringParams({"defaultTcpipStack", "vmk1"});
+    ListPtr params = stringParams({"defaultTcpipStack", "vif1"});
     KSI_ParamList* raw = nullptr;
     ASSERT_EQ(KSI_GetInstanceListAlloc(KSI_NODE_net_tcpip_instances_vNics_v6_addresses, params.get(), &raw), KSI_OK);
     ListPtr addresses(raw);
@@ -95,10 +95,10 @@ TEST(SimKsi, NullAndMissingIpv6ListsDiffer)
     fixture["tcpipStacks"]["defaultTcpipStack"]["vnics"][1].erase("ipv6");
     SimHost host(fixture);
     KSI_ParamList* raw = reinterpret_cast<KSI_ParamList*>(1);
-    ListPtr first = stringParams({"defaultTcpipStack", "vmk0"});
+    ListPtr first = stringParams({"defaultTcpipStack", "vif0"});
     EXPECT_EQ(KSI_GetInstanceListAlloc(KSI_NODE_net_tcpip_instances_vNics_v6_addresses, first.get(), &raw), KSI_OK);
     EXPECT_EQ(raw, nullptr);
-    ListPtr second = stringParams({"defaultTcpipStack", "vmk1"});
+    ListPtr second = stringParams({"defaultTcpipStack", "vif1"});
     EXPECT_EQ(KSI_GetInstanceListAlloc(KSI_NODE_net_tcpip_instances_vNics_v6_addresses, second.get(), &raw),
               KSI_ERR_NOT_FOUND);
 }

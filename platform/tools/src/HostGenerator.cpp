@@ -136,7 +136,7 @@ json nic(const HostShape& shape, unsigned index)
 
 json vnic(const HostShape& shape, unsigned index)
 {
-    json out{{"name", format("vmk%u", index)}};
+    json out{{"name", format("vif%u", index)}};
     if (shape.ipv4) {
         out["ipv4"] = {{"address", format("10.%u.%u.10", (index >> 8) & 0xff, index & 0xff)},
                        {"netmask", "255.255.255.0"}};

@@ -32,13 +32,13 @@ protected:
 
 TEST_F(EndpointCollectionFailureTest, FaultFreeHostReturnsEveryRecord) {
     const orv::host::Reply reply = enumerateWith(Json::array());
-    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vmk0"},
-                                             {kIPv6Class, "vmk0"},
-                                             {kIPv6Class, "vmk0"},
-                                             {kIPv4Class, "vmk1"},
-                                             {kIPv6Class, "vmk1"},
-                                             {kIPv4Class, "vmk2"},
-                                             {kIPv6Class, "vmk2"}}));
+    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vif0"},
+                                             {kIPv6Class, "vif0"},
+                                             {kIPv6Class, "vif0"},
+                                             {kIPv4Class, "vif1"},
+                                             {kIPv6Class, "vif1"},
+                                             {kIPv4Class, "vif2"},
+                                             {kIPv6Class, "vif2"}}));
     EXPECT_EQ(reply.doneCount(), 1U);
 }
 
@@ -59,29 +59,29 @@ TEST_F(EndpointCollectionFailureTest, VnicListFailureAnswersNothing) {
 }
 
 TEST_F(EndpointCollectionFailureTest, FailedIPv4ReadLeavesTheNicWithoutIPv4Record) {
-    const orv::host::Reply reply = enumerateWith(Json::array({fault("KSI_Get", kIPv4Node, "vmk1")}));
+    const orv::host::Reply reply = enumerateWith(Json::array({fault("KSI_Get", kIPv4Node, "vif1")}));
     EXPECT_EQ(reply.rc(), CMPI_RC_OK);
-    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vmk0"},
-                                             {kIPv6Class, "vmk0"},
-                                             {kIPv6Class, "vmk0"},
-                                             {kIPv6Class, "vmk1"},
-                                             {kIPv4Class, "vmk2"},
-                                             {kIPv6Class, "vmk2"}}));
+    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vif0"},
+                                             {kIPv6Class, "vif0"},
+                                             {kIPv6Class, "vif0"},
+                                             {kIPv6Class, "vif1"},
+                                             {kIPv4Class, "vif2"},
+                                             {kIPv6Class, "vif2"}}));
     EXPECT_EQ(reply.doneCount(), 1U);
 }
 
 TEST_F(EndpointCollectionFailureTest, FailedNetmaskReadEndsTheWalkAndAnswersNothing) {
-    expectSilentEmptyAnswer(Json::array({fault("KSI_Get", kNetmaskNode, "vmk1")}));
+    expectSilentEmptyAnswer(Json::array({fault("KSI_Get", kNetmaskNode, "vif1")}));
 }
 
 TEST_F(EndpointCollectionFailureTest, FailedIPv6ListLeavesTheNicWithoutIPv6Records) {
-    const orv::host::Reply reply = enumerateWith(Json::array({fault("KSI_GetInstanceListAlloc", kIPv6ListNode, "vmk0")}));
+    const orv::host::Reply reply = enumerateWith(Json::array({fault("KSI_GetInstanceListAlloc", kIPv6ListNode, "vif0")}));
     EXPECT_EQ(reply.rc(), CMPI_RC_OK);
-    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vmk0"},
-                                             {kIPv4Class, "vmk1"},
-                                             {kIPv6Class, "vmk1"},
-                                             {kIPv4Class, "vmk2"},
-                                             {kIPv6Class, "vmk2"}}));
+    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vif0"},
+                                             {kIPv4Class, "vif1"},
+                                             {kIPv6Class, "vif1"},
+                                             {kIPv4Class, "vif2"},
+                                             {kIPv6Class, "vif2"}}));
 }
 
 TEST_F(EndpointCollectionFailureTest, FailedSummaryReadEndsTheWalkAndAnswersNothing) {
@@ -89,18 +89,18 @@ TEST_F(EndpointCollectionFailureTest, FailedSummaryReadEndsTheWalkAndAnswersNoth
 }
 
 TEST_F(EndpointCollectionFailureTest, MiddleNicWhoseNameCannotBeAddedIsSkipped) {
-    const orv::host::Reply reply = enumerateWith(Json::array({fault("KSI_ParamListAddString", "", "vmk1")}));
+    const orv::host::Reply reply = enumerateWith(Json::array({fault("KSI_ParamListAddString", "", "vif1")}));
     EXPECT_EQ(reply.rc(), CMPI_RC_OK);
-    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vmk0"},
-                                             {kIPv6Class, "vmk0"},
-                                             {kIPv6Class, "vmk0"},
-                                             {kIPv4Class, "vmk2"},
-                                             {kIPv6Class, "vmk2"}}));
+    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vif0"},
+                                             {kIPv6Class, "vif0"},
+                                             {kIPv6Class, "vif0"},
+                                             {kIPv4Class, "vif2"},
+                                             {kIPv6Class, "vif2"}}));
     EXPECT_EQ(reply.doneCount(), 1U);
 }
 
 TEST_F(EndpointCollectionFailureTest, LastNicWhoseNameCannotBeAddedFailsTheWholeWalk) {
-    expectSilentEmptyAnswer(Json::array({fault("KSI_ParamListAddString", "", "vmk2")}));
+    expectSilentEmptyAnswer(Json::array({fault("KSI_ParamListAddString", "", "vif2")}));
 }
 
 TEST_F(EndpointCollectionFailureTest, ListSlotWithoutNameIsSkipped) {
@@ -108,7 +108,7 @@ TEST_F(EndpointCollectionFailureTest, ListSlotWithoutNameIsSkipped) {
     vnics[1] = std::nullopt;
     serve(hostWith(vnics));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv4Class);
-    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vmk0"}, {kIPv4Class, "vmk2"}}));
+    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vif0"}, {kIPv4Class, "vif2"}}));
 }
 
 TEST_F(EndpointCollectionFailureTest, FailedWalkAnswersInstanceNamesWithNothing) {
@@ -120,8 +120,8 @@ TEST_F(EndpointCollectionFailureTest, FailedWalkAnswersInstanceNamesWithNothing)
 }
 
 TEST_F(EndpointCollectionFailureTest, FailedWalkAnswersGetInstanceWithNothing) {
-    serve(hostWith(threeVnics(), Json::array({fault("KSI_Get", kNetmaskNode, "vmk0")})));
-    const orv::host::Reply reply = provider().getInstance(kIPv4Class, {{"Name", "vmk0"}});
+    serve(hostWith(threeVnics(), Json::array({fault("KSI_Get", kNetmaskNode, "vif0")})));
+    const orv::host::Reply reply = provider().getInstance(kIPv4Class, {{"Name", "vif0"}});
     EXPECT_EQ(reply.rc(), CMPI_RC_OK);
     EXPECT_TRUE(reply.items().empty());
     EXPECT_EQ(reply.doneCount(), 0U);
@@ -130,8 +130,8 @@ TEST_F(EndpointCollectionFailureTest, FailedWalkAnswersGetInstanceWithNothing) {
 TEST_F(EndpointCollectionFailureTest, HostChangedBetweenRequestsIsReadAfresh) {
     serve(hostWith(threeVnics()));
     EXPECT_EQ(provider().enumerateInstances(kIPv4Class).instances().size(), 3U);
-    serve(hostWith({Vnic{"vmk9", {{"10.9.9.9", "255.0.0.0"}}, {}}}));
-    EXPECT_EQ(endpointsOf(provider().enumerateInstances(kIPv4Class)), (Endpoints{{kIPv4Class, "vmk9"}}));
+    serve(hostWith({Vnic{"vif9", {{"10.9.9.9", "255.0.0.0"}}, {}}}));
+    EXPECT_EQ(endpointsOf(provider().enumerateInstances(kIPv4Class)), (Endpoints{{kIPv4Class, "vif9"}}));
 }
 
 }  // namespace

@@ -23,7 +23,7 @@ TEST_F(EndpointConcurrencyTest, ConcurrentRequestsEachSeeEveryRecordInOrder) {
         threads.emplace_back([this, &expected, &mismatches] {
             for (int i = 0; i < 25; ++i) {
                 const orv::host::Reply all = provider().enumerateInstances(kKernelParent);
-                const orv::host::Reply one = provider().getInstance(kIPv4Class, {{"Name", "vmk2"}});
+                const orv::host::Reply one = provider().getInstance(kIPv4Class, {{"Name", "vif2"}});
                 const std::optional<NamedValue> address =
                     one.instances().size() == 1 ? orv::providertest::propertyOf(one.instances()[0], "IPv4Address")
                                                 : std::nullopt;

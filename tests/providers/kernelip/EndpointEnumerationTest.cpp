@@ -25,24 +25,24 @@ std::vector<std::string> withKeys(const std::vector<std::string>& requested) {
 }
 
 TEST_F(EndpointEnumerationTest, IPv4InstanceCarriesItsPropertiesInOrderWithTypes) {
-    serve(hostWith({Vnic{"vmk0", {{"10.0.0.10", "255.255.255.0"}}, {}}}));
+    serve(hostWith({Vnic{"vif0", {{"10.0.0.10", "255.255.255.0"}}, {}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv4Class);
     ASSERT_EQ(reply.rc(), CMPI_RC_OK) << reply.message();
     ASSERT_EQ(reply.instances().size(), 1U);
-    EXPECT_EQ(propertiesOf(reply.instances()[0]), ipv4Properties(kIPv4Class, "vmk0", "10.0.0.10", "255.255.255.0"));
+    EXPECT_EQ(propertiesOf(reply.instances()[0]), ipv4Properties(kIPv4Class, "vif0", "10.0.0.10", "255.255.255.0"));
     EXPECT_EQ(orv::providertest::classNameOf(reply.instances()[0]), kIPv4Class);
 }
 
 TEST_F(EndpointEnumerationTest, IPv6InstanceCarriesItsPropertiesInOrderWithTypes) {
-    serve(hostWith({Vnic{"vmk3", std::nullopt, {{"2001:db8:0:1::42", 64}}}}));
+    serve(hostWith({Vnic{"vif3", std::nullopt, {{"2001:db8:0:1::42", 64}}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv6Class);
     ASSERT_EQ(reply.rc(), CMPI_RC_OK) << reply.message();
     ASSERT_EQ(reply.instances().size(), 1U);
-    EXPECT_EQ(propertiesOf(reply.instances()[0]), ipv6Properties(kIPv6Class, "vmk3", "2001:db8:0:1::42", 64));
+    EXPECT_EQ(propertiesOf(reply.instances()[0]), ipv6Properties(kIPv6Class, "vif3", "2001:db8:0:1::42", 64));
 }
 
 TEST_F(EndpointEnumerationTest, PrefixLengthKeepsItsLowEightBits) {
-    serve(hostWith({Vnic{"vmk0", std::nullopt, {{"fd00::1", 300}}}}));
+    serve(hostWith({Vnic{"vif0", std::nullopt, {{"fd00::1", 300}}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv6Class);
     ASSERT_EQ(reply.instances().size(), 1U);
     EXPECT_EQ(orv::providertest::propertyOf(reply.instances()[0], "PrefixLength"),
@@ -50,54 +50,54 @@ TEST_F(EndpointEnumerationTest, PrefixLengthKeepsItsLowEightBits) {
 }
 
 TEST_F(EndpointEnumerationTest, AddressZeroIsRenderedByInetNtoaAndReportsEnabledButOffline) {
-    serve(hostWith({Vnic{"vmk0", {{"0.0.0.0", "0.0.0.0"}}, {}}}));
+    serve(hostWith({Vnic{"vif0", {{"0.0.0.0", "0.0.0.0"}}, {}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv4Class);
     ASSERT_EQ(reply.instances().size(), 1U);
-    std::vector<NamedValue> expected = ipv4Properties(kIPv4Class, "vmk0", "0.0.0.0", "0.0.0.0");
+    std::vector<NamedValue> expected = ipv4Properties(kIPv4Class, "vif0", "0.0.0.0", "0.0.0.0");
     expected.push_back({"EnabledState", CMPI_uint16, "6"});
     EXPECT_EQ(propertiesOf(reply.instances()[0]), expected);
 }
 
 TEST_F(EndpointEnumerationTest, NonZeroAddressWithZeroNetmaskHasNoEnabledState) {
-    serve(hostWith({Vnic{"vmk0", {{"10.1.1.1", "0.0.0.0"}}, {}}}));
+    serve(hostWith({Vnic{"vif0", {{"10.1.1.1", "0.0.0.0"}}, {}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv4Class);
     ASSERT_EQ(reply.instances().size(), 1U);
     EXPECT_EQ(orv::providertest::propertyOf(reply.instances()[0], "EnabledState"), std::nullopt);
 }
 
 TEST_F(EndpointEnumerationTest, TwoIPv6AddressesYieldTwoInstancesWithTheSameName) {
-    serve(hostWith({Vnic{"vmk1", std::nullopt, {{"fe80::1", 64}, {"fd00::2", 56}}}}));
+    serve(hostWith({Vnic{"vif1", std::nullopt, {{"fe80::1", 64}, {"fd00::2", 56}}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv6Class);
     ASSERT_EQ(reply.instances().size(), 2U);
-    EXPECT_EQ(propertiesOf(reply.instances()[0]), ipv6Properties(kIPv6Class, "vmk1", "fe80::1", 64));
-    EXPECT_EQ(propertiesOf(reply.instances()[1]), ipv6Properties(kIPv6Class, "vmk1", "fd00::2", 56));
+    EXPECT_EQ(propertiesOf(reply.instances()[0]), ipv6Properties(kIPv6Class, "vif1", "fe80::1", 64));
+    EXPECT_EQ(propertiesOf(reply.instances()[1]), ipv6Properties(kIPv6Class, "vif1", "fd00::2", 56));
 }
 
 TEST_F(EndpointEnumerationTest, KernelParentReturnsEveryRecordInKernelOrderUnderItsFamilyClass) {
-    serve(hostWith({Vnic{"vmk0", {{"10.0.0.1", "255.0.0.0"}}, {{"fe80::1", 64}, {"fd00::1", 64}}},
-                    Vnic{"vmk1", std::nullopt, {{"fe80::2", 64}}},
-                    Vnic{"vmk2", {{"10.0.0.2", "255.0.0.0"}}, {}}}));
+    serve(hostWith({Vnic{"vif0", {{"10.0.0.1", "255.0.0.0"}}, {{"fe80::1", 64}, {"fd00::1", 64}}},
+                    Vnic{"vif1", std::nullopt, {{"fe80::2", 64}}},
+                    Vnic{"vif2", {{"10.0.0.2", "255.0.0.0"}}, {}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kKernelParent);
     ASSERT_EQ(reply.rc(), CMPI_RC_OK) << reply.message();
-    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vmk0"},
-                                             {kIPv6Class, "vmk0"},
-                                             {kIPv6Class, "vmk0"},
-                                             {kIPv6Class, "vmk1"},
-                                             {kIPv4Class, "vmk2"}}));
+    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vif0"},
+                                             {kIPv6Class, "vif0"},
+                                             {kIPv6Class, "vif0"},
+                                             {kIPv6Class, "vif1"},
+                                             {kIPv4Class, "vif2"}}));
     EXPECT_EQ(reply.doneCount(), 1U);
 }
 
 TEST_F(EndpointEnumerationTest, IPv4ClassReturnsOnlyIPv4Records) {
     serve(hostWith(threeVnics()));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv4Class);
-    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vmk0"}, {kIPv4Class, "vmk1"}, {kIPv4Class, "vmk2"}}));
+    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vif0"}, {kIPv4Class, "vif1"}, {kIPv4Class, "vif2"}}));
 }
 
 TEST_F(EndpointEnumerationTest, IPv6ClassReturnsOnlyIPv6Records) {
     serve(hostWith(threeVnics()));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv6Class);
     EXPECT_EQ(endpointsOf(reply),
-              (Endpoints{{kIPv6Class, "vmk0"}, {kIPv6Class, "vmk0"}, {kIPv6Class, "vmk1"}, {kIPv6Class, "vmk2"}}));
+              (Endpoints{{kIPv6Class, "vif0"}, {kIPv6Class, "vif0"}, {kIPv6Class, "vif1"}, {kIPv6Class, "vif2"}}));
 }
 
 TEST_F(EndpointEnumerationTest, CimParentReturnsBothFamilyClassesNeverTheParent) {
@@ -111,7 +111,7 @@ TEST_F(EndpointEnumerationTest, CimParentReturnsBothFamilyClassesNeverTheParent)
 TEST_F(EndpointEnumerationTest, ClassNamesAreComparedIgnoringCase) {
     serve(hostWith(threeVnics()));
     const orv::host::Reply reply = provider().enumerateInstances("ORVANE_kernelipv4protocolendpoint");
-    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vmk0"}, {kIPv4Class, "vmk1"}, {kIPv4Class, "vmk2"}}));
+    EXPECT_EQ(endpointsOf(reply), (Endpoints{{kIPv4Class, "vif0"}, {kIPv4Class, "vif1"}, {kIPv4Class, "vif2"}}));
 }
 
 TEST_F(EndpointEnumerationTest, InterfaceNameLongerThan150CharactersIsCutTo150) {
@@ -134,7 +134,7 @@ TEST_F(EndpointEnumerationTest, HostWithoutVnicsAnswersOkWithoutReturnDone) {
 }
 
 TEST_F(EndpointEnumerationTest, VnicsWithoutAddressesAnswerOkWithoutReturnDone) {
-    serve(hostWith({Vnic{"vmk0", std::nullopt, {}}, Vnic{"vmk1", std::nullopt, {}}}));
+    serve(hostWith({Vnic{"vif0", std::nullopt, {}}, Vnic{"vif1", std::nullopt, {}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kKernelParent);
     EXPECT_EQ(reply.rc(), CMPI_RC_OK);
     EXPECT_TRUE(reply.items().empty());
@@ -142,7 +142,7 @@ TEST_F(EndpointEnumerationTest, VnicsWithoutAddressesAnswerOkWithoutReturnDone) 
 }
 
 TEST_F(EndpointEnumerationTest, FamilyWithoutRecordsStillEndsWithReturnDone) {
-    serve(hostWith({Vnic{"vmk0", {{"10.0.0.1", "255.0.0.0"}}, {}}}));
+    serve(hostWith({Vnic{"vif0", {{"10.0.0.1", "255.0.0.0"}}, {}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv6Class);
     EXPECT_EQ(reply.rc(), CMPI_RC_OK);
     EXPECT_TRUE(reply.items().empty());
@@ -150,7 +150,7 @@ TEST_F(EndpointEnumerationTest, FamilyWithoutRecordsStillEndsWithReturnDone) {
 }
 
 TEST_F(EndpointEnumerationTest, InstanceNamesCarryTheFourKeysOfEachRecord) {
-    serve(hostWith({Vnic{"vmk0", {{"10.0.0.1", "255.0.0.0"}}, {{"fe80::1", 64}}}}));
+    serve(hostWith({Vnic{"vif0", {{"10.0.0.1", "255.0.0.0"}}, {{"fe80::1", 64}}}}));
     const orv::host::Reply reply = provider().enumerateInstanceNames(kKernelParent);
     ASSERT_EQ(reply.rc(), CMPI_RC_OK) << reply.message();
     ASSERT_EQ(reply.objectPaths().size(), 2U);
@@ -164,14 +164,14 @@ TEST_F(EndpointEnumerationTest, InstanceNamesCarryTheFourKeysOfEachRecord) {
         std::vector<NamedValue> keys = orv::providertest::keysOf(path);
         std::sort(keys.begin(), keys.end(), [](const NamedValue& a, const NamedValue& b) { return a.name < b.name; });
         EXPECT_EQ(keys, (std::vector<NamedValue>{{"CreationClassName", CMPI_string, classes[i]},
-                                                 {"Name", CMPI_string, "vmk0"},
+                                                 {"Name", CMPI_string, "vif0"},
                                                  {"SystemCreationClassName", CMPI_string, "OMC_UnitaryComputerSystem"},
                                                  {"SystemName", CMPI_string, orv::providertest::SimHost::kFqdn}}));
     }
 }
 
 TEST_F(EndpointEnumerationTest, PropertyListKeepsOnlyTheRequestedProperties) {
-    serve(hostWith({Vnic{"vmk0", {{"0.0.0.0", "255.0.0.0"}}, {{"fe80::1", 64}}}}));
+    serve(hostWith({Vnic{"vif0", {{"0.0.0.0", "255.0.0.0"}}, {{"fe80::1", 64}}}}));
     const orv::host::Reply reply = provider().enumerateInstances(
         kKernelParent, std::vector<std::string>{"ipv4address", "PrefixLength", "EnabledState"});
     ASSERT_EQ(reply.instances().size(), 2U);
@@ -180,7 +180,7 @@ TEST_F(EndpointEnumerationTest, PropertyListKeepsOnlyTheRequestedProperties) {
 }
 
 TEST_F(EndpointEnumerationTest, EmptyPropertyListKeepsNoProperty) {
-    serve(hostWith({Vnic{"vmk0", {{"10.0.0.1", "255.0.0.0"}}, {}}}));
+    serve(hostWith({Vnic{"vif0", {{"10.0.0.1", "255.0.0.0"}}, {}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv4Class, std::vector<std::string>{});
     ASSERT_EQ(reply.instances().size(), 1U);
     EXPECT_EQ(propertyNamesOf(reply.instances()[0]), withKeys({}));

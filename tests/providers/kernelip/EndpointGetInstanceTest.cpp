@@ -31,24 +31,24 @@ protected:
 };
 
 TEST_F(EndpointGetInstanceTest, IPv4ClassFindsTheInterfaceByName) {
-    const orv::host::Reply reply = provider().getInstance(kIPv4Class, keysFor(kIPv4Class, "vmk1"));
+    const orv::host::Reply reply = provider().getInstance(kIPv4Class, keysFor(kIPv4Class, "vif1"));
     const CMPIInstance* instance = single(reply);
     ASSERT_NE(instance, nullptr);
-    EXPECT_EQ(propertiesOf(instance), ipv4Properties(kIPv4Class, "vmk1", "10.0.1.10", "255.255.0.0"));
+    EXPECT_EQ(propertiesOf(instance), ipv4Properties(kIPv4Class, "vif1", "10.0.1.10", "255.255.0.0"));
     EXPECT_EQ(orv::providertest::classNameOf(instance), kIPv4Class);
 }
 
 TEST_F(EndpointGetInstanceTest, IPv6ClassOfIPv6OnlyInterfaceAnswersItsFirstAddress) {
-    serve(hostWith({Vnic{"vmk5", std::nullopt, {{"fd05::1", 64}, {"fd05::2", 80}}}}));
-    const orv::host::Reply reply = provider().getInstance(kIPv6Class, keysFor(kIPv6Class, "vmk5"));
+    serve(hostWith({Vnic{"vif5", std::nullopt, {{"fd05::1", 64}, {"fd05::2", 80}}}}));
+    const orv::host::Reply reply = provider().getInstance(kIPv6Class, keysFor(kIPv6Class, "vif5"));
     const CMPIInstance* instance = single(reply);
     ASSERT_NE(instance, nullptr);
-    EXPECT_EQ(propertiesOf(instance), ipv6Properties(kIPv6Class, "vmk5", "fd05::1", 64));
+    EXPECT_EQ(propertiesOf(instance), ipv6Properties(kIPv6Class, "vif5", "fd05::1", 64));
 }
 
 TEST_F(EndpointGetInstanceTest, SecondIPv6AddressOfAnInterfaceIsNeverReached) {
-    serve(hostWith({Vnic{"vmk5", std::nullopt, {{"fd05::1", 64}, {"fd05::2", 80}}}}));
-    const orv::host::Reply reply = provider().getInstance(kIPv6Class, keysFor(kIPv6Class, "vmk5"));
+    serve(hostWith({Vnic{"vif5", std::nullopt, {{"fd05::1", 64}, {"fd05::2", 80}}}}));
+    const orv::host::Reply reply = provider().getInstance(kIPv6Class, keysFor(kIPv6Class, "vif5"));
     const CMPIInstance* instance = single(reply);
     ASSERT_NE(instance, nullptr);
     EXPECT_EQ(orv::providertest::propertyOf(instance, "IPv6Address"),
@@ -56,23 +56,23 @@ TEST_F(EndpointGetInstanceTest, SecondIPv6AddressOfAnInterfaceIsNeverReached) {
 }
 
 TEST_F(EndpointGetInstanceTest, IPv6ClassOfInterfaceWithIPv4AnswersFromItsIPv4Record) {
-    const orv::host::Reply reply = provider().getInstance(kIPv6Class, keysFor(kIPv6Class, "vmk0"));
+    const orv::host::Reply reply = provider().getInstance(kIPv6Class, keysFor(kIPv6Class, "vif0"));
     const CMPIInstance* instance = single(reply);
     ASSERT_NE(instance, nullptr);
-    EXPECT_EQ(propertiesOf(instance), ipv4Properties(kIPv6Class, "vmk0", "10.0.0.10", "255.255.255.0"));
+    EXPECT_EQ(propertiesOf(instance), ipv4Properties(kIPv6Class, "vif0", "10.0.0.10", "255.255.255.0"));
     EXPECT_EQ(orv::providertest::classNameOf(instance), kIPv6Class);
 }
 
 TEST_F(EndpointGetInstanceTest, IPv4ClassOfIPv6OnlyInterfaceAnswersFromItsFirstIPv6Record) {
-    serve(hostWith({Vnic{"vmk5", std::nullopt, {{"fd05::1", 64}, {"fd05::2", 80}}}}));
-    const orv::host::Reply reply = provider().getInstance(kIPv4Class, keysFor(kIPv4Class, "vmk5"));
+    serve(hostWith({Vnic{"vif5", std::nullopt, {{"fd05::1", 64}, {"fd05::2", 80}}}}));
+    const orv::host::Reply reply = provider().getInstance(kIPv4Class, keysFor(kIPv4Class, "vif5"));
     const CMPIInstance* instance = single(reply);
     ASSERT_NE(instance, nullptr);
-    EXPECT_EQ(propertiesOf(instance), ipv6Properties(kIPv4Class, "vmk5", "fd05::1", 64));
+    EXPECT_EQ(propertiesOf(instance), ipv6Properties(kIPv4Class, "vif5", "fd05::1", 64));
 }
 
 TEST_F(EndpointGetInstanceTest, ClassNameIsComparedIgnoringCaseAndAnsweredInItsOwnSpelling) {
-    const orv::host::Reply reply = provider().getInstance("orvane_KERNELipv4protocolendpoint", {{"Name", "vmk2"}});
+    const orv::host::Reply reply = provider().getInstance("orvane_KERNELipv4protocolendpoint", {{"Name", "vif2"}});
     const CMPIInstance* instance = single(reply);
     ASSERT_NE(instance, nullptr);
     EXPECT_EQ(orv::providertest::classNameOf(instance), kIPv4Class);
@@ -81,7 +81,7 @@ TEST_F(EndpointGetInstanceTest, ClassNameIsComparedIgnoringCaseAndAnsweredInItsO
 }
 
 TEST_F(EndpointGetInstanceTest, UnknownNameIsNotFoundWithoutMessage) {
-    const orv::host::Reply reply = provider().getInstance(kIPv4Class, keysFor(kIPv4Class, "vmk7"));
+    const orv::host::Reply reply = provider().getInstance(kIPv4Class, keysFor(kIPv4Class, "vif7"));
     EXPECT_EQ(reply.rc(), CMPI_RC_ERR_NOT_FOUND);
     EXPECT_EQ(reply.message(), "");
     EXPECT_TRUE(reply.items().empty());
@@ -89,17 +89,17 @@ TEST_F(EndpointGetInstanceTest, UnknownNameIsNotFoundWithoutMessage) {
 }
 
 TEST_F(EndpointGetInstanceTest, NameIsComparedExactly) {
-    EXPECT_EQ(provider().getInstance(kIPv4Class, {{"Name", "VMK0"}}).rc(), CMPI_RC_ERR_NOT_FOUND);
-    EXPECT_EQ(provider().getInstance(kIPv4Class, {{"Name", "vmk"}}).rc(), CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_EQ(provider().getInstance(kIPv4Class, {{"Name", "VIF0"}}).rc(), CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_EQ(provider().getInstance(kIPv4Class, {{"Name", "vif"}}).rc(), CMPI_RC_ERR_NOT_FOUND);
 }
 
 TEST_F(EndpointGetInstanceTest, OtherKeysOfTheRequestAreNotExamined) {
     const orv::host::Reply reply = provider().getInstance(
         kIPv4Class, {{"SystemCreationClassName", "Other_System"}, {"SystemName", "elsewhere"},
-                     {"CreationClassName", "Other_Class"}, {"Name", "vmk1"}});
+                     {"CreationClassName", "Other_Class"}, {"Name", "vif1"}});
     const CMPIInstance* instance = single(reply);
     ASSERT_NE(instance, nullptr);
-    EXPECT_EQ(propertiesOf(instance), ipv4Properties(kIPv4Class, "vmk1", "10.0.1.10", "255.255.0.0"));
+    EXPECT_EQ(propertiesOf(instance), ipv4Properties(kIPv4Class, "vif1", "10.0.1.10", "255.255.0.0"));
 }
 
 TEST_F(EndpointGetInstanceTest, NameLongerThan150CharactersMatchesOnItsFirst150) {
@@ -113,7 +113,7 @@ TEST_F(EndpointGetInstanceTest, NameLongerThan150CharactersMatchesOnItsFirst150)
 }
 
 TEST_F(EndpointGetInstanceTest, KernelParentIsNotLookedUpByKey) {
-    const orv::host::Reply reply = provider().getInstance(kKernelParent, keysFor(kKernelParent, "vmk0"));
+    const orv::host::Reply reply = provider().getInstance(kKernelParent, keysFor(kKernelParent, "vif0"));
     EXPECT_EQ(reply.rc(), CMPI_RC_OK);
     EXPECT_TRUE(reply.items().empty());
     EXPECT_EQ(reply.doneCount(), 0U);
@@ -121,10 +121,10 @@ TEST_F(EndpointGetInstanceTest, KernelParentIsNotLookedUpByKey) {
 
 TEST_F(EndpointGetInstanceTest, PropertyListKeepsOnlyTheRequestedProperties) {
     const orv::host::Reply reply =
-        provider().getInstance(kIPv4Class, keysFor(kIPv4Class, "vmk0"), std::vector<std::string>{"SubnetMask"});
+        provider().getInstance(kIPv4Class, keysFor(kIPv4Class, "vif0"), std::vector<std::string>{"SubnetMask"});
     const CMPIInstance* instance = single(reply);
     ASSERT_NE(instance, nullptr);
-    std::vector<NamedValue> expected = commonProperties(kIPv4Class, "vmk0", 4096);
+    std::vector<NamedValue> expected = commonProperties(kIPv4Class, "vif0", 4096);
     expected.erase(expected.begin() + 4, expected.end());  // the keys stay for the path
     expected.push_back({"SubnetMask", CMPI_string, "255.255.255.0"});
     EXPECT_EQ(propertiesOf(instance), expected);
@@ -132,7 +132,7 @@ TEST_F(EndpointGetInstanceTest, PropertyListKeepsOnlyTheRequestedProperties) {
 
 TEST_F(EndpointGetInstanceTest, HostWithoutRecordsAnswersOkWithNothing) {
     serve(hostWith({}));
-    const orv::host::Reply reply = provider().getInstance(kIPv4Class, keysFor(kIPv4Class, "vmk0"));
+    const orv::host::Reply reply = provider().getInstance(kIPv4Class, keysFor(kIPv4Class, "vif0"));
     EXPECT_EQ(reply.rc(), CMPI_RC_OK);
     EXPECT_TRUE(reply.items().empty());
     EXPECT_EQ(reply.doneCount(), 0U);

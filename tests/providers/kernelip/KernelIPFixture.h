@@ -46,9 +46,9 @@ Json fault(const std::string& call, const std::string& node = {}, const std::str
 // A host whose default stack lists `vnics` (std::nullopt: an empty slot).
 Json hostWith(const std::vector<std::optional<Vnic>>& vnics, const Json& faults = Json::array());
 
-// vmk0: 10.0.0.10/255.255.255.0, fe80::1/64, fd00::10/48
-// vmk1: 10.0.1.10/255.255.0.0, fd01::10/64
-// vmk2: 192.168.5.7/255.255.255.128, fd02::7/112
+// vif0: 10.0.0.10/255.255.255.0, fe80::1/64, fd00::10/48
+// vif1: 10.0.1.10/255.255.0.0, fd01::10/64
+// vif2: 192.168.5.7/255.255.255.128, fd02::7/112
 std::vector<std::optional<Vnic>> threeVnics();
 
 // The properties every instance of a record begins with.

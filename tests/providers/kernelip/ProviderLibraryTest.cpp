@@ -133,7 +133,7 @@ TEST(ProviderLibraryTest, InstanceFactoryCalledTwiceSharesOneProviderObjectAndTr
 class ProviderLoadTest : public KernelIPTest {};
 
 TEST_F(ProviderLoadTest, MofAndRegistrationLoadIntoTheBrokerCoreWhichServesTheProvider) {
-    serve(hostWith({Vnic{"vmk0", {{"10.0.0.1", "255.0.0.0"}}, {}}}));
+    serve(hostWith({Vnic{"vif0", {{"10.0.0.1", "255.0.0.0"}}, {}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv4Class);
     EXPECT_EQ(reply.rc(), CMPI_RC_OK) << reply.message();
     EXPECT_EQ(reply.providerCalls(), 1U);

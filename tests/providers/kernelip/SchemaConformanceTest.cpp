@@ -29,7 +29,7 @@ class SchemaConformanceTest : public KernelIPTest {
 protected:
     // One instance of each family, the IPv4 one with EnabledState set.
     std::vector<std::pair<std::string, std::vector<NamedValue>>> returnedInstances() {
-        serve(hostWith({Vnic{"vmk0", {{"0.0.0.0", "255.0.0.0"}}, {{"fe80::1", 64}}}}));
+        serve(hostWith({Vnic{"vif0", {{"0.0.0.0", "255.0.0.0"}}, {{"fe80::1", 64}}}}));
         const orv::host::Reply reply = provider().enumerateInstances(kKernelParent);
         std::vector<std::pair<std::string, std::vector<NamedValue>>> instances;
         for (const CMPIInstance* instance : reply.instances()) {

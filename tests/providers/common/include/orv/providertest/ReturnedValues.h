@@ -3,7 +3,7 @@
 // instances and paths.
 //
 //   EXPECT_EQ(propertiesOf(reply.instances()[0]),
-//             (std::vector<NamedValue>{{"Name", CMPI_string, "vmk0"}, ...}));
+//             (std::vector<NamedValue>{{"Name", CMPI_string, "vif0"}, ...}));
 #pragma once
 
 #include <cmpidt.h>
