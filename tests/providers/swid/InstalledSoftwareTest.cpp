@@ -108,7 +108,7 @@ TEST_F(InstalledSoftwareTest, InstancesCarryBothReferences) {
 }
 
 TEST_F(InstalledSoftwareTest, EnumerationWithoutSoftwareIdentitiesAnswersOkWithoutDone) {
-    const std::filesystem::path file = std::filesystem::temp_directory_path() / "orv-swid-assoc-only.reg";
+    const std::filesystem::path file = scratchFile("orv-swid-assoc-only.reg");
     orv::providertest::writeRegistrationFile(
         file, {{kAssociationClass, "OrvaneInstalledSoftwareIdentity", "instance association"}});
     restartCore({.projectRegistrations = false, .registrations = {file}});

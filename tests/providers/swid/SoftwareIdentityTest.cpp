@@ -34,7 +34,7 @@ protected:
 
     // A core where requests for CIM_SoftwareIdentity reach this provider.
     void routeParentClassToTheProvider() {
-        const std::filesystem::path file = std::filesystem::temp_directory_path() / "orv-swid-parent.reg";
+        const std::filesystem::path file = scratchFile("orv-swid-parent.reg");
         orv::providertest::writeRegistrationFile(file, {{"CIM_SoftwareIdentity", "HypervisorSoftwareIdentity"}});
         restartCore({.projectRegistrations = false, .registrations = {file}});
         std::filesystem::remove(file);

@@ -35,6 +35,10 @@ std::vector<NamedValue> identityProperties(const std::string& instanceId, const 
 
 }  // namespace
 
+std::filesystem::path scratchFile(const std::string& name) {
+    return std::filesystem::temp_directory_path() / (name + "-" + std::to_string(::getpid()));
+}
+
 Json versionSection(const VersionRecord& record) {
     return {{"product", record.product},           {"productVersion", record.productVersion},
             {"buildVersion", record.buildVersion}, {"buildDate", record.buildDate},

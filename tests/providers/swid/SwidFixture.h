@@ -37,6 +37,9 @@ struct VersionRecord {
 };
 
 // The version section of a record.
+// A file name in the temporary folder that no other test process uses.
+std::filesystem::path scratchFile(const std::string& name);
+
 Json versionSection(const VersionRecord& record = {});
 // The version section of a service that fails with code 77, errno 16, "Device busy".
 Json failingVersionSection();
