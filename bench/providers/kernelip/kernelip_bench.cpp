@@ -7,7 +7,7 @@
 //                                       callgrind collecting only around it:
 //     valgrind --tool=callgrind --collect-atstart=no kernelip_bench --callgrind-once 16
 #include <benchmark/benchmark.h>
-#include <valgrind/callgrind.h>
+#include "orv/bench/Callgrind.h"
 
 #include <cstdio>
 #include <cstdlib>
@@ -68,11 +68,7 @@ int callgrindOnce(unsigned vnics) {
     orv::providertest::SimHost host;
     serveHost(host, vnics);
     orv::providertest::ProviderCore provider;
-    enumerate(provider);
-    CALLGRIND_ZERO_STATS;
-    CALLGRIND_TOGGLE_COLLECT;
-    const std::size_t instances = enumerate(provider);
-    CALLGRIND_TOGGLE_COLLECT;
+    const std::size_t instances = orv::bench::collectSecondRun([&] { return enumerate(provider); });
     std::printf("instances %zu\n", instances);
     return instances == vnics * 4U ? 0 : 1;
 }

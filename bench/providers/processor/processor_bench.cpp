@@ -9,7 +9,7 @@
 //                                            around it:
 //     valgrind --tool=callgrind --collect-atstart=no processor_bench --callgrind-once 8
 #include <benchmark/benchmark.h>
-#include <valgrind/callgrind.h>
+#include "orv/bench/Callgrind.h"
 
 #include <cstdio>
 #include <cstdlib>
@@ -101,11 +101,7 @@ int callgrindOnce(unsigned packages) {
     orv::providertest::SimHost host;
     serveHost(host, packages);
     orv::providertest::ProviderCore provider;
-    enumerate(provider);
-    CALLGRIND_ZERO_STATS;
-    CALLGRIND_TOGGLE_COLLECT;
-    const std::size_t instances = enumerate(provider);
-    CALLGRIND_TOGGLE_COLLECT;
+    const std::size_t instances = orv::bench::collectSecondRun([&] { return enumerate(provider); });
     std::printf("instances %zu\n", instances);
     return instances == packages ? 0 : 1;
 }
