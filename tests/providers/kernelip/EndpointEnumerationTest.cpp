@@ -41,6 +41,20 @@ TEST_F(EndpointEnumerationTest, IPv6InstanceCarriesItsPropertiesInOrderWithTypes
     EXPECT_EQ(propertiesOf(reply.instances()[0]), ipv6Properties(kIPv6Class, "vif3", "2001:db8:0:1::42", 64));
 }
 
+// The host's name is not cached between requests: renaming the host shows in
+// the very next answer.
+TEST_F(EndpointEnumerationTest, SystemNameIsAskedAfreshOnEveryRequest) {
+    Json host = hostWith({Vnic{"vif0", {{"10.0.0.10", "255.255.255.0"}}, {}}});
+    for (const char* fqdn : {"first.lab.example.com", "second.lab.example.com"}) {
+        host["host"]["fqdn"] = fqdn;
+        serve(host);
+        const orv::host::Reply reply = provider().enumerateInstances(kIPv4Class);
+        ASSERT_EQ(reply.instances().size(), 1U);
+        EXPECT_EQ(orv::providertest::propertyOf(reply.instances()[0], "SystemName"),
+                  (NamedValue{"SystemName", CMPI_string, fqdn}));
+    }
+}
+
 TEST_F(EndpointEnumerationTest, PrefixLengthKeepsItsLowEightBits) {
     serve(hostWith({Vnic{"vif0", std::nullopt, {{"fd00::1", 300}}}}));
     const orv::host::Reply reply = provider().enumerateInstances(kIPv6Class);
