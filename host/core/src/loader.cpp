@@ -3,7 +3,6 @@
 #include <dlfcn.h>
 #include <sys/stat.h>
 
-#include <set>
 #include <utility>
 
 #include "context.hpp"
@@ -227,13 +226,17 @@ void ProviderLoader::shutdown() {
             callDisableIndications(found->second.mi);
         }
     }
-    std::set<std::pair<std::string, ProviderKind>> cleaned;
+    // Every provider's every MI, as sfcb cleans up a provider in a process of
+    // its own. (Where sfcb runs several providers of one library in one
+    // process, it calls each kind's cleanup only once per library, then ends
+    // the process without unloading anything.) This host unloads the libraries
+    // next, so a provider that is not cleaned up could leave a thread running
+    // in unloaded code.
     for (const std::string& name : order_) {
         auto& entry = providers_[name];
         for (ProviderKind kind : kKinds) {
             auto found = entry->mis.find(kind);
-            if (found != entry->mis.end() && found->second.mi != nullptr &&
-                cleaned.emplace(entry->location, kind).second) {
+            if (found != entry->mis.end() && found->second.mi != nullptr) {
                 callCleanup(found->second.mi, kind, true);
             }
         }

@@ -63,7 +63,7 @@ public:
 
     // cleanup(terminating = false) on every idle provider library; see BrokerCore.
     unsigned unloadIdle();
-    // disableIndications, cleanup(true) once per library and kind, dlclose.
+    // disableIndications, cleanup(true) on every provider and kind, dlclose.
     void shutdown();
     std::vector<std::string> loadedLibraries() const;
 

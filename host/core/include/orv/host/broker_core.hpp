@@ -203,7 +203,7 @@ public:
     unsigned unloadIdleProviders();
 
     // disableIndications on indication MIs, then cleanup(terminating = true)
-    // once per library and MI kind, then unloads the libraries. Idempotent;
+    // on every MI of every provider, then unloads the libraries. Idempotent;
     // requests after shutdown answer CMPI_RC_ERR_FAILED.
     void shutdown();
 
