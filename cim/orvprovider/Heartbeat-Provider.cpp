@@ -44,7 +44,8 @@ constexpr CMPIUint64 kMicrosecondsPerSecond = 1000000;
 // and join here: the library must not be unloaded under a running thread.
 bool threadJoinable = false;
 
-// What the starter hands the thread: malloc'ed, freed by the thread on entry.
+// What the starter hands the thread (two pointers: 8 bytes on a 32-bit build),
+// malloc'ed, freed by the thread on entry.
 struct StartRecord {
     const CMPIBroker* broker;
     CMPIContext* context;  // from prepareAttachThread, released by the thread at its end
@@ -84,6 +85,7 @@ void sendHeartbeat(CmpiBroker& broker, const CmpiContext& context, CmpiInstance&
 // exception other than a failed delivery unlocks and leaves the loop.
 void beat(CmpiBroker& broker, const CmpiContext& context, CmpiInstance& heartbeat) {
     OMC::MutexLock lock(heartbeatMutex);
+    // Set under the mutex: initialize and cleanup read it under the mutex.
     threadStarted = true;
     for (CMPIUint32 counter = 0; !shuttingDown; ++counter) {
         sendHeartbeat(broker, context, heartbeat, counter);
@@ -159,11 +161,12 @@ public:
         }
         OMC::MutexLock lock(heartbeatMutex);
         shuttingDown = true;
-        if (threadStarted || threadJoinable) {
+        if (threadJoinable) {  // covers threadStarted, and a thread not yet running
             heartbeatCond.notifyAll();
+            const pthread_t running = thread;
             threadJoinable = false;
             lock.release();  // the thread needs the mutex to leave its wait
-            pthread_join(thread, nullptr);
+            pthread_join(running, nullptr);
             lock.lock();
         }
         return CmpiStatus(CMPI_RC_OK);
