@@ -19,6 +19,10 @@ DirectProvider::DirectProvider(const CMPIBroker* core, HeartbeatLog& log, std::s
     : log_(log), failing_(std::move(failing)) {
     table_ = *core->bft;
     table_.deliverIndication = &DirectProvider::deliver;
+    table_.prepareAttachThread = &DirectProvider::prepare;
+    contextTable_.ftVersion = CMPICurrentVersion;
+    contextTable_.release = &DirectProvider::releaseContext;
+    threadContext_.ft = &contextTable_;
     broker_ = *core;
     broker_.bft = &table_;
     current = this;
@@ -50,6 +54,17 @@ CMPIIndicationMI* DirectProvider::create() {
 CMPIStatus DirectProvider::cleanup(bool terminating) {
     terminated_ = terminated_ || terminating;
     return mi_->ft->cleanup(mi_, nullptr, terminating ? 1 : 0);
+}
+
+bool DirectProvider::threadFinished() const { return contextReleased_.load(); }
+
+CMPIContext* DirectProvider::prepare(const CMPIBroker* /*mb*/, const CMPIContext* /*ctx*/) {
+    return &current->threadContext_;
+}
+
+CMPIStatus DirectProvider::releaseContext(CMPIContext* /*ctx*/) {
+    current->contextReleased_.store(true);
+    return CMPIStatus{CMPI_RC_OK, nullptr};
 }
 
 CMPIStatus DirectProvider::deliver(const CMPIBroker* /*mb*/, const CMPIContext* /*ctx*/, const char* ns,

@@ -6,6 +6,7 @@
 
 #include <cstdlib>
 #include <fstream>
+#include <thread>
 #include <utility>
 
 #include "orv/providertest/ReturnedValues.h"
@@ -90,6 +91,28 @@ std::size_t threadCount() {
     return count;
 }
 
+bool threadCountSettlesAt(std::size_t count, std::chrono::milliseconds timeout) {
+    const auto end = std::chrono::steady_clock::now() + timeout;
+    while (threadCount() != count) {
+        if (std::chrono::steady_clock::now() >= end) {
+            return false;
+        }
+        std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    }
+    return true;
+}
+
+namespace {
+
+// Sanitizer runtimes start a helper thread of their own along with the first
+// thread the process creates: let that happen before threads are counted.
+std::size_t threadsAfterWarmUp() {
+    std::thread([] {}).join();
+    return threadCount();
+}
+
+}  // namespace
+
 ConfigRoot::ConfigRoot()
     : root_(std::filesystem::temp_directory_path() / ("orv-heartbeat-root-" + std::to_string(::getpid()))) {
     std::filesystem::remove_all(root_);
@@ -111,7 +134,7 @@ void ConfigRoot::writeConfig(const std::string& content) const {
 }
 
 HeartbeatTest::HeartbeatTest()
-    : threadsBefore_(threadCount()), provider_(std::make_unique<orv::providertest::ProviderCore>()) {
+    : threadsBefore_(threadsAfterWarmUp()), provider_(std::make_unique<orv::providertest::ProviderCore>()) {
     subscriber_ = core().addIndicationSubscriber([this](std::string_view ns, const CMPIInstance* indication) {
         heartbeats_.add(readHeartbeat(std::string(ns).c_str(), indication));
     });

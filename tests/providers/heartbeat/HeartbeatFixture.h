@@ -62,6 +62,9 @@ std::string hostName();
 
 // Threads of this process now.
 std::size_t threadCount();
+// Waits up to `timeout` for the process to have `count` threads (a joined
+// thread may stay listed for a moment while the kernel finishes it).
+bool threadCountSettlesAt(std::size_t count, std::chrono::milliseconds timeout = std::chrono::seconds(2));
 
 // A root folder of this process's own, with ORV_ROOT pointing at it; removed
 // with the object.
