@@ -30,11 +30,6 @@ protected:
     orv::testsupport::SyslogCapture syslog_;
 };
 
-SyslogLine belowMinimum(int value) {
-    return {LOG_WARNING, "heartbeat_interval (" + std::to_string(value) +
-                             ") is below minimum value (30), using the default."};
-}
-
 TEST_F(ConfigTest, DefaultIntervalIsFiveMinutes) { EXPECT_EQ(Heartbeat::theHEARTBEAT_INTERVAL, 300); }
 
 TEST_F(ConfigTest, ValueAfterAnEqualsSignSetsTheInterval) {
@@ -54,7 +49,7 @@ TEST_F(ConfigTest, CommentedKeyLineEndsTheReadingAndKeepsTheDefault) {
 
 TEST_F(ConfigTest, ValueBelowTheMinimumIsRefusedWithAWarning) {
     EXPECT_EQ(load("heartbeatInterval: 29\n"), 300);
-    EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{belowMinimum(29)});
+    EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{belowMinimumLine(29)});
 }
 
 TEST_F(ConfigTest, MinimumValueIsAccepted) {
@@ -64,7 +59,7 @@ TEST_F(ConfigTest, MinimumValueIsAccepted) {
 
 TEST_F(ConfigTest, DigitsFollowedByAUnitAreReadUpToTheUnit) {
     EXPECT_EQ(load("heartbeatInterval: 1h\n"), 300);
-    EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{belowMinimum(1)});
+    EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{belowMinimumLine(1)});
 }
 
 TEST_F(ConfigTest, ValueWithoutDigitsChangesNothingAndLogsNothing) {
@@ -75,15 +70,13 @@ TEST_F(ConfigTest, ValueWithoutDigitsChangesNothingAndLogsNothing) {
 TEST_F(ConfigTest, MissingFileLogsAnErrorWithTheCurrentInterval) {
     Heartbeat::LoadHeartBeatConfig();
     EXPECT_EQ(Heartbeat::theHEARTBEAT_INTERVAL, 300);
-    EXPECT_EQ(syslog_.lines(), (std::vector<SyslogLine>{{LOG_ERR, "Open file to read: " + root_.configPath().string() +
-                                                                      " failed, using default: 300 seconds"}}));
+    EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{openFailureLine(root_.configPath(), 300)});
 }
 
 TEST_F(ConfigTest, MissingFileMessageNamesTheIntervalInForce) {
     Heartbeat::theHEARTBEAT_INTERVAL = 45;
     Heartbeat::LoadHeartBeatConfig();
-    EXPECT_EQ(syslog_.lines(), (std::vector<SyslogLine>{{LOG_ERR, "Open file to read: " + root_.configPath().string() +
-                                                                      " failed, using default: 45 seconds"}}));
+    EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{openFailureLine(root_.configPath(), 45)});
 }
 
 TEST_F(ConfigTest, FileWithoutTheKeyKeepsTheIntervalSilently) {
@@ -108,7 +101,7 @@ TEST_F(ConfigTest, CarriageReturnEndsTheDigitRun) { EXPECT_EQ(load("heartbeatInt
 
 TEST_F(ConfigTest, DigitRunTooLongForAnIntIsLoggedAsMinusOne) {
     EXPECT_EQ(load("heartbeatInterval: 99999999999\n"), 300);
-    EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{belowMinimum(-1)});
+    EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{belowMinimumLine(-1)});
 }
 
 TEST_F(ConfigTest, LeadingZerosAreDecimal) { EXPECT_EQ(load("heartbeatInterval: 0090\n"), 90); }

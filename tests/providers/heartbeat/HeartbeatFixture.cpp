@@ -1,5 +1,6 @@
 #include "HeartbeatFixture.h"
 
+#include <syslog.h>
 #include <unistd.h>
 
 #include <cmpift.h>
@@ -54,6 +55,16 @@ std::size_t HeartbeatLog::size() const {
 bool HeartbeatLog::waitFor(std::size_t count, std::chrono::milliseconds timeout) const {
     std::unique_lock lock(mutex_);
     return arrived_.wait_for(lock, timeout, [&] { return heartbeats_.size() >= count; });
+}
+
+orv::testsupport::SyslogLine openFailureLine(const std::filesystem::path& config, int seconds) {
+    return {LOG_ERR, "Open file to read: " + config.string() + " failed, using default: " + std::to_string(seconds) +
+                         " seconds"};
+}
+
+orv::testsupport::SyslogLine belowMinimumLine(int value) {
+    return {LOG_WARNING,
+            "heartbeat_interval (" + std::to_string(value) + ") is below minimum value (30), using the default."};
 }
 
 ReceivedHeartbeat readHeartbeat(const char* ns, const CMPIInstance* indication) {

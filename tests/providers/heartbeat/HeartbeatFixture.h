@@ -27,6 +27,9 @@ namespace heartbeat {
 
 inline constexpr const char* kClassName = "Orvane_CIMHeartbeat";
 inline constexpr const char* kQuery = "SELECT * FROM Orvane_CIMHeartbeat";
+// How long a heartbeat due at once may take to arrive on a loaded machine.
+inline constexpr std::chrono::seconds kAtOnce{10};
+inline constexpr std::uint64_t kMicrosecondsPerSecond = 1000000;
 
 // One delivered heartbeat, read while it was being delivered.
 struct ReceivedHeartbeat {
@@ -53,6 +56,10 @@ private:
     mutable std::condition_variable arrived_;
     std::vector<ReceivedHeartbeat> heartbeats_;
 };
+
+// The system-log lines of the configuration reader.
+orv::testsupport::SyslogLine openFailureLine(const std::filesystem::path& config, int seconds);
+orv::testsupport::SyslogLine belowMinimumLine(int value);
 
 // What the instance handed to deliverIndication holds.
 ReceivedHeartbeat readHeartbeat(const char* ns, const CMPIInstance* indication);

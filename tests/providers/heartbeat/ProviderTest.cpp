@@ -16,10 +16,8 @@ namespace {
 using namespace std::chrono_literals;
 using orv::testsupport::SyslogLine;
 
-constexpr auto kAtOnce = 10s;
 // Long enough for a stray heartbeat to show up, far below the 30 s minimum.
 constexpr auto kQuietPeriod = 300ms;
-constexpr std::uint64_t kMicrosecondsPerSecond = 1000000;
 
 std::uint64_t nowSeconds() { return static_cast<std::uint64_t>(std::time(nullptr)); }
 
@@ -77,16 +75,14 @@ TEST_F(HeartbeatProviderTest, FilterCallsNeitherStartNorStopHeartbeats) {
 TEST_F(HeartbeatProviderTest, ProviderStartWithoutConfigurationLogsTheDefault) {
     start();
     ASSERT_TRUE(heartbeats_.waitFor(1, kAtOnce));
-    EXPECT_EQ(syslog_.lines(), (std::vector<SyslogLine>{{LOG_ERR, "Open file to read: " + root_.configPath().string() +
-                                                                      " failed, using default: 300 seconds"}}));
+    EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{openFailureLine(root_.configPath(), 300)});
 }
 
 TEST_F(HeartbeatProviderTest, ProviderStartWithTooShortIntervalWarns) {
     root_.writeConfig("heartbeatInterval: 29\n");
     start();
     ASSERT_TRUE(heartbeats_.waitFor(1, kAtOnce));
-    EXPECT_EQ(syslog_.lines(),
-              (std::vector<SyslogLine>{{LOG_WARNING, "heartbeat_interval (29) is below minimum value (30), using the default."}}));
+    EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{belowMinimumLine(29)});
 }
 
 TEST_F(HeartbeatProviderTest, ShutdownStopsTheThreadBeforeTheLibraryIsUnloaded) {

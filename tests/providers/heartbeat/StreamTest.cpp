@@ -13,9 +13,8 @@ namespace {
 using namespace std::chrono_literals;
 using orv::testsupport::SyslogLine;
 
-constexpr auto kAtOnce = 10s;
 constexpr auto kIntervalAndMargin = 45s;
-constexpr std::uint64_t kIntervalMicroseconds = 30 * 1000000ULL;
+constexpr std::uint64_t kIntervalMicroseconds = 30 * kMicrosecondsPerSecond;
 
 class HeartbeatStreamTest : public HeartbeatTest {
 protected:
