@@ -141,7 +141,8 @@ void* heartBeatThread(void* arg) {
 
 class HeartbeatProvider : public CmpiIndicationMI {
 public:
-    HeartbeatProvider(const CmpiBroker& mbp, const CmpiContext& ctx) : CmpiBaseMI(mbp, ctx), CmpiIndicationMI(mbp, ctx) {}
+    HeartbeatProvider(const CmpiBroker& mbp, const CmpiContext& ctx)
+        : CmpiBaseMI(mbp, ctx), CmpiIndicationMI(mbp, ctx) {}
 
     CmpiStatus initialize(const CmpiContext& ctx) override {
         LoadHeartBeatConfig();

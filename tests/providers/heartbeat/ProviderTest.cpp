@@ -60,12 +60,12 @@ TEST_F(HeartbeatProviderTest, FilterCallsNeitherStartNorStopHeartbeats) {
     startConfigured();
     ASSERT_TRUE(heartbeats_.waitFor(1, kAtOnce));
     const std::size_t running = threadCount();
-    EXPECT_EQ(core().activateFilter("root/cimv2", "SELECT * FROM Orvane_CIMHeartbeat WHERE stamp > 5").rc(), CMPI_RC_OK);
+    const char* const narrower = "SELECT * FROM Orvane_CIMHeartbeat WHERE stamp > 5";
+    EXPECT_EQ(core().activateFilter("root/cimv2", narrower).rc(), CMPI_RC_OK);
     EXPECT_EQ(core().enableIndications("root/cimv2", kClassName).rc(), CMPI_RC_OK);
     EXPECT_EQ(core().deactivateFilter("root/cimv2", kQuery).rc(), CMPI_RC_OK);
     EXPECT_EQ(core().disableIndications("root/cimv2", kClassName).rc(), CMPI_RC_OK);
-    EXPECT_EQ(core().deactivateFilter("root/cimv2", "SELECT * FROM Orvane_CIMHeartbeat WHERE stamp > 5").rc(),
-              CMPI_RC_OK);
+    EXPECT_EQ(core().deactivateFilter("root/cimv2", narrower).rc(), CMPI_RC_OK);
     std::this_thread::sleep_for(kQuietPeriod);
     EXPECT_EQ(heartbeats_.size(), 1u) << "no heartbeat restarted or added";
     EXPECT_EQ(threadCount(), running) << "the heartbeat thread still runs, no other started";
