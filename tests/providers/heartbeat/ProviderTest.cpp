@@ -7,6 +7,8 @@
 #include <ctime>
 #include <thread>
 
+#include <orv/testsupport/StderrCapture.h>
+
 #include "DirectProvider.h"
 #include "HeartbeatFixture.h"
 
@@ -131,6 +133,26 @@ TEST_F(HeartbeatProviderTest, CleanupRacingTheFirstDeliveryWaitsForItAndStopsThe
     core().removeIndicationSubscriber(blocker);
     EXPECT_EQ(heartbeats_.size(), 1u);
     EXPECT_TRUE(threadCountSettlesAt(threadsBefore_)) << "the heartbeat thread has ended";
+}
+
+TEST_F(HeartbeatProviderTest, FactoryHandsOutTheIndicationTableWithoutATraceLine) {
+    root_.writeConfig("heartbeatInterval: 30\n");
+    DirectProvider direct(core().broker(), heartbeats_);
+    orv::testsupport::StderrCapture stderrCapture;
+    CMPIIndicationMI* mi = direct.create();
+    EXPECT_EQ(stderrCapture.finish(), "");
+    ASSERT_NE(mi, nullptr);
+    EXPECT_STREQ(mi->ft->miName, "indicationOrvane_CIMHeartbeat");
+    EXPECT_EQ(mi->ft->ftVersion, 200);
+    EXPECT_EQ(mi->ft->miVersion, 200);
+    EXPECT_NE(mi->ft->disableIndications, nullptr);
+    EXPECT_EQ(direct.create(), mi) << "the same record and provider on a second call";
+    EXPECT_TRUE(heartbeats_.waitFor(1, kAtOnce));
+    EXPECT_EQ(direct.cleanup(true).rc, CMPI_RC_OK) << "one use of two given back";
+    EXPECT_FALSE(direct.threadFinished());
+    EXPECT_EQ(direct.cleanup(true).rc, CMPI_RC_OK);
+    EXPECT_TRUE(direct.threadFinished());
+    EXPECT_EQ(heartbeats_.size(), 1u) << "initialize ran once: one thread";
 }
 
 TEST_F(HeartbeatProviderTest, TerminatingCleanupReturnsOnlyAfterTheThreadHasEnded) {
