@@ -104,20 +104,23 @@ void releaseContext(const CmpiContext& context) {
     }
 }
 
+[[noreturn]] void failToStart() {
+    syslog(LOG_ERR, "%s", kStartFailure);
+    throw CmpiStatus(CMPI_RC_ERR_FAILED, kStartFailure);
+}
+
 // Starts the thread; heartbeatMutex is held by the caller.
 void startThread(CmpiBroker& broker, const CmpiContext& ctx) {
     auto* record = static_cast<StartRecord*>(std::malloc(sizeof(StartRecord)));
     if (record == nullptr) {
-        syslog(LOG_ERR, "%s", kStartFailure);
-        throw CmpiStatus(CMPI_RC_ERR_FAILED, kStartFailure);
+        failToStart();
     }
     record->broker = broker.getEnc();
     record->context = broker.prepareAttachThread(ctx).getEnc();
     if (pthread_create(&thread, nullptr, heartBeatThread, record) != 0) {
         releaseContext(CmpiContext(record->context));
         std::free(record);
-        syslog(LOG_ERR, "%s", kStartFailure);
-        throw CmpiStatus(CMPI_RC_ERR_FAILED, kStartFailure);
+        failToStart();
     }
     threadJoinable = true;
 }
