@@ -76,20 +76,35 @@ void IndicationRecorder::clear() {
     delivered_.clear();
 }
 
-std::vector<NamedValue> ipv6Endpoint(const std::string& ifname, const std::string& address, unsigned prefixLength) {
-    std::vector<NamedValue> properties = kernelip::commonProperties(kernelip::kIPv6Class, ifname, 4097);
-    properties.push_back({"IPv6ddress", CMPI_string, address});
-    properties.push_back({"PrefixLength", CMPI_uint8, std::to_string(prefixLength)});
+namespace {
+
+std::vector<NamedValue> onSystem(std::vector<NamedValue> properties, const std::string& systemName) {
+    for (NamedValue& value : properties) {
+        if (value.name == "SystemName") {
+            value.text = systemName;
+        }
+    }
     return properties;
 }
 
-std::vector<NamedValue> ipv4Endpoint(const std::string& ifname, const std::string& address, const std::string& netmask) {
-    return kernelip::ipv4Properties(kernelip::kIPv4Class, ifname, address, netmask);
+}  // namespace
+
+std::vector<NamedValue> ipv6Endpoint(const std::string& ifname, const std::string& address, unsigned prefixLength,
+                                     const std::string& systemName) {
+    std::vector<NamedValue> properties = kernelip::commonProperties(kernelip::kIPv6Class, ifname, 4097);
+    properties.push_back({"IPv6ddress", CMPI_string, address});
+    properties.push_back({"PrefixLength", CMPI_uint8, std::to_string(prefixLength)});
+    return onSystem(properties, systemName);
 }
 
-std::string modelPath(const std::string& endpointClass, const std::string& ifname) {
+std::vector<NamedValue> ipv4Endpoint(const std::string& ifname, const std::string& address, const std::string& netmask,
+                                     const std::string& systemName) {
+    return onSystem(kernelip::ipv4Properties(kernelip::kIPv4Class, ifname, address, netmask), systemName);
+}
+
+std::string modelPath(const std::string& endpointClass, const std::string& ifname, const std::string& systemName) {
     return "root/cimv2:" + endpointClass + ".SystemCreationClassName=\"OMC_UnitaryComputerSystem\",SystemName=\"" +
-           orv::providertest::SimHost::kFqdn + "\",CreationClassName=\"" + endpointClass + "\",Name=\"" + ifname + "\"";
+           systemName + "\",CreationClassName=\"" + endpointClass + "\",Name=\"" + ifname + "\"";
 }
 
 namespace {
@@ -121,7 +136,8 @@ void expectIndication(const Delivered& delivered, const std::string& ifname,
                                         {"PerceivedSeverity", CMPI_uint16, "3"},
                                         {"SourceInstance", CMPI_instance, sourceClass},
                                         {"PreviousInstance", CMPI_instance, previousClass},
-                                        {"SourceInstanceModelPath", CMPI_string, modelPath(sourceClass, ifname)},
+                                        {"SourceInstanceModelPath", CMPI_string,
+                                         modelPath(sourceClass, ifname, endpointValue(source, "SystemName"))},
                                         {"SourceInstanceHost", CMPI_string, newAddress},
                                     }));
     EXPECT_EQ(delivered.sourceInstance, source);
@@ -140,16 +156,22 @@ Json injectedEntry(const std::string& nic, const Json& family) {
     return {{"call", "getifaddrs"}, {"nic", nic}, {"family", family}};
 }
 
-IpIndicationTest::IpIndicationTest()
+DetectorHarness::DetectorHarness()
     : recorder_(std::make_unique<IndicationRecorder>(provider_.core())),
       brokerHolder_(std::make_unique<CmpiBaseMI>(CmpiBroker(provider_.broker()), CmpiContext(nullptr))),
       broker_(provider_.broker()),
       context_(nullptr) {
-    serve(std::vector<Vnic>{});
     // The platform library of this process chose its substitute when it was
-    // loaded; the simulated host has been set up since.
+    // loaded, before the test set the environment.
     orv::platform::reselectBackend();
     brokerHolder_->setProviderBase(nullptr);
+}
+
+DetectorHarness::~DetectorHarness() = default;
+
+IpIndicationTest::IpIndicationTest() {
+    serve(std::vector<Vnic>{});
+    harness_ = std::make_unique<DetectorHarness>();
 }
 
 IpIndicationTest::~IpIndicationTest() = default;

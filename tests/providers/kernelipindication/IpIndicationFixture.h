@@ -61,12 +61,16 @@ private:
     std::vector<Delivered> delivered_;
 };
 
-// The endpoint properties of an IPv6 record (the address under IPv6ddress).
-std::vector<NamedValue> ipv6Endpoint(const std::string& ifname, const std::string& address, unsigned prefixLength);
-std::vector<NamedValue> ipv4Endpoint(const std::string& ifname, const std::string& address, const std::string& netmask);
+// The endpoint properties of an IPv6 record (the address under IPv6ddress)
+// and of an IPv4 record, on the host named `systemName`.
+std::vector<NamedValue> ipv6Endpoint(const std::string& ifname, const std::string& address, unsigned prefixLength,
+                                     const std::string& systemName = orv::providertest::SimHost::kFqdn);
+std::vector<NamedValue> ipv4Endpoint(const std::string& ifname, const std::string& address, const std::string& netmask,
+                                     const std::string& systemName = orv::providertest::SimHost::kFqdn);
 
-// The model path of the endpoint of class `endpointClass` on `ifname` of the simulated host.
-std::string modelPath(const std::string& endpointClass, const std::string& ifname);
+// The model path of the endpoint of class `endpointClass` on `ifname`.
+std::string modelPath(const std::string& endpointClass, const std::string& ifname,
+                      const std::string& systemName = orv::providertest::SimHost::kFqdn);
 
 // Checks one delivered indication of a replacement on `ifname`: every property
 // in order, both embedded endpoints, and a time taken between `from` and `to`.
@@ -79,14 +83,14 @@ Json hostWith(const std::vector<Vnic>& vnics, const Json& faults = Json::array()
 // A getifaddrs rule adding an entry for `nic` of `family` (null: no address).
 Json injectedEntry(const std::string& nic, const Json& family);
 
-class IpIndicationTest : public ::testing::Test {
-protected:
-    IpIndicationTest();
-    ~IpIndicationTest() override;
-
-    // Writes the host the detector reads on its next refresh.
-    void serve(const Json& fixture) { host_.write(fixture); }
-    void serve(const std::vector<Vnic>& vnics) { serve(hostWith(vnics)); }
+// A detector with the broker core it builds its objects with and delivers to,
+// on the platform substitute the environment names (chosen again here).
+class DetectorHarness {
+public:
+    DetectorHarness();
+    ~DetectorHarness();
+    DetectorHarness(const DetectorHarness&) = delete;
+    DetectorHarness& operator=(const DetectorHarness&) = delete;
 
     void testAndSend() { detector_.testAndSend(context_, &broker_); }
 
@@ -96,11 +100,7 @@ protected:
     IndicationRecorder& recorder() { return *recorder_; }
     orv::providertest::ProviderCore& core() { return provider_; }
 
-    // Records of the entries of the simulated host's current list, in order.
-    std::vector<ORV::KernelIpIndication::AddressPtr> recordsOf(const Json& fixture);
-
 private:
-    orv::providertest::SimHost host_;  // before the core: it selects the platform
     orv::providertest::ProviderCore provider_;
     std::unique_ptr<IndicationRecorder> recorder_;
     // Makes the core's broker the one the binding's object constructors use.
@@ -108,6 +108,31 @@ private:
     CmpiBroker broker_;
     CmpiContext context_;
     ORV::KernelIpIndication detector_;
+};
+
+class IpIndicationTest : public ::testing::Test {
+protected:
+    IpIndicationTest();
+    ~IpIndicationTest() override;
+
+    // Writes the host the detector reads on its next refresh.
+    void serve(const Json& fixture) { host_.write(fixture); }
+    void serve(const std::vector<Vnic>& vnics) { serve(hostWith(vnics)); }
+
+    void testAndSend() { harness_->testAndSend(); }
+
+    ORV::KernelIpIndication& detector() { return harness_->detector(); }
+    CmpiBroker& broker() { return harness_->broker(); }
+    CmpiContext& context() { return harness_->context(); }
+    IndicationRecorder& recorder() { return harness_->recorder(); }
+    orv::providertest::ProviderCore& core() { return harness_->core(); }
+
+    // Records of the entries of the simulated host's current list, in order.
+    std::vector<ORV::KernelIpIndication::AddressPtr> recordsOf(const Json& fixture);
+
+private:
+    orv::providertest::SimHost host_;  // before the harness: it selects the platform
+    std::unique_ptr<DetectorHarness> harness_;
 };
 
 }  // namespace ipindication
