@@ -66,6 +66,17 @@ CmpiInstance newEndpointInstance(const IAddress& record, const CmpiContext& cont
     return instance;
 }
 
+// Equality of `self` with `other`: false for null or another concrete class,
+// true for the same record, else what `sameValue` says of the peer.
+template <typename Record, typename SameValue>
+bool equalRecords(const Record* self, const IAddress* other, SameValue sameValue) {
+    const Record* peer = dynamic_cast<const Record*>(other);
+    if (peer == nullptr) {
+        return false;
+    }
+    return peer == self || sameValue(*peer);
+}
+
 }  // namespace
 
 IAddress::~IAddress() = default;
@@ -89,14 +100,9 @@ CmpiInstance IPv4Address::buildInterfaceObject(CmpiContext const& context, CmpiB
 }
 
 bool IPv4Address::isEqual(IAddress const* other) const {
-    const IPv4Address* peer = dynamic_cast<const IPv4Address*>(other);
-    if (peer == nullptr) {
-        return false;
-    }
-    if (peer == this) {
-        return true;
-    }
-    return std::strcmp(_addr, peer->_addr) == 0 && std::strcmp(_netmask, peer->_netmask) == 0;
+    return equalRecords(this, other, [this](const IPv4Address& peer) {
+        return std::strcmp(_addr, peer._addr) == 0 && std::strcmp(_netmask, peer._netmask) == 0;
+    });
 }
 
 std::string IPv4Address::getAddress() const { return _addr; }
@@ -159,15 +165,9 @@ CmpiInstance IPv6Address::buildInterfaceObject(CmpiContext const& context, CmpiB
     return instance;
 }
 
+// The prefix length is not compared.
 bool IPv6Address::isEqual(IAddress const* other) const {
-    const IPv6Address* peer = dynamic_cast<const IPv6Address*>(other);
-    if (peer == nullptr) {
-        return false;
-    }
-    if (peer == this) {
-        return true;
-    }
-    return std::strcmp(_addr, peer->_addr) == 0;
+    return equalRecords(this, other, [this](const IPv6Address& peer) { return std::strcmp(_addr, peer._addr) == 0; });
 }
 
 std::string IPv6Address::getAddress() const { return _addr; }
