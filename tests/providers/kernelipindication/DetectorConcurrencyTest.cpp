@@ -8,7 +8,7 @@
 namespace ipindication {
 namespace {
 
-using ConcurrencyTest = IpIndicationTest;
+using DetectorConcurrencyTest = IpIndicationTest;
 
 std::vector<Vnic> hostNumber(int round) {
     const std::string last = std::to_string(5 + round % 2);
@@ -16,7 +16,7 @@ std::vector<Vnic> hostNumber(int round) {
             Vnic{"vif1", {{"10.0.1.5", "255.255.255.0"}}, {}}};
 }
 
-TEST_F(ConcurrencyTest, TestAndSendRacesEnableAndDisableSafely) {
+TEST_F(DetectorConcurrencyTest, TestAndSendRacesEnableAndDisableSafely) {
     constexpr int kRounds = 40;
     serve(hostNumber(0));
     std::atomic<bool> done{false};

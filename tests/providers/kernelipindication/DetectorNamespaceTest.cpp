@@ -29,7 +29,7 @@ const std::string kInner = "i15a";
 const std::string kPeer = "i15b";
 const std::string kExtra = "i15c";
 
-class NamespaceTest : public ::testing::Test {
+class DetectorNamespaceTest : public ::testing::Test {
 protected:
     void SetUp() override {
         static std::atomic<unsigned> counter{0};
@@ -120,7 +120,7 @@ protected:
     std::time_t to_ = 0;
 };
 
-TEST_F(NamespaceTest, ReplacedIpv4AddressIsReported) {
+TEST_F(DetectorNamespaceTest, ReplacedIpv4AddressIsReported) {
     ASSERT_TRUE(inside("ip addr add 10.151.0.2/24 dev " + kInner));
     enable();
     ASSERT_TRUE(inside("ip addr del 10.151.0.2/24 dev " + kInner));
@@ -132,7 +132,7 @@ TEST_F(NamespaceTest, ReplacedIpv4AddressIsReported) {
     EXPECT_EQ(testAndSend().size(), 0U);
 }
 
-TEST_F(NamespaceTest, ReplacedIpv6AddressIsReported) {
+TEST_F(DetectorNamespaceTest, ReplacedIpv6AddressIsReported) {
     ASSERT_TRUE(inside("ip -6 addr add fd15::2/64 dev " + kInner + " nodad"));
     enable();
     ASSERT_TRUE(inside("ip -6 addr del fd15::2/64 dev " + kInner));
@@ -142,7 +142,7 @@ TEST_F(NamespaceTest, ReplacedIpv6AddressIsReported) {
     expectIndication(delivered[0], kInner, ipv6("fd15::2", 64), ipv6("fd15::3", 64), from_, to_);
 }
 
-TEST_F(NamespaceTest, AddingASecondAddressGivesNoIndication) {
+TEST_F(DetectorNamespaceTest, AddingASecondAddressGivesNoIndication) {
     ASSERT_TRUE(inside("ip addr add 10.151.0.2/24 dev " + kInner));
     ASSERT_TRUE(inside("ip -6 addr add fd15::2/64 dev " + kInner + " nodad"));
     enable();
@@ -151,7 +151,7 @@ TEST_F(NamespaceTest, AddingASecondAddressGivesNoIndication) {
     EXPECT_EQ(testAndSend().size(), 0U);
 }
 
-TEST_F(NamespaceTest, RemovingAnAddressGivesNoIndication) {
+TEST_F(DetectorNamespaceTest, RemovingAnAddressGivesNoIndication) {
     ASSERT_TRUE(inside("ip addr add 10.151.0.2/24 dev " + kInner));
     ASSERT_TRUE(inside("ip addr add 10.152.0.2/24 dev " + kInner));
     ASSERT_TRUE(inside("ip -6 addr add fd15::2/64 dev " + kInner + " nodad"));
@@ -161,7 +161,7 @@ TEST_F(NamespaceTest, RemovingAnAddressGivesNoIndication) {
     EXPECT_EQ(testAndSend().size(), 0U);
 }
 
-TEST_F(NamespaceTest, NetmaskChangeAloneIsReported) {
+TEST_F(DetectorNamespaceTest, NetmaskChangeAloneIsReported) {
     ASSERT_TRUE(inside("ip addr add 10.151.0.2/24 dev " + kInner));
     enable();
     ASSERT_TRUE(inside("ip addr del 10.151.0.2/24 dev " + kInner));
@@ -172,7 +172,7 @@ TEST_F(NamespaceTest, NetmaskChangeAloneIsReported) {
                      from_, to_);
 }
 
-TEST_F(NamespaceTest, BringingUpANewInterfaceGivesNoIndication) {
+TEST_F(DetectorNamespaceTest, BringingUpANewInterfaceGivesNoIndication) {
     ASSERT_TRUE(inside("ip addr add 10.151.0.2/24 dev " + kInner));
     enable();
     ASSERT_TRUE(inside("ip link add " + kExtra + " type veth peer name " + kExtra + "p"));
