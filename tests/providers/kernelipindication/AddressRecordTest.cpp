@@ -38,9 +38,9 @@ int prefixOf(const char* netmask, uint32_t maskScope = 0) {
     return record.getPrefixLength();
 }
 
-using AddressRecordTest = IpIndicationTest;
+using IpAddressRecordTest = IpIndicationTest;
 
-TEST_F(AddressRecordTest, Ipv4NetmaskChangeMakesRecordsOfTheSameAddressUnequal) {
+TEST_F(IpAddressRecordTest, Ipv4NetmaskChangeMakesRecordsOfTheSameAddressUnequal) {
     const std::vector<AddressPtr> narrow = recordsOf(hostWith({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}}}));
     const std::vector<AddressPtr> wide = recordsOf(hostWith({Vnic{"vif0", {{"10.0.0.5", "255.255.0.0"}}, {}}}));
     const std::vector<AddressPtr> again = recordsOf(hostWith({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}}}));
@@ -55,7 +55,7 @@ TEST_F(AddressRecordTest, Ipv4NetmaskChangeMakesRecordsOfTheSameAddressUnequal) 
     EXPECT_FALSE(narrow[0]->isEqual(nullptr));
 }
 
-TEST_F(AddressRecordTest, Ipv6ContiguousMaskGivesItsPrefixAndANonContiguousOneGivesZero) {
+TEST_F(IpAddressRecordTest, Ipv6ContiguousMaskGivesItsPrefixAndANonContiguousOneGivesZero) {
     EXPECT_EQ(prefixOf("ffff:ffff:ffff:ffff::"), 64);
     EXPECT_EQ(prefixOf("ff00:ff00::"), 0);
     EXPECT_EQ(prefixOf("ffff:ffff:ffff:ffff:ffff:ffff:ffff:ffff"), 128);
@@ -69,7 +69,7 @@ TEST_F(AddressRecordTest, Ipv6ContiguousMaskGivesItsPrefixAndANonContiguousOneGi
     EXPECT_EQ(orv::providertest::propertiesOf(instance.getEnc()), ipv6Endpoint("vif0", "fd00::1", 64));
 }
 
-TEST_F(AddressRecordTest, Ipv6PrefixIgnoresBitZeroButNeedsAZeroMaskScope) {
+TEST_F(IpAddressRecordTest, Ipv6PrefixIgnoresBitZeroButNeedsAZeroMaskScope) {
     // Bit 0 of the first byte that is not all ones is never examined.
     EXPECT_EQ(prefixOf("ffff:ff01::"), 24);
     EXPECT_EQ(prefixOf("ffff:ff03::"), 0);
@@ -77,7 +77,7 @@ TEST_F(AddressRecordTest, Ipv6PrefixIgnoresBitZeroButNeedsAZeroMaskScope) {
     EXPECT_EQ(prefixOf("ffff:ffff:ffff:ffff::", 1), 0);
 }
 
-TEST_F(AddressRecordTest, GetPrefixCountsOverTheGivenLength) {
+TEST_F(IpAddressRecordTest, GetPrefixCountsOverTheGivenLength) {
     const unsigned char allOnes[4] = {0xFF, 0xFF, 0xFF, 0xFF};
     const unsigned char trailing[4] = {0xFF, 0xF0, 0x00, 0x01};
     EXPECT_EQ(ORV::IPv6Address::getPrefix(allOnes, 0), 0);
@@ -86,7 +86,7 @@ TEST_F(AddressRecordTest, GetPrefixCountsOverTheGivenLength) {
     EXPECT_EQ(ORV::IPv6Address::getPrefix(trailing, 4), 0);
 }
 
-TEST_F(AddressRecordTest, ComparingAnIpv4RecordWithAnIpv6RecordIsFalse) {
+TEST_F(IpAddressRecordTest, ComparingAnIpv4RecordWithAnIpv6RecordIsFalse) {
     const std::vector<AddressPtr> records =
         recordsOf(hostWith({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {{"fd00::5", 64}}}}));
     ASSERT_EQ(records.size(), 2U);
@@ -96,7 +96,7 @@ TEST_F(AddressRecordTest, ComparingAnIpv4RecordWithAnIpv6RecordIsFalse) {
     EXPECT_FALSE(records[1]->isEqual(records[0].get()));
 }
 
-TEST_F(AddressRecordTest, Ipv6EqualityComparesTheAddressTextOnly) {
+TEST_F(IpAddressRecordTest, Ipv6EqualityComparesTheAddressTextOnly) {
     const std::vector<AddressPtr> narrow = recordsOf(hostWith({Vnic{"vif0", std::nullopt, {{"fd00::5", 64}}}}));
     const std::vector<AddressPtr> wide = recordsOf(hostWith({Vnic{"vif0", std::nullopt, {{"fd00::5", 48}}}}));
     ASSERT_EQ(narrow.size(), 1U);
@@ -104,7 +104,7 @@ TEST_F(AddressRecordTest, Ipv6EqualityComparesTheAddressTextOnly) {
     EXPECT_TRUE(narrow[0]->isEqual(wide[0].get()));
 }
 
-TEST_F(AddressRecordTest, Ipv4RecordBuildsItsEndpointInstance) {
+TEST_F(IpAddressRecordTest, Ipv4RecordBuildsItsEndpointInstance) {
     const std::vector<AddressPtr> records = recordsOf(hostWith({Vnic{"vif3", {{"192.168.5.7", "255.255.255.128"}}, {}}}));
     ASSERT_EQ(records.size(), 1U);
     EXPECT_EQ(records[0]->getType(), AF_INET);
@@ -115,7 +115,7 @@ TEST_F(AddressRecordTest, Ipv4RecordBuildsItsEndpointInstance) {
               ipv4Endpoint("vif3", "192.168.5.7", "255.255.255.128"));
 }
 
-TEST_F(AddressRecordTest, UnsupportedFamilyIsRefusedWithItsNumber) {
+TEST_F(IpAddressRecordTest, UnsupportedFamilyIsRefusedWithItsNumber) {
     sockaddr_storage address{};
     address.ss_family = AF_PACKET;
     ifaddrs entry{};

@@ -13,7 +13,7 @@ using orv::testsupport::SyslogLine;
 
 const std::string kRefreshFailure = "Unable to refresh network interface information of the system, Error: ";
 
-class ChangeDetectionTest : public IpIndicationTest {
+class IpChangeDetectionTest : public IpIndicationTest {
 protected:
     // Serves `before`, switches the detector on, serves `after`, then one testAndSend.
     std::vector<Delivered> across(const std::vector<Vnic>& before, const std::vector<Vnic>& after) {
@@ -31,7 +31,7 @@ protected:
     SyslogCapture syslog_;
 };
 
-TEST_F(ChangeDetectionTest, ReplacedIpv4AddressGivesOneIndicationWithTheNewAddressAsSource) {
+TEST_F(IpChangeDetectionTest, ReplacedIpv4AddressGivesOneIndicationWithTheNewAddressAsSource) {
     const std::vector<Delivered> delivered =
         across({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}}}, {Vnic{"vif0", {{"10.0.0.6", "255.255.255.0"}}, {}}});
     ASSERT_EQ(delivered.size(), 1U);
@@ -40,7 +40,7 @@ TEST_F(ChangeDetectionTest, ReplacedIpv4AddressGivesOneIndicationWithTheNewAddre
     EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{});
 }
 
-TEST_F(ChangeDetectionTest, ReplacedIpv6AddressIsReportedUnderIPv6ddress) {
+TEST_F(IpChangeDetectionTest, ReplacedIpv6AddressIsReportedUnderIPv6ddress) {
     const std::vector<Delivered> delivered =
         across({Vnic{"vif1", std::nullopt, {{"fe80::1", 64}, {"fd00::5", 64}}}},
                {Vnic{"vif1", std::nullopt, {{"fe80::1", 64}, {"fd00::6", 56}}}});
@@ -49,21 +49,21 @@ TEST_F(ChangeDetectionTest, ReplacedIpv6AddressIsReportedUnderIPv6ddress) {
                      from_, to_);
 }
 
-TEST_F(ChangeDetectionTest, AddingASecondAddressGivesNoIndication) {
+TEST_F(IpChangeDetectionTest, AddingASecondAddressGivesNoIndication) {
     EXPECT_EQ(across({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {{"fd00::5", 64}}}},
                      {Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {{"fd00::5", 64}, {"fd00::6", 64}}}})
                   .size(),
               0U);
 }
 
-TEST_F(ChangeDetectionTest, RemovingAnAddressGivesNoIndication) {
+TEST_F(IpChangeDetectionTest, RemovingAnAddressGivesNoIndication) {
     EXPECT_EQ(across({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {{"fd00::5", 64}, {"fd00::6", 64}}}},
                      {Vnic{"vif0", std::nullopt, {{"fd00::6", 64}}}})
                   .size(),
               0U);
 }
 
-TEST_F(ChangeDetectionTest, BringingUpANewInterfaceGivesNoIndication) {
+TEST_F(IpChangeDetectionTest, BringingUpANewInterfaceGivesNoIndication) {
     EXPECT_EQ(across({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}}},
                      {Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}},
                       Vnic{"vif1", {{"10.0.1.5", "255.255.255.0"}}, {{"fd01::5", 64}}}})
@@ -71,13 +71,13 @@ TEST_F(ChangeDetectionTest, BringingUpANewInterfaceGivesNoIndication) {
               0U);
 }
 
-TEST_F(ChangeDetectionTest, ChangeOfFamilyGivesNoIndication) {
+TEST_F(IpChangeDetectionTest, ChangeOfFamilyGivesNoIndication) {
     EXPECT_EQ(across({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}}}, {Vnic{"vif0", std::nullopt, {{"fd00::5", 64}}}})
                   .size(),
               0U);
 }
 
-TEST_F(ChangeDetectionTest, Ipv4NetmaskChangeAloneCountsAsAReplacement) {
+TEST_F(IpChangeDetectionTest, Ipv4NetmaskChangeAloneCountsAsAReplacement) {
     const std::vector<Delivered> delivered =
         across({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}}}, {Vnic{"vif0", {{"10.0.0.5", "255.255.0.0"}}, {}}});
     ASSERT_EQ(delivered.size(), 1U);
@@ -85,13 +85,13 @@ TEST_F(ChangeDetectionTest, Ipv4NetmaskChangeAloneCountsAsAReplacement) {
                      ipv4Endpoint("vif0", "10.0.0.5", "255.255.0.0"), from_, to_);
 }
 
-TEST_F(ChangeDetectionTest, Ipv6PrefixChangeAloneIsNoReplacement) {
+TEST_F(IpChangeDetectionTest, Ipv6PrefixChangeAloneIsNoReplacement) {
     EXPECT_EQ(across({Vnic{"vif0", std::nullopt, {{"fd00::5", 64}}}}, {Vnic{"vif0", std::nullopt, {{"fd00::5", 48}}}})
                   .size(),
               0U);
 }
 
-TEST_F(ChangeDetectionTest, TestAndSendWhileDisabledDoesNothingNotEvenARefresh) {
+TEST_F(IpChangeDetectionTest, TestAndSendWhileDisabledDoesNothingNotEvenARefresh) {
     serve(hostWith({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}}}, Json::array({{{"call", "getifaddrs"}}})));
     testAndSend();
     EXPECT_EQ(syslog_.lines(), std::vector<SyslogLine>{}) << "a disabled detector read the interface list";
@@ -117,7 +117,7 @@ TEST_F(ChangeDetectionTest, TestAndSendWhileDisabledDoesNothingNotEvenARefresh) 
                      ipv4Endpoint("vif0", "10.0.0.6", "255.255.255.0"), from_, to_);
 }
 
-TEST_F(ChangeDetectionTest, EveryVanishedAddressOfTheFamilyGivesItsOwnIndication) {
+TEST_F(IpChangeDetectionTest, EveryVanishedAddressOfTheFamilyGivesItsOwnIndication) {
     const std::vector<Delivered> delivered =
         across({Vnic{"vif0", std::nullopt, {{"fd00::5", 64}, {"fd00::6", 64}}}},
                {Vnic{"vif0", std::nullopt, {{"fd00::7", 64}}}});
@@ -128,14 +128,14 @@ TEST_F(ChangeDetectionTest, EveryVanishedAddressOfTheFamilyGivesItsOwnIndication
                      from_, to_);
 }
 
-TEST_F(ChangeDetectionTest, AReplacementIsReportedOnceAndNotAgain) {
+TEST_F(IpChangeDetectionTest, AReplacementIsReportedOnceAndNotAgain) {
     across({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}}}, {Vnic{"vif0", {{"10.0.0.6", "255.255.255.0"}}, {}}});
     ASSERT_EQ(recorder().count(), 1U);
     testAndSend();
     EXPECT_EQ(recorder().count(), 1U);
 }
 
-TEST_F(ChangeDetectionTest, UnreadableInterfaceListIsLoggedAndTheSnapshotsKept) {
+TEST_F(IpChangeDetectionTest, UnreadableInterfaceListIsLoggedAndTheSnapshotsKept) {
     serve({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}}});
     detector().enableIndication();
     serve(hostWith({Vnic{"vif0", {{"10.0.0.6", "255.255.255.0"}}, {}}},
@@ -149,7 +149,7 @@ TEST_F(ChangeDetectionTest, UnreadableInterfaceListIsLoggedAndTheSnapshotsKept) 
     EXPECT_EQ(recorder().count(), 1U) << "the previous snapshot still held the old address";
 }
 
-TEST_F(ChangeDetectionTest, PreviousSnapshotIsTakenAfreshFromTheSystemAfterEachTestAndSend) {
+TEST_F(IpChangeDetectionTest, PreviousSnapshotIsTakenAfreshFromTheSystemAfterEachTestAndSend) {
     serve({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}}});
     detector().enableIndication();
     // Counted from this host on: the first read refreshes the current
@@ -168,7 +168,7 @@ TEST_F(ChangeDetectionTest, PreviousSnapshotIsTakenAfreshFromTheSystemAfterEachT
     EXPECT_EQ(recorder().count(), 2U);
 }
 
-TEST_F(ChangeDetectionTest, EntriesWithoutAnAddressOrOfAnotherFamilyAreSkipped) {
+TEST_F(IpChangeDetectionTest, EntriesWithoutAnAddressOrOfAnotherFamilyAreSkipped) {
     const Json injected = Json::array({injectedEntry("vif0", nullptr), injectedEntry("vif0", 17),
                                        injectedEntry("vif0", 99), injectedEntry("vif0", nullptr)});
     serve(hostWith({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {}}}, injected));

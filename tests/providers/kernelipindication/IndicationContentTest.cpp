@@ -49,9 +49,9 @@ private:
     unsigned attempts_ = 0;
 };
 
-using IndicationContentTest = IpIndicationTest;
+using IpChangedIndicationTest = IpIndicationTest;
 
-TEST_F(IndicationContentTest, Ipv4ModelPathNamesTheIpv4ClassTwiceAndTheInterfaceAsName) {
+TEST_F(IpChangedIndicationTest, Ipv4ModelPathNamesTheIpv4ClassTwiceAndTheInterfaceAsName) {
     serve({Vnic{"vmk1", {{"172.16.0.2", "255.255.0.0"}}, {}}});
     detector().enableIndication();
     serve({Vnic{"vmk1", {{"172.16.0.3", "255.255.0.0"}}, {}}});
@@ -66,7 +66,7 @@ TEST_F(IndicationContentTest, Ipv4ModelPathNamesTheIpv4ClassTwiceAndTheInterface
     EXPECT_EQ(delivered[0].properties[6], (NamedValue{"SourceInstanceHost", CMPI_string, "172.16.0.3"}));
 }
 
-TEST_F(IndicationContentTest, ModelPathQuotesTheInterfaceNameWithoutEscaping) {
+TEST_F(IpChangedIndicationTest, ModelPathQuotesTheInterfaceNameWithoutEscaping) {
     const std::string name = "we\"ird\\if";
     serve({Vnic{name, std::nullopt, {{"fd00::1", 64}}}});
     detector().enableIndication();
@@ -83,7 +83,7 @@ TEST_F(IndicationContentTest, ModelPathQuotesTheInterfaceNameWithoutEscaping) {
               "Name=\"we\"ird\\if\"");
 }
 
-TEST_F(IndicationContentTest, IndicationIdentifierIsTheSameForEveryIndicationOfOneInterface) {
+TEST_F(IpChangedIndicationTest, IndicationIdentifierIsTheSameForEveryIndicationOfOneInterface) {
     serve({Vnic{"vif0", {{"10.0.0.5", "255.255.255.0"}}, {{"fd00::5", 64}}},
            Vnic{"vif1", {{"10.0.1.5", "255.255.255.0"}}, {}}});
     detector().enableIndication();
@@ -106,7 +106,7 @@ TEST_F(IndicationContentTest, IndicationIdentifierIsTheSameForEveryIndicationOfO
     EXPECT_EQ(delivered[2].properties[0].text, "Orvane:vif1");
 }
 
-TEST_F(IndicationContentTest, RefusedDeliveryIsLoggedWithItsCodeAndTheNextIndicationIsStillSent) {
+TEST_F(IpChangedIndicationTest, RefusedDeliveryIsLoggedWithItsCodeAndTheNextIndicationIsStillSent) {
     SyslogCapture syslog;
     RefusingBroker refusing(core().broker(), {true, false, true}, CMPI_RC_ERR_FAILED);
     CmpiBroker broker(refusing.broker());
@@ -126,7 +126,7 @@ TEST_F(IndicationContentTest, RefusedDeliveryIsLoggedWithItsCodeAndTheNextIndica
                                                        {LOG_ERR, "Failed to deliver indication 1\n"}}));
 }
 
-TEST_F(IndicationContentTest, RefusalCodeIsLoggedAsItIs) {
+TEST_F(IpChangedIndicationTest, RefusalCodeIsLoggedAsItIs) {
     SyslogCapture syslog;
     RefusingBroker refusing(core().broker(), {true}, CMPI_RC_ERR_NOT_SUPPORTED);
     CmpiBroker broker(refusing.broker());
