@@ -78,6 +78,14 @@ public:
         install(choose());
     }
 
+    void replace(std::unique_ptr<Backend> backend)
+    {
+        std::call_once(first_, [] {});
+        Selection selection;
+        selection.backend = std::move(backend);
+        install(std::move(selection));
+    }
+
     std::string error()
     {
         active();
@@ -121,6 +129,13 @@ Backend& activeBackend()
 void reselectBackend()
 {
     registry().reselect();
+}
+
+void installBackend(std::unique_ptr<Backend> backend)
+{
+    if (backend) {
+        registry().replace(std::move(backend));
+    }
 }
 
 std::string selectionError()

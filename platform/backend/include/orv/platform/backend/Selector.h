@@ -23,6 +23,10 @@ Backend& activeBackend();
 // Must not race with platform calls.
 void reselectBackend();
 
+// Makes `backend` the active substitute, for fuzzers and benchmarks that
+// answer platform calls themselves. Must not race with platform calls.
+void installBackend(std::unique_ptr<Backend> backend);
+
 // Why the current choice failed; empty when a substitute is in use.
 std::string selectionError();
 
