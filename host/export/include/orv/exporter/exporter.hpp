@@ -48,9 +48,12 @@ struct ExporterConfig {
     // Verify the listener's certificate on https destinations.
     bool verifyPeer = true;
     std::string caFile;  // certificates to verify with; system default when empty
-    // Diagnostics: a line per change of a destination's state (reachable, failing)
-    // at Warning/Info, and one per delivery at Debug. Called from sender threads.
+    // Diagnostics: a line per change of a destination's state (failing, reachable
+    // again, queue overflowing) at Warning/Info, and one per delivery at Debug. Called
+    // from sender threads and, for an overflowing queue, from submit(); lines below
+    // logLevel are not even formatted.
     std::function<void(ExportLogLevel, std::string_view)> log;
+    ExportLogLevel logLevel = ExportLogLevel::Info;
 };
 
 class Exporter {
@@ -91,5 +94,8 @@ private:
 
 // Whether https destinations can be reached with this build.
 bool tlsSupported() noexcept;
+
+// Whether url can be a destination of this exporter; *why says what is wrong with it.
+bool validDestinationUrl(std::string_view url, std::string* why = nullptr);
 
 }  // namespace orv::exporter
