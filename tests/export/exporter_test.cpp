@@ -79,6 +79,19 @@ TEST(Exporter, PostsAnExportIndicationRequestWithTheExportHeaders) {
     EXPECT_TRUE(eventually([&] { return exporter.counts("s1").delivered == 1; }));
 }
 
+TEST(Exporter, AConnectionTheListenerClosedWhileIdleIsOpenedAgainWithoutARetry) {
+    TestListener listener(1s);
+    Exporter exporter;
+    DeliveryPolicy policy = quickPolicy(1);
+    policy.retryInterval = 60s;
+    exporter.submit("s", listener.url(), indicationXml("First"), policy);
+    ASSERT_TRUE(eventually([&] { return exporter.counts("s").delivered == 1; }));
+    std::this_thread::sleep_for(1500ms);  // the listener drops the idle connection
+    exporter.submit("s", listener.url(), indicationXml("Second"), policy);
+    ASSERT_TRUE(eventually([&] { return exporter.counts("s").delivered == 2; }));
+    EXPECT_EQ(exporter.counts("s").retried, 0U);
+}
+
 TEST(Exporter, KeepsTheOrderOfIndicationsPerDestination) {
     TestListener listener;
     Exporter exporter;

@@ -9,8 +9,9 @@ namespace {
 constexpr std::chrono::seconds kWait{10};
 }
 
-TestListener::TestListener() {
+TestListener::TestListener(std::chrono::seconds keepAlive) {
     http::ServerOptions options;
+    options.keepAliveTimeout = keepAlive;
     options.port = 0;
     options.path = "/.*";
     options.threads = 4;

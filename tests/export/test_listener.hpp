@@ -3,6 +3,7 @@
 // request until released.
 #pragma once
 
+#include <chrono>
 #include <condition_variable>
 #include <functional>
 #include <mutex>
@@ -18,7 +19,8 @@ class TestListener {
 public:
     enum class Answer { Accept, HttpError, CimError, Garbage };
 
-    TestListener();
+    // keepAlive: how long the listener keeps an idle connection open.
+    explicit TestListener(std::chrono::seconds keepAlive = std::chrono::seconds(5));
     ~TestListener();
 
     std::string url() const;

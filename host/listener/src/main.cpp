@@ -79,6 +79,8 @@ int serve(const listener::ListenerOptions& options, const sigset_t& signals) {
     serverOptions.path = "/.*";  // a listener's URL may name any path
     serverOptions.threads = 4;
     serverOptions.realm = "orv-cimlistener";
+    // Stopping waits for idle kept-alive connections to time out: keep that short.
+    serverOptions.keepAliveTimeout = std::chrono::seconds(1);
     http::HttpServer server(serverOptions, [&printer](const http::Request& request) {
         return listener::handleExportRequest(
             request, [&printer](const cimxml::InstanceModel& indication) { return printer.take(indication); });
