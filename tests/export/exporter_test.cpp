@@ -333,6 +333,12 @@ TEST(Exporter, CountsAreKeptPerSubscriptionAndCanBeForgotten) {
     exporter.submit("two", listener.url(), indicationXml("A"), quickPolicy(0));
     ASSERT_TRUE(eventually([&] { return exporter.counts("two").delivered == 2; }));
     EXPECT_EQ(exporter.counts("one").delivered, 1U);
+    const auto all = exporter.allCounts();
+    ASSERT_EQ(all.size(), 2U);
+    EXPECT_EQ(all[0].first, "one");
+    EXPECT_EQ(all[0].second.delivered, 1U);
+    EXPECT_EQ(all[1].first, "two");
+    EXPECT_EQ(all[1].second.delivered, 2U);
     exporter.forget("two");
     EXPECT_EQ(exporter.counts("two").delivered, 0U);
     EXPECT_EQ(exporter.counts("unknown").dropped, 0U);

@@ -124,6 +124,11 @@ SubscriptionCounts Exporter::counts(const std::string& subscriptionId) const {
     return found == impl_->countsBySubscription.end() ? SubscriptionCounts{} : found->second;
 }
 
+std::vector<std::pair<std::string, SubscriptionCounts>> Exporter::allCounts() const {
+    std::lock_guard lock(impl_->countsMutex);
+    return {impl_->countsBySubscription.begin(), impl_->countsBySubscription.end()};
+}
+
 void Exporter::forget(const std::string& subscriptionId) {
     std::lock_guard lock(impl_->countsMutex);
     impl_->countsBySubscription.erase(subscriptionId);

@@ -81,6 +81,8 @@ int serve(const listener::ListenerOptions& options, const sigset_t& signals) {
     serverOptions.realm = "orv-cimlistener";
     // Stopping waits for idle kept-alive connections to time out: keep that short.
     serverOptions.keepAliveTimeout = std::chrono::seconds(1);
+    // A sender keeps its connection for as long as it has indications to send.
+    serverOptions.keepAliveMaxRequests = 1000000;
     http::HttpServer server(serverOptions, [&printer](const http::Request& request) {
         return listener::handleExportRequest(
             request, [&printer](const cimxml::InstanceModel& indication) { return printer.take(indication); });

@@ -17,6 +17,8 @@
 #include <memory>
 #include <string>
 #include <string_view>
+#include <utility>
+#include <vector>
 
 namespace orv::exporter {
 
@@ -78,6 +80,8 @@ public:
     void setFatalErrorHandler(std::function<void(const std::string& subscriptionId, OnFatalError)> handler);
 
     SubscriptionCounts counts(const std::string& subscriptionId) const;
+    // Every subscription's counts, by subscription id in id order (for a summary at shutdown).
+    std::vector<std::pair<std::string, SubscriptionCounts>> allCounts() const;
     // Forgets a subscription's counts (after it was deleted).
     void forget(const std::string& subscriptionId);
 
