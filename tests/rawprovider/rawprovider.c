@@ -7,6 +7,7 @@
  *   "garbage" hands the result NULL and wrongly typed objects and returns, as
  *             uint32 data, the status codes it got back
  *   "upcall"  enumerates Raw_SubElement through the broker and returns what came back
+ *   "paths"   two object paths (path-0, path-1), whatever was asked for
  * Lifecycle calls are appended, one line each, to the file named by the
  * environment variable RAW_PROVIDER_LOG; RAW_PROVIDER_CLEANUP_RC sets what
  * cleanup(terminating = false) answers.
@@ -169,6 +170,14 @@ static int steered(const CMPIContext* ctx, const CMPIResult* rslt, const CMPIObj
     }
     if (is(who, "garbage")) {
         *out = returnGarbage(rslt, op);
+        return 1;
+    }
+    if (is(who, "paths")) {
+        /* Object paths, whatever was asked for (instances included). */
+        rslt->ft->returnObjectPath(rslt, elementPath(className(op), "path-0"));
+        rslt->ft->returnObjectPath(rslt, elementPath(className(op), "path-1"));
+        rslt->ft->returnDone(rslt);
+        *out = status(CMPI_RC_OK, NULL);
         return 1;
     }
     return 0;

@@ -68,6 +68,7 @@ host::CoreConfig coreConfig(const HostConfig& config) {
     core.registrationFiles = config.registrationFiles;
     core.mofPaths = config.mofFiles;
     core.mofNamespace = config.mofNamespace;
+    core.warningSink = [](const std::string& line) { logLine(LogLevel::Warning, line); };
     return core;
 }
 
