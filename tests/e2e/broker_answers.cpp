@@ -94,15 +94,20 @@ std::string scalarText(const orv::repository::Scalar& item) {
     return orv::repository::scalarToText(item);
 }
 
+// The class part of a printed path ("host/ns:Class.keys"), or "" for other text.
+std::string classOf(const std::string& path) {
+    const std::size_t slash = path.find('/');
+    const std::size_t colon = path.find(':', slash == std::string::npos ? 0 : slash);
+    if (slash == std::string::npos || colon == std::string::npos) {
+        return "";
+    }
+    return path.substr(colon + 1, path.find('.', colon) - colon - 1);
+}
+
 // The MOF default of a property of the class, in wbemcli's text, or nothing.
 std::optional<std::string> mofDefault(const orv::repository::ClassRepository& classes, const std::string& path,
                                       const std::string& property) {
-    std::smatch match;
-    const std::string afterHost = path.substr(path.find('/') == std::string::npos ? 0 : path.find('/'));
-    if (!std::regex_search(afterHost, match, std::regex(":([A-Za-z0-9_]+)(\\.|$)"))) {
-        return std::nullopt;
-    }
-    const auto* decl = classes.getClass("root/cimv2", match[1].str());
+    const auto* decl = classes.getClass("root/cimv2", classOf(path));
     if (decl == nullptr) {
         return std::nullopt;
     }
@@ -112,16 +117,6 @@ std::optional<std::string> mofDefault(const orv::repository::ClassRepository& cl
         }
     }
     return std::nullopt;
-}
-
-// The class part of a printed path ("host/ns:Class.keys"), or "" for other text.
-std::string classOf(const std::string& path) {
-    const std::size_t slash = path.find('/');
-    const std::size_t colon = path.find(':', slash == std::string::npos ? 0 : slash);
-    if (slash == std::string::npos || colon == std::string::npos) {
-        return "";
-    }
-    return path.substr(colon + 1, path.find('.', colon) - colon - 1);
 }
 
 std::string describe(const WbemcliObject& object) {
