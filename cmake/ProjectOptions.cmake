@@ -34,10 +34,10 @@ function(orv_project_target target)
 endfunction()
 
 # A GoogleTest suite registered with ctest. Usage:
-#   orv_add_gtest(name SOURCES a.cpp b.cpp LIBS lib1 lib2)
-# LABELS marks every test of the suite (e.g. "slow": skipped by ctest -LE slow).
+#   orv_add_gtest(name SOURCES a.cpp b.cpp LIBS lib1 lib2 [PROPERTIES LABELS x ...])
+# PROPERTIES are set on every discovered test.
 function(orv_add_gtest name)
-  cmake_parse_arguments(ARG "" "" "SOURCES;LIBS;LABELS" ${ARGN})
+  cmake_parse_arguments(ARG "" "" "SOURCES;LIBS;PROPERTIES" ${ARGN})
   add_executable(${name} ${ARG_SOURCES})
   orv_project_target(${name})
   target_link_libraries(${name} PRIVATE ${ARG_LIBS} GTest::gtest GTest::gtest_main GTest::gmock Threads::Threads)
@@ -46,8 +46,8 @@ function(orv_add_gtest name)
   # its first entry on its way through gtest_discover_tests.
   set_target_properties(${name} PROPERTIES CROSSCOMPILING_EMULATOR
     "/usr/bin/env;ORV_BUILD_DIR=${CMAKE_BINARY_DIR};ORV_SOURCE_DIR=${CMAKE_SOURCE_DIR}")
-  if(ARG_LABELS)
-    gtest_discover_tests(${name} DISCOVERY_TIMEOUT 60 PROPERTIES LABELS "${ARG_LABELS}")
+  if(ARG_PROPERTIES)
+    gtest_discover_tests(${name} DISCOVERY_TIMEOUT 60 PROPERTIES ${ARG_PROPERTIES})
   else()
     gtest_discover_tests(${name} DISCOVERY_TIMEOUT 60)
   endif()

@@ -1,5 +1,7 @@
 #include <cmpi/CmpiInstanceMI.h>
 
+#include <cmpi/CmpiResultPathToInstanceFilter.h>
+
 #include "Dispatch.h"
 
 using cmpibinding::dispatch;
@@ -51,7 +53,8 @@ CMPIStatus CmpiInstanceMI::driveEnumInstances(CMPIInstanceMI* mi, const CMPICont
                                               const CMPIObjectPath* eCop, const char** properties) {
     return dispatch<CmpiInstanceMI>(mi, "enumInstances", [&](CmpiInstanceMI& p) {
         CmpiResult rslt(eRslt);
-        return p.enumInstances(CmpiContext(eCtx), rslt, CmpiObjectPath(eCop), properties);
+        CmpiResultPathToInstanceFilter instancesOnly(rslt);
+        return p.enumInstances(CmpiContext(eCtx), instancesOnly, CmpiObjectPath(eCop), properties);
     });
 }
 
@@ -59,7 +62,8 @@ CMPIStatus CmpiInstanceMI::driveGetInstance(CMPIInstanceMI* mi, const CMPIContex
                                             const CMPIObjectPath* eCop, const char** properties) {
     return dispatch<CmpiInstanceMI>(mi, "getInstance", [&](CmpiInstanceMI& p) {
         CmpiResult rslt(eRslt);
-        return p.getInstance(CmpiContext(eCtx), rslt, CmpiObjectPath(eCop), properties);
+        CmpiResultPathToInstanceFilter instancesOnly(rslt);
+        return p.getInstance(CmpiContext(eCtx), instancesOnly, CmpiObjectPath(eCop), properties);
     });
 }
 

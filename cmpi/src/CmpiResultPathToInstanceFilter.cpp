@@ -33,7 +33,13 @@ std::vector<const char*> namesOf(const std::vector<KeyBinding>& keys) {
 
 }  // namespace
 
-void CmpiResultPathToInstanceFilter::returnData(const CmpiData& data) { target_.returnData(data); }
+void CmpiResultPathToInstanceFilter::returnData(const CmpiData& data) {
+    if (data.getType() == CMPI_ref && !data.isNullValue()) {
+        returnData(static_cast<CmpiObjectPath>(data));
+        return;
+    }
+    target_.returnData(data);
+}
 
 void CmpiResultPathToInstanceFilter::returnData(const CmpiInstance& inst) { target_.returnData(inst); }
 

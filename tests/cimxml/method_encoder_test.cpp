@@ -24,6 +24,21 @@ protected:
         return data;
     }
 
+    // Arguments holding "Codes" = 7, NULL, 9 (uint16[]).
+    CMPIArgs* argsWithCodes() {
+        CMPIArgs* args = broker()->eft->newArgs(broker(), nullptr);
+        CMPIArray* codes = broker()->eft->newArray(broker(), 3, CMPI_uint16, nullptr);
+        CMPIValue item{};
+        item.uint16 = 7;
+        codes->ft->setElementAt(codes, 0, &item, CMPI_uint16);
+        item.uint16 = 9;
+        codes->ft->setElementAt(codes, 2, &item, CMPI_uint16);
+        CMPIValue arrayValue{};
+        arrayValue.array = codes;
+        args->ft->addArg(args, "Codes", &arrayValue, CMPI_uint16A);
+        return args;
+    }
+
     host::BrokerCore core{host::CoreConfig{}};
     host::ObjectScope scope;
 };
@@ -48,17 +63,15 @@ TEST_F(MethodEncoderTest, ValueWithoutCimXmlTypeWritesNothing) {
     EXPECT_EQ(written([&](XmlWriter& out) { writeReturnValue(out, scalar(CMPI_ptr, value)); }), "");
 }
 
+TEST_F(MethodEncoderTest, OutputArgumentsLeaveNullArrayElementsOutByDefault) {
+    CMPIArgs* args = argsWithCodes();
+    EXPECT_EQ(written([&](XmlWriter& out) { writeOutArguments(out, args); }),
+              "<PARAMVALUE NAME=\"Codes\" PARAMTYPE=\"uint16\"><VALUE.ARRAY><VALUE>7</VALUE><VALUE>9</VALUE>"
+              "</VALUE.ARRAY></PARAMVALUE>");
+}
+
 TEST_F(MethodEncoderTest, OutputArgumentsInProviderOrderWithArraysNullElementsAndReferences) {
-    CMPIArgs* args = broker()->eft->newArgs(broker(), nullptr);
-    CMPIArray* codes = broker()->eft->newArray(broker(), 3, CMPI_uint16, nullptr);
-    CMPIValue item{};
-    item.uint16 = 7;
-    codes->ft->setElementAt(codes, 0, &item, CMPI_uint16);
-    item.uint16 = 9;
-    codes->ft->setElementAt(codes, 2, &item, CMPI_uint16);
-    CMPIValue arrayValue{};
-    arrayValue.array = codes;
-    args->ft->addArg(args, "Codes", &arrayValue, CMPI_uint16A);
+    CMPIArgs* args = argsWithCodes();
     CMPIObjectPath* path = broker()->eft->newObjectPath(broker(), "root/cimv2", "Raw_Element", nullptr);
     path->ft->addKey(path, "Name", reinterpret_cast<const CMPIValue*>("e1"), CMPI_chars);
     CMPIValue ref{};
@@ -66,7 +79,8 @@ TEST_F(MethodEncoderTest, OutputArgumentsInProviderOrderWithArraysNullElementsAn
     args->ft->addArg(args, "Target", &ref, CMPI_ref);
     args->ft->addArg(args, "Why", reinterpret_cast<const CMPIValue*>("a<b"), CMPI_chars);
     args->ft->addArg(args, "Nothing", nullptr, CMPI_string);
-    const std::string xml = written([&](XmlWriter& out) { writeOutArguments(out, args); });
+    const std::string xml =
+        written([&](XmlWriter& out) { writeOutArguments(out, args, ArrayNullElements::ValueNull); });
     EXPECT_EQ(xml,
               "<PARAMVALUE NAME=\"Codes\" PARAMTYPE=\"uint16\"><VALUE.ARRAY><VALUE>7</VALUE><VALUE.NULL></VALUE.NULL>"
               "<VALUE>9</VALUE></VALUE.ARRAY></PARAMVALUE>"

@@ -100,10 +100,18 @@ TEST_F(RoutingTest, GetInstanceAppliesThePropertyList) {
     EXPECT_EQ(rc.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
 }
 
-TEST_F(RoutingTest, SingleInstanceRequestForAnUnregisteredSubclassReachesTheSuperclassProvider) {
-    // Raw_Missing has no provider of its own but Raw_Base has none either: not supported.
+TEST_F(RoutingTest, GetInstanceOfAClassWithoutProviderIsNotFound) {
+    // Raw_Base is known but no provider serves it or a superclass: as sfcb, no such instance.
     Reply reply = core_->getInstance(path("Raw_Base", "x"));
+    EXPECT_EQ(reply.rc(), CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_EQ(reply.message(), "no provider registered for class Raw_Base: no such instance");
+    EXPECT_EQ(reply.providerCalls(), 0U);
+}
+
+TEST_F(RoutingTest, OtherRequestsOfAClassWithoutProviderAreNotSupported) {
+    Reply reply = core_->deleteInstance(path("Raw_Base", "x"));
     EXPECT_EQ(reply.rc(), CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(reply.message(), "no provider registered for class Raw_Base");
 }
 
 TEST_F(RoutingTest, UnknownClassAndNamespaceAreReported) {

@@ -25,6 +25,10 @@ const std::string kPort =
 const std::string kEndpoint =
     "Orvane_KernelIPv4ProtocolEndpoint.Name=\"vif0\",SystemCreationClassName=\"OMC_UnitaryComputerSystem\","
     "SystemName=\"orvhost01.lab.example.com\",CreationClassName=\"Orvane_KernelIPv4ProtocolEndpoint\"";
+const std::string kInstalledIdentity =
+    "Orvane_InstalledSoftwareIdentity.System=root/cimv2:OMC_UnitaryComputerSystem.Name=\"orvhost01.lab.example.com\","
+    "CreationClassName=\"OMC_UnitaryComputerSystem\",InstalledSoftware=root/cimv2:Orvane_HypervisorSoftwareIdentity."
+    "InstanceID=\"Orvane Zolti 6.0.0 build-4192238\"";
 const std::string kProcessor =
     "Orvane_Processor.ElementName=\"cpu-1\",SystemCreationClassName=\"OMC_UnitaryComputerSystem\","
     "SystemName=\"orvhost01.lab.example.com\",CreationClassName=\"Orvane_Processor\",DeviceID=\"cpu-1\"";
@@ -112,6 +116,8 @@ std::vector<ProviderCase> providerCases() {
         {"ein_hypervisor_identity", "ein", "Orvane_HypervisorSoftwareIdentity"},
         {"ei_hypervisor_identity", "ei", "Orvane_HypervisorSoftwareIdentity"},
         {"ein_installed_identity", "ein", "Orvane_InstalledSoftwareIdentity"},
+        // The software reference comes back as the provider got it: without the host wbemcli named.
+        {"gi_installed_identity", "gi", kInstalledIdentity},
     };
 }
 

@@ -7,6 +7,8 @@
  *   "garbage" hands the result NULL and wrongly typed objects and returns, as
  *             uint32 data, the status codes it got back
  *   "upcall"  enumerates Raw_SubElement through the broker and returns what came back
+ *   "paths"   two object paths (path-0, path-1), whatever was asked for
+ * getInstance of the Name "gaps" answers Numbers = 0, NULL, 20.
  * Lifecycle calls are appended, one line each, to the file named by the
  * environment variable RAW_PROVIDER_LOG; RAW_PROVIDER_CLEANUP_RC sets what
  * cleanup(terminating = false) answers.
@@ -171,6 +173,14 @@ static int steered(const CMPIContext* ctx, const CMPIResult* rslt, const CMPIObj
         *out = returnGarbage(rslt, op);
         return 1;
     }
+    if (is(who, "paths")) {
+        /* Object paths, whatever was asked for (instances included). */
+        rslt->ft->returnObjectPath(rslt, elementPath(className(op), "path-0"));
+        rslt->ft->returnObjectPath(rslt, elementPath(className(op), "path-1"));
+        rslt->ft->returnDone(rslt);
+        *out = status(CMPI_RC_OK, NULL);
+        return 1;
+    }
     return 0;
 }
 
@@ -271,6 +281,15 @@ static CMPIStatus instGet(CMPIInstanceMI* mi, const CMPIContext* ctx, const CMPI
         return status(CMPI_RC_ERR_NOT_FOUND, "no Name key");
     }
     inst = makeElement(className(op), (const char*)key.value.string->hdl, 7);
+    if (is((const char*)key.value.string->hdl, "gaps")) {
+        /* Numbers 0, NULL, 20: element 1 is never set. */
+        CMPIArray* gaps = broker->eft->newArray(broker, 3, CMPI_uint16, NULL);
+        CMPIUint16 v = 0;
+        gaps->ft->setElementAt(gaps, 0, (const CMPIValue*)&v, CMPI_uint16);
+        v = 20;
+        gaps->ft->setElementAt(gaps, 2, (const CMPIValue*)&v, CMPI_uint16);
+        inst->ft->setProperty(inst, "Numbers", (const CMPIValue*)&gaps, CMPI_uint16A);
+    }
     if (properties != NULL) {
         inst->ft->setPropertyFilter(inst, properties, NULL);
     }

@@ -1,5 +1,13 @@
 // CmpiInstanceMI: base of instance providers. Every operation's default
 // refuses the call with CMPI_RC_ERR_NOT_SUPPORTED.
+//
+// The binding's rule for instance requests: while enumInstances or getInstance
+// runs, an object path the provider delivers to the result (returnData with a
+// CmpiObjectPath, or a CmpiData holding a reference) reaches the broker as an
+// instance made from that path: the path's keys as its properties, on that
+// path. A broker never sees a path in the answer to an instance request (sfcb
+// crashes on one), and the client gets the instance it asked for.
+// enumInstanceNames delivers what the provider returns, unchanged.
 #ifndef ORV_CMPI_CMPIINSTANCEMI_H
 #define ORV_CMPI_CMPIINSTANCEMI_H
 

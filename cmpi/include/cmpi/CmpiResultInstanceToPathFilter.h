@@ -1,5 +1,6 @@
 // A result that turns each delivered instance into its object path and
-// passes that on; paths, plain values and the end of the answer pass through.
+// passes that on; paths (also those handed over as reference values) go on as
+// paths, other values and the end of the answer pass through.
 // Serves enumInstanceNames from a provider's enumInstances.
 #ifndef ORV_CMPI_CMPIRESULTINSTANCETOPATHFILTER_H
 #define ORV_CMPI_CMPIRESULTINSTANCETOPATHFILTER_H

@@ -1,8 +1,10 @@
-// A result that turns each delivered object path into an instance of the
-// path's class carrying the path's keys as properties, restricted to the
-// requested property list (keys are kept), and passes that on; instances,
-// plain values and the end of the answer pass through. Serves enumInstances
-// from a provider's enumInstanceNames.
+// A result that turns each delivered object path (a CmpiObjectPath, or a
+// CmpiData holding a reference) into an instance of the path's class, on that
+// path, carrying the path's keys as properties, restricted to the requested
+// property list (keys are kept), and passes that on; instances, other values
+// and the end of the answer pass through. Serves enumInstances from a
+// provider's enumInstanceNames, and stands between every instance request and
+// the broker (CmpiInstanceMI).
 #ifndef ORV_CMPI_CMPIRESULTPATHTOINSTANCEFILTER_H
 #define ORV_CMPI_CMPIRESULTPATHTOINSTANCEFILTER_H
 

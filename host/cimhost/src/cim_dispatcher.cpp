@@ -52,10 +52,12 @@ const Operation* findOperation(const std::string& name) {
 }  // namespace
 
 CimDispatcher::CimDispatcher(host::BrokerCore& core, const repository::ClassRepository& classes,
-                             std::string hostName, std::chrono::milliseconds callLimit)
+                             std::string hostName, std::chrono::milliseconds callLimit,
+                             cimxml::ArrayNullElements arrayNulls)
     : core_(core),
       classes_(classes),
       hostName_(std::move(hostName)),
+      arrayNulls_(arrayNulls),
       limiter_(std::make_unique<detail::CallLimiter>(callLimit)) {}
 
 CimDispatcher::~CimDispatcher() = default;
@@ -101,7 +103,7 @@ std::string CimDispatcher::respondNow(const cimxml::CimRequest& request, const s
     try {
         host::ObjectScope scope;
         detail::OperationContext context{core_, classes_, request, principal,
-                                         cimxml::PathDefaults{hostName_, request.nameSpace}, out};
+                                         cimxml::PathDefaults{hostName_, request.nameSpace}, out, arrayNulls_};
         handler(context);
     } catch (const CimError& error) {
         return fail(error.code(), error.description());

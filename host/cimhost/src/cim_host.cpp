@@ -68,6 +68,7 @@ host::CoreConfig coreConfig(const HostConfig& config) {
     core.registrationFiles = config.registrationFiles;
     core.mofPaths = config.mofFiles;
     core.mofNamespace = config.mofNamespace;
+    core.warningSink = [](const std::string& line) { logLine(LogLevel::Warning, line); };
     return core;
 }
 
@@ -84,7 +85,7 @@ CimHost::CimHost(const HostConfig& config) : impl_(std::make_unique<Impl>()) {
     detail::preloadProviders(*impl_->core);
     impl_->dispatcher = std::make_unique<CimDispatcher>(
         *impl_->core, impl_->core->classes(), config.hostName.empty() ? machineName() : config.hostName,
-        config.providerCallLimit);
+        config.providerCallLimit, config.arrayNullElements);
     const CimDispatcher* dispatcher = impl_->dispatcher.get();
     impl_->server = std::make_unique<http::HttpServer>(
         serverOptions(config),

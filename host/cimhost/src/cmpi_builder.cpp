@@ -197,7 +197,12 @@ void addKey(const CMPIBroker* broker, const repository::ClassRepository& classes
             badValue(key.name, key.value, "reference");
         }
         converted.type = CMPI_ref;
-        converted.value.ref = buildObjectPath(broker, classes, nameSpace, *key.reference);
+        // As sfcb does, a reference key reaches the provider without the host the
+        // client named: providers that hand it back (an association's end, say)
+        // return it as a local path, the form wbemcli and sfcb's clients read.
+        cimxml::ObjectPathModel local = *key.reference;
+        local.host.clear();
+        converted.value.ref = buildObjectPath(broker, classes, nameSpace, local);
     } else {
         convertText(broker, converted, key.name, key.value);
     }

@@ -51,6 +51,16 @@ LogLevel parseLogLevel(std::string_view value) {
     throw ConfigError("'" + std::string(value) + "' is not one of error, warning, info, debug");
 }
 
+cimxml::ArrayNullElements arrayNullElements(std::string_view value) {
+    if (value == "drop") {
+        return cimxml::ArrayNullElements::Drop;
+    }
+    if (value == "value-null") {
+        return cimxml::ArrayNullElements::ValueNull;
+    }
+    throw ConfigError("'" + std::string(value) + "' is not drop or value-null");
+}
+
 std::string platformName(std::string_view value) {
     if (value != "sim" && value != "linux") {
         throw ConfigError("'" + std::string(value) + "' is not sim or linux");
@@ -104,6 +114,9 @@ constexpr std::array kKeys = {
               }},
     ConfigKey{"hostName", "host-name", "HOST written in instance paths (this machine's name)",
               [](HostConfig& c, std::string_view v, Base) { c.hostName = std::string(v); }},
+    ConfigKey{"arrayNullElements", "array-null-elements",
+              "NULL array elements: drop (left out, as sfcb) or value-null (DSP0201 VALUE.NULL) (drop)",
+              [](HostConfig& c, std::string_view v, Base) { c.arrayNullElements = arrayNullElements(v); }},
 };
 
 }  // namespace

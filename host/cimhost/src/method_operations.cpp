@@ -45,9 +45,9 @@ void invokeMethod(OperationContext& context) {
                                                   callOptions(context, false, false, false, {}));
     throwIfFailed(reply);
     if (const CMPIData* value = returnedValue(reply)) {
-        cimxml::writeReturnValue(context.out, *value);
+        cimxml::writeReturnValue(context.out, *value, context.arrayNulls);
     }
-    cimxml::writeOutArguments(context.out, reply.outArgs());
+    cimxml::writeOutArguments(context.out, reply.outArgs(), context.arrayNulls);
 }
 
 }  // namespace orv::cimhost::detail

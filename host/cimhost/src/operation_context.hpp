@@ -20,6 +20,7 @@ struct OperationContext {
     const std::string& principal;
     cimxml::PathDefaults defaults;  // host and request namespace
     cimxml::XmlWriter& out;         // inside IRETURNVALUE (intrinsic) or METHODRESPONSE
+    cimxml::ArrayNullElements arrayNulls;  // how NULL array elements are sent
 };
 
 using OperationHandler = void (*)(OperationContext& context);

@@ -37,6 +37,7 @@ cimxml::InstanceEncoding instanceEncoding(const OperationContext& context, bool 
                                           std::optional<std::vector<std::string>> propertyList) {
     cimxml::InstanceEncoding encoding;
     encoding.includeClassOrigin = includeClassOrigin;
+    encoding.arrayNullElements = context.arrayNulls;
     encoding.propertyList = std::move(propertyList);
     const repository::ClassRepository& classes = context.classes;
     const std::string nameSpace = context.request.nameSpace;

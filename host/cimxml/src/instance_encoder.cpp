@@ -49,7 +49,7 @@ void openProperty(XmlWriter& out, const PropertyHeader& header, CMPIType type) {
     }
 }
 
-void writeProperty(XmlWriter& out, const PropertyHeader& header, const CMPIData& data) {
+void writeProperty(XmlWriter& out, const PropertyHeader& header, const CMPIData& data, ArrayNullElements nulls) {
     const bool isArray = (data.type & CMPI_ARRAY) != 0;
     if (xmlTypeName(data.type).empty()) {
         return;  // pointers, arguments and the like have no CIM-XML form
@@ -61,7 +61,7 @@ void writeProperty(XmlWriter& out, const PropertyHeader& header, const CMPIData&
         PropertyHeader arrayHeader{"PROPERTY.ARRAY", header.name, header.info, header.includeClassOrigin};
         openProperty(out, arrayHeader, data.type & ~CMPI_ARRAY);
         if (!isNullData(data) && data.value.array != nullptr) {
-            writeValueArray(out, data.value.array);
+            writeValueArray(out, data.value.array, nulls);
         }
         out.close();
         return;
@@ -95,7 +95,7 @@ std::optional<std::string> itemText(const CMPIData& item) {
     return scalarText(item);
 }
 
-void writeValueArray(XmlWriter& out, const CMPIArray* array) {
+void writeValueArray(XmlWriter& out, const CMPIArray* array, ArrayNullElements nulls) {
     out.open("VALUE.ARRAY");
     const CMPICount size = array->ft->getSize(array, nullptr);
     for (CMPICount i = 0; i < size; ++i) {
@@ -103,7 +103,7 @@ void writeValueArray(XmlWriter& out, const CMPIArray* array) {
         std::optional<std::string> text = itemText(item);
         if (text) {
             out.leaf("VALUE", *text);
-        } else {
+        } else if (nulls == ArrayNullElements::ValueNull) {
             out.open("VALUE.NULL").close();
         }
     }
@@ -125,7 +125,8 @@ void writeInstance(XmlWriter& out, const CMPIInstance* instance, const InstanceE
         if (encoding.lookup) {
             info = encoding.lookup(className, name);
         }
-        writeProperty(out, PropertyHeader{"PROPERTY", name, info, encoding.includeClassOrigin}, data);
+        writeProperty(out, PropertyHeader{"PROPERTY", name, info, encoding.includeClassOrigin}, data,
+                      encoding.arrayNullElements);
     }
     out.close();
 }

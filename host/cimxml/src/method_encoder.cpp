@@ -9,7 +9,7 @@ namespace orv::cimxml {
 namespace {
 
 // PARAMTYPE and EmbeddedObject of a value's element, then the value itself.
-void writeTypedValue(XmlWriter& out, const CMPIData& data) {
+void writeTypedValue(XmlWriter& out, const CMPIData& data, ArrayNullElements nulls) {
     const CMPIType element = data.type & ~CMPI_ARRAY;
     out.attr("PARAMTYPE", xmlTypeName(element));
     if (element == CMPI_instance) {
@@ -20,7 +20,7 @@ void writeTypedValue(XmlWriter& out, const CMPIData& data) {
     }
     if ((data.type & CMPI_ARRAY) != 0) {
         if (data.value.array != nullptr) {
-            writeValueArray(out, data.value.array);
+            writeValueArray(out, data.value.array, nulls);
         }
     } else if (data.type == CMPI_ref) {
         if (data.value.ref != nullptr) {
@@ -37,25 +37,25 @@ bool hasXmlForm(const CMPIData& data) {
 
 }  // namespace
 
-void writeReturnValue(XmlWriter& out, const CMPIData& data) {
+void writeReturnValue(XmlWriter& out, const CMPIData& data, ArrayNullElements nulls) {
     if (!hasXmlForm(data)) {
         return;
     }
     out.open("RETURNVALUE");
-    writeTypedValue(out, data);
+    writeTypedValue(out, data, nulls);
     out.close();
 }
 
-void writeParamValue(XmlWriter& out, std::string_view name, const CMPIData& data) {
+void writeParamValue(XmlWriter& out, std::string_view name, const CMPIData& data, ArrayNullElements nulls) {
     if (!hasXmlForm(data)) {
         return;
     }
     out.open("PARAMVALUE").attr("NAME", name);
-    writeTypedValue(out, data);
+    writeTypedValue(out, data, nulls);
     out.close();
 }
 
-void writeOutArguments(XmlWriter& out, const CMPIArgs* args) {
+void writeOutArguments(XmlWriter& out, const CMPIArgs* args, ArrayNullElements nulls) {
     if (args == nullptr) {
         return;
     }
@@ -63,7 +63,7 @@ void writeOutArguments(XmlWriter& out, const CMPIArgs* args) {
     for (CMPICount i = 0; i < count; ++i) {
         CMPIString* name = nullptr;
         const CMPIData data = args->ft->getArgAt(args, i, &name, nullptr);
-        writeParamValue(out, cmpiString(name), data);
+        writeParamValue(out, cmpiString(name), data, nulls);
     }
 }
 

@@ -33,7 +33,7 @@ std::vector<fs::path> mofFiles(const fs::path& path) {
 
 }  // namespace
 
-CoreServices::CoreServices(const CoreConfig& config) : broker_(makeBroker(this)) {
+CoreServices::CoreServices(const CoreConfig& config) : broker_(makeBroker(this)), warningSink_(config.warningSink) {
     try {
         for (const fs::path& path : config.mofPaths) {
             for (const fs::path& file : mofFiles(path)) {

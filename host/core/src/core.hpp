@@ -6,9 +6,11 @@
 #include <cmpidt.h>
 #include <cmpift.h>
 
+#include <functional>
 #include <map>
 #include <memory>
 #include <mutex>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -112,6 +114,9 @@ private:
     Outcome callTargets(const std::vector<Target>& targets, ProviderKind kind, const Request& request,
                         ResultSink& sink);
     Outcome noTarget(std::string_view ns, std::string_view className) const;
+    // Logs, once per provider, that it handed object paths to an instance request.
+    void warnPathsAsInstances(const Target& target, const Request& request);
+    void warn(const std::string& line) const;
 
     orv::repository::ClassRepository repository_;
     std::vector<orv::repository::RegistrationSet> registrationSets_;
@@ -121,6 +126,10 @@ private:
 
     mutable std::mutex keyMutex_;
     mutable std::map<std::string, std::unique_ptr<std::vector<std::string>>> keyCache_;
+
+    std::function<void(const std::string&)> warningSink_;
+    std::mutex warnedMutex_;
+    std::set<std::string> warnedProviders_;
 
     std::mutex subscriberMutex_;
     std::map<std::uint64_t, std::shared_ptr<IndicationSubscriber>> subscribers_;

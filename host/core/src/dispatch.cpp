@@ -125,7 +125,12 @@ Outcome CoreServices::callTargets(const std::vector<Target>& targets, ProviderKi
         CMPIResult* rslt = newResult(sink);
         CMPIStatus status{CMPI_RC_OK, nullptr};
         if (kind == ProviderKind::Instance) {
+            sink.pathsAsInstances = request.op == Op::EnumerateInstances || request.op == Op::GetInstance;
+            const unsigned turnedBefore = sink.pathsTurnedIntoInstances;
             status = callInstanceMI(mi, request, frame.ctx(), rslt, pathFor(request, target));
+            if (sink.pathsTurnedIntoInstances != turnedBefore) {
+                warnPathsAsInstances(target, request);
+            }
         } else if (kind == ProviderKind::Association) {
             // The association class handed on is the target's: the registered
             // class, or the requested one when a superclass's provider serves it.
@@ -173,6 +178,12 @@ Outcome CoreServices::dispatch(const Request& request, ResultSink& sink) {
     if (found.empty()) {
         if (isAssociationOp(request.op) || (isEnumeration(request.op) && repository_.getClass(path->nameSpace, className) != nullptr)) {
             return Outcome{};
+        }
+        // No provider can have the instance: not found, as sfcb answers. Callers
+        // that skip missing instances (association far ends) go on.
+        if (request.op == Op::GetInstance && repository_.getClass(path->nameSpace, className) != nullptr) {
+            return Outcome{CMPI_RC_ERR_NOT_FOUND,
+                           "no provider registered for class " + className + ": no such instance", 0};
         }
         return noTarget(path->nameSpace, className);
     }

@@ -80,6 +80,15 @@ CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path
         return status(CMPI_RC_ERR_INVALID_PARAMETER, "returnObjectPath with a NULL path");
     }
     ArenaGuard guard(*sink->out);
+    if (sink->pathsAsInstances) {
+        CMPIInstance* instance = objectPathImpl(path) != nullptr ? newInstance(path, Owner::Arena) : nullptr;
+        if (instance == nullptr) {
+            return status(CMPI_RC_ERR_INVALID_HANDLE, "returnObjectPath with an object that is not a live object path");
+        }
+        append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, instance);
+        ++sink->pathsTurnedIntoInstances;
+        return okStatus();
+    }
     CMPIObjectPath* copy = cloneObjectPath(path, Owner::Arena);
     if (copy == nullptr) {
         return status(CMPI_RC_ERR_INVALID_HANDLE, "returnObjectPath with an object that is not a live object path");

@@ -17,6 +17,12 @@ struct ResultSink {
     Arena* out;
     std::vector<ReturnedItem> items;
     unsigned done = 0;
+    // Set for instance requests (EnumerateInstances, GetInstance): an object
+    // path returned there is kept as an instance made from it (its keys as
+    // properties, on that path), as the C++ binding does for its providers.
+    bool pathsAsInstances = false;
+    // How many paths were turned into instances so.
+    unsigned pathsTurnedIntoInstances = 0;
 };
 
 // A caller-owned result feeding `sink`; free it with disposeObject.

@@ -32,6 +32,11 @@ public:
                 rslt.returnData(element(cop.getNameSpace().charPtr(), "Test_Element", name, properties));
             }
         }
+        if (cop.getClassName().equalsIgnoreCase("Test_PathElement")) {
+            // One path as an object path, one as a reference value.
+            rslt.returnData(pathElement(cop.getNameSpace().charPtr(), "first"));
+            rslt.returnData(CmpiData(pathElement(cop.getNameSpace().charPtr(), "second")));
+        }
         rslt.returnDone();
         return CmpiStatus(CMPI_RC_OK);
     }
@@ -50,6 +55,11 @@ public:
         if (name == "return-status-bare") return CmpiStatus(CMPI_RC_ERR_NOT_FOUND);
         if (name == "std-exception") throw std::runtime_error("element lookup exploded");
         if (name == "foreign-exception") throw 42;
+        if (cop.getClassName().equalsIgnoreCase("Test_PathElement")) {
+            rslt.returnData(pathElement(cop.getNameSpace().charPtr(), name.c_str()));
+            rslt.returnDone();
+            return CmpiStatus(CMPI_RC_OK);
+        }
         CmpiInstance inst = element(cop.getNameSpace().charPtr(), cop.getClassName().charPtr(), name.c_str(),
                                     properties);
         if (name == "self") {
@@ -64,6 +74,12 @@ public:
     }
 
 private:
+    static CmpiObjectPath pathElement(const char* ns, const char* name) {
+        CmpiObjectPath path(ns, "Test_PathElement");
+        path.setKey("Name", CmpiString(name));
+        return path;
+    }
+
     static CmpiInstance element(const char* ns, const char* cls, const char* name, const char** properties) {
         CmpiObjectPath path(ns, cls);
         path.setKey("Name", CmpiString(name));

@@ -87,16 +87,19 @@ TEST_F(EnumerationTest, StatisticsAssociationInstancesCarryTheTwoReferencesOnly)
                                        {"Stats", CMPI_ref, farEndRefText("Orvane_EPStatisticalInformation", "vmnic1")}}));
 }
 
-// The setting-data associations are enumerated as paths even when instances
-// are asked for.
-TEST_F(EnumerationTest, SettingDataAssociationInstancesArriveAsPaths) {
+// The provider hands the setting-data associations over as paths even when
+// instances are asked for; the binding delivers instances made from them.
+TEST_F(EnumerationTest, SettingDataAssociationInstancesCarryTheTwoReferences) {
     serveTwoNics();
     for (const FarEnd& row : farEnds()) {
         if (std::string(row.portRole) != "ManagedElement") continue;
         Reply reply = provider().enumerateInstances(row.assocClass);
-        EXPECT_EQ(reply.instances().size(), 0u) << row.assocClass;
-        ASSERT_EQ(reply.objectPaths().size(), 2u) << row.assocClass;
-        EXPECT_EQ(keysOf(reply.objectPaths()[0]),
+        EXPECT_EQ(reply.objectPaths().size(), 0u) << row.assocClass;
+        ASSERT_EQ(reply.instances().size(), 2u) << row.assocClass;
+        EXPECT_EQ(propertiesOf(reply.instances()[1]),
+                  (std::vector<NamedValue>{{"ManagedElement", CMPI_ref, portRefText("vmnic1")},
+                                           {"SettingData", CMPI_ref, farEndRefText(row.className, "vmnic1")}}));
+        EXPECT_EQ(keysOf(reply.instances()[0]->ft->getObjectPath(reply.instances()[0], nullptr)),
                   (std::vector<NamedValue>{{"ManagedElement", CMPI_ref, portRefText("vmnic0")},
                                            {"SettingData", CMPI_ref, farEndRefText(row.className, "vmnic0")}}));
     }

@@ -6,6 +6,7 @@
 #include <memory>
 #include <string>
 
+#include "orv/cimxml/object_encoder.hpp"
 #include "orv/cimxml/request.hpp"
 #include "orv/host/broker_core.hpp"
 #include "orv/repository/class_repository.hpp"
@@ -20,8 +21,10 @@ class CimDispatcher {
 public:
     // `hostName` is the HOST of instance paths whose provider left it out. A non-zero
     // `callLimit` caps how long a request may wait for the providers (see respond).
+    // `arrayNulls` says how NULL elements of array values are sent.
     CimDispatcher(host::BrokerCore& core, const repository::ClassRepository& classes, std::string hostName,
-                  std::chrono::milliseconds callLimit = {});
+                  std::chrono::milliseconds callLimit = {},
+                  cimxml::ArrayNullElements arrayNulls = cimxml::ArrayNullElements::Drop);
     ~CimDispatcher();
     CimDispatcher(const CimDispatcher&) = delete;
     CimDispatcher& operator=(const CimDispatcher&) = delete;
@@ -42,6 +45,7 @@ private:
     host::BrokerCore& core_;
     const repository::ClassRepository& classes_;
     std::string hostName_;
+    cimxml::ArrayNullElements arrayNulls_;
     std::unique_ptr<detail::CallLimiter> limiter_;
 };
 

@@ -10,6 +10,8 @@
 #include <string_view>
 #include <vector>
 
+#include "orv/cimxml/object_encoder.hpp"
+
 namespace orv::cimhost {
 
 enum class LogLevel { Error, Warning, Info, Debug };
@@ -34,6 +36,9 @@ struct HostConfig {
     // Longest a request may wait for its providers (0: no limit); see CimDispatcher.
     std::chrono::seconds providerCallLimit{60};
     std::string hostName;  // HOST of instance paths in responses; empty: this machine's name
+    // NULL elements of array values: left out as sfcb does (what wbemcli and pywbem
+    // read), or sent as DSP0201's VALUE.NULL.
+    cimxml::ArrayNullElements arrayNullElements = cimxml::ArrayNullElements::Drop;
 };
 
 // Bad configuration input; what() is one line naming the file and line or the option.

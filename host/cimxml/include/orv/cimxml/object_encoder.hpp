@@ -26,8 +26,17 @@ struct PropertyInfo {
 using PropertyLookup =
     std::function<std::optional<PropertyInfo>(std::string_view className, std::string_view property)>;
 
+// How NULL elements of an array value are sent. DSP0201 writes each as a
+// VALUE.NULL inside VALUE.ARRAY, which wbemcli 1.6 and pywbem cannot read;
+// sfcb leaves them out (the elements after them move up), which both read.
+enum class ArrayNullElements {
+    Drop,       // as sfcb: only the non-NULL elements, in order
+    ValueNull,  // as DSP0201: a VALUE.NULL per NULL element
+};
+
 struct InstanceEncoding {
     bool includeClassOrigin = false;
+    ArrayNullElements arrayNullElements = ArrayNullElements::Drop;
     // Properties to keep (any case); nullopt keeps every property.
     std::optional<std::vector<std::string>> propertyList;
     PropertyLookup lookup;  // may be empty

@@ -49,6 +49,10 @@ struct CoreConfig {
     std::vector<std::filesystem::path> mofPaths;
     // Namespace the MOF files are read into (until a "#pragma namespace").
     std::string mofNamespace = "root/cimv2";
+    // Receives the core's warnings, one line each without line end (such as the
+    // one logged once per provider that hands object paths to instance
+    // requests). Unset: they go to standard error.
+    std::function<void(const std::string&)> warningSink;
 };
 
 // Per-request settings that reach the provider through its context.
