@@ -112,6 +112,10 @@ private:
     Outcome callTargets(const std::vector<Target>& targets, ProviderKind kind, const Request& request,
                         ResultSink& sink);
     Outcome noTarget(std::string_view ns, std::string_view className) const;
+    // One filter off on one provider and class: disableIndications first when it
+    // was the provider's last filter, then deActivateFilter.
+    CMPIStatus filterOff(ProviderEntry& entry, void* mi, const CMPIContext* ctx, const CMPISelectExp* se,
+                         std::string_view ns, const std::string& className);
 
     orv::repository::ClassRepository repository_;
     std::vector<orv::repository::RegistrationSet> registrationSets_;
@@ -121,6 +125,8 @@ private:
 
     mutable std::mutex keyMutex_;
     mutable std::map<std::string, std::unique_ptr<std::vector<std::string>>> keyCache_;
+
+    std::mutex filterMutex_;  // filter activation and the enable switch, one at a time
 
     std::mutex subscriberMutex_;
     std::map<std::uint64_t, std::shared_ptr<IndicationSubscriber>> subscribers_;

@@ -43,6 +43,8 @@ struct ProviderEntry {
     std::map<ProviderKind, LoadedMI> mis;
     bool indicationsEnabled = false;
     unsigned activeFilters = 0;
+    // Active filters per class name (lower case) the MI was activated with.
+    std::map<std::string, unsigned> classFilters;
 };
 
 class ProviderLoader {

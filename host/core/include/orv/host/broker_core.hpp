@@ -181,8 +181,13 @@ public:
                        const CallOptions& opts = {});
 
     // Indication control for the indication providers registered for the FROM
-    // class of `query` (and its subclasses): authorizeFilter, mustPoll and
-    // activateFilter(firstActivation = true) / deActivateFilter(lastActivation = true).
+    // class of `query` (and its subclasses), one filter per call, in sfcb's order:
+    // activation calls authorizeFilter, mustPoll and activateFilter on each (with
+    // firstActivation set when the provider had no active filter on that class),
+    // then enableIndications on each provider that had no active filter; a refusal
+    // deactivates what the call activated. Deactivation calls disableIndications on
+    // a provider losing its last filter, then deActivateFilter (lastActivation set
+    // when no filter on that class is left).
     Reply activateFilter(std::string_view ns, std::string_view query, std::string_view lang = "WQL",
                          const CallOptions& opts = {});
     Reply deactivateFilter(std::string_view ns, std::string_view query,
