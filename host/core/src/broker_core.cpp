@@ -246,6 +246,11 @@ Reply BrokerCore::disableIndications(std::string_view ns, std::string_view class
     return reply(impl_->services.indicationSwitch(ns, className, false));
 }
 
+void BrokerCore::addBuiltInProvider(const std::string& name, orv::repository::ProviderKind kind, void* mi,
+                                    std::string_view ns, const std::vector<std::string>& classNames) {
+    impl_->services.addBuiltIn(name, kind, mi, ns, classNames);
+}
+
 std::uint64_t BrokerCore::addIndicationSubscriber(IndicationSubscriber subscriber) {
     return impl_->services.addSubscriber(std::move(subscriber));
 }

@@ -6,6 +6,7 @@
 #include <cmpidt.h>
 #include <cmpift.h>
 
+#include <deque>
 #include <map>
 #include <memory>
 #include <mutex>
@@ -94,6 +95,9 @@ public:
     CMPIStatus deliver(const char* ns, const CMPIInstance* indication);
 
     ProviderLoader& loader() noexcept { return *loader_; }
+    // Registers an MI of the host's own for classes of one namespace (see BrokerCore).
+    void addBuiltIn(const std::string& name, ProviderKind kind, void* mi, std::string_view ns,
+                    const std::vector<std::string>& classNames);
     // Loads each registered library once; the errors of those that failed.
     std::vector<std::string> preloadProviders();
 
@@ -120,6 +124,7 @@ private:
     orv::repository::ClassRepository repository_;
     std::vector<orv::repository::RegistrationSet> registrationSets_;
     std::vector<const ProviderRegistration*> registrations_;
+    std::deque<ProviderRegistration> builtIns_;  // registrations of the host's own MIs
     CMPIBroker broker_;
     std::unique_ptr<ProviderLoader> loader_;
 

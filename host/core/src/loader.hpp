@@ -60,6 +60,9 @@ public:
     // Loads the library of `location` now (once, as mi() would); its load
     // error, or "" when it is loaded.
     std::string preload(const std::string& location);
+    // An MI of the host's own under a provider name: mi() answers it, nothing is
+    // loaded, it is never unloaded, and shutdown() cleans it up like the others.
+    void addBuiltIn(const std::string& name, ProviderKind kind, void* mi);
     // The provider's record (after mi() succeeded once), for indication state.
     ProviderEntry* provider(const std::string& name);
 

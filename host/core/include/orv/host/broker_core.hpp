@@ -34,6 +34,7 @@
 #include <vector>
 
 #include "orv/repository/class_repository.hpp"
+#include "orv/repository/registration.hpp"
 
 namespace orv::host {
 
@@ -196,6 +197,13 @@ public:
     // class (each provider once, as sfcb keeps one flag per provider).
     Reply enableIndications(std::string_view ns, std::string_view className);
     Reply disableIndications(std::string_view ns, std::string_view className);
+
+    // Serves classes of `ns` through an MI of the host's own (no library): requests
+    // for them reach `mi` (a CMPIInstanceMI*, ... of `kind`) as they would reach a
+    // registered provider named `name`. Call before requests are sent; the MI must
+    // stay valid until shutdown(), which calls its cleanup like any provider's.
+    void addBuiltInProvider(const std::string& name, orv::repository::ProviderKind kind, void* mi,
+                            std::string_view ns, const std::vector<std::string>& classNames);
 
     // Subscribers receive every delivered indication; ids are never reused.
     std::uint64_t addIndicationSubscriber(IndicationSubscriber subscriber);
