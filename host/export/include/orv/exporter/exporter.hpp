@@ -17,6 +17,8 @@
 #include <memory>
 #include <string>
 #include <string_view>
+#include <utility>
+#include <vector>
 
 namespace orv::exporter {
 
@@ -48,9 +50,12 @@ struct ExporterConfig {
     // Verify the listener's certificate on https destinations.
     bool verifyPeer = true;
     std::string caFile;  // certificates to verify with; system default when empty
-    // Diagnostics: a line per change of a destination's state (reachable, failing)
-    // at Warning/Info, and one per delivery at Debug. Called from sender threads.
+    // Diagnostics: a line per change of a destination's state (failing, reachable
+    // again, queue overflowing) at Warning/Info, and one per delivery at Debug. Called
+    // from sender threads and, for an overflowing queue, from submit(); lines below
+    // logLevel are not even formatted.
     std::function<void(ExportLogLevel, std::string_view)> log;
+    ExportLogLevel logLevel = ExportLogLevel::Info;
 };
 
 class Exporter {
@@ -75,6 +80,8 @@ public:
     void setFatalErrorHandler(std::function<void(const std::string& subscriptionId, OnFatalError)> handler);
 
     SubscriptionCounts counts(const std::string& subscriptionId) const;
+    // Every subscription's counts, by subscription id in id order (for a summary at shutdown).
+    std::vector<std::pair<std::string, SubscriptionCounts>> allCounts() const;
     // Forgets a subscription's counts (after it was deleted).
     void forget(const std::string& subscriptionId);
 
@@ -91,5 +98,8 @@ private:
 
 // Whether https destinations can be reached with this build.
 bool tlsSupported() noexcept;
+
+// Whether url can be a destination of this exporter; *why says what is wrong with it.
+bool validDestinationUrl(std::string_view url, std::string* why = nullptr);
 
 }  // namespace orv::exporter
