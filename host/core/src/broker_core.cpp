@@ -115,6 +115,8 @@ const orv::repository::ClassRepository& BrokerCore::classes() const noexcept { r
 
 std::vector<std::string> BrokerCore::preloadProviders() { return impl_->services.preloadProviders(); }
 
+std::vector<std::string> BrokerCore::createAllProviders() { return impl_->services.createAllProviders(); }
+
 namespace {
 
 Reply send(detail::CoreServices& services, Request request, const CallOptions& opts) {

@@ -85,6 +85,25 @@ std::vector<std::string> CoreServices::preloadProviders() {
     return failures;
 }
 
+std::vector<std::string> CoreServices::createAllProviders() {
+    constexpr ProviderKind kKinds[] = {ProviderKind::Instance, ProviderKind::Association, ProviderKind::Method,
+                                       ProviderKind::Property, ProviderKind::Indication};
+    std::vector<std::string> failures;
+    std::set<std::string> seen;
+    for (const ProviderRegistration* reg : registrations_) {
+        for (ProviderKind kind : kKinds) {
+            if (!reg->has(kind) || !seen.insert(reg->provider + "/" + kindName(kind)).second) {
+                continue;
+            }
+            std::string error;
+            if (loader_->mi(*reg, kind, &error) == nullptr) {
+                failures.push_back(std::move(error));
+            }
+        }
+    }
+    return failures;
+}
+
 const std::vector<std::string>* CoreServices::keyNames(std::string_view ns, std::string_view className) const {
     std::string cacheKey = lowerCase(ns) + ":" + lowerCase(className);
     std::lock_guard lock(keyMutex_);

@@ -100,6 +100,8 @@ public:
                     const std::vector<std::string>& classNames);
     // Loads each registered library once; the errors of those that failed.
     std::vector<std::string> preloadProviders();
+    // Creates every registration's MIs; the errors of those that failed.
+    std::vector<std::string> createAllProviders();
 
     // ClassSource
     const std::vector<std::string>* keyNames(std::string_view ns, std::string_view className) const override;

@@ -34,6 +34,15 @@ struct HostConfig {
     // Longest a request may wait for its providers (0: no limit); see CimDispatcher.
     std::chrono::seconds providerCallLimit{60};
     std::string hostName;  // HOST of instance paths in responses; empty: this machine's name
+
+    // Indications.
+    std::filesystem::path stateDir;    // where subscriptions are kept across restarts
+    std::filesystem::path interopMof;  // classes of root/interop
+    bool preload = false;              // load (and initialize) every registered provider at start
+    unsigned deliveryRetryAttempts = 3;
+    std::chrono::seconds deliveryRetryInterval{20};
+    std::size_t indicationQueueLimit = 1000;       // per destination
+    std::chrono::seconds indicationFlushTimeout{5};  // at shutdown, for what is queued
 };
 
 // Bad configuration input; what() is one line naming the file and line or the option.

@@ -152,6 +152,10 @@ public:
     // so that a host can refuse to start on a broken one. Returns one line per
     // library that failed: "cannot load provider library <path>: <dlerror text>".
     std::vector<std::string> preloadProviders();
+    // Creates the MI of every registration and kind now (factories and their
+    // initialize, as a first request would), so that threads providers start there
+    // run from the start. Returns the error of each MI that could not be created.
+    std::vector<std::string> createAllProviders();
 
     // Instance operations. The namespace is the path's namespace.
     Reply enumerateInstances(const CMPIObjectPath* classPath, const CallOptions& opts = {});
