@@ -302,18 +302,25 @@ struct InteropProvider::Impl {
         return std::nullopt;
     }
 
-    // Keys compare without regard to case for names; references by their Name keys.
+    // Keys compare without regard to case, references by their Name keys. The keys
+    // naming the scoping system and object manager are not compared: the host is the
+    // only system, and it writes its own name into what clients create.
     static bool sameKeys(const CMPIObjectPath* ours, const CMPIObjectPath* asked) {
         CMPICount count = ours->ft->getKeyCount(ours, nullptr);
         for (CMPICount i = 0; i < count; ++i) {
-            CMPIString* name = nullptr;
-            CMPIData mine = ours->ft->getKeyAt(ours, i, &name, nullptr);
-            CMPIData theirs = asked->ft->getKey(asked, text(name).c_str(), nullptr);
+            CMPIString* nameString = nullptr;
+            CMPIData mine = ours->ft->getKeyAt(ours, i, &nameString, nullptr);
+            const std::string name = text(nameString);
+            if (same(name, "SystemName") || same(name, "SystemCreationClassName") || same(name, "ObjectManagerName") ||
+                same(name, "ObjectManagerCreationClassName")) {
+                continue;
+            }
+            CMPIData theirs = asked->ft->getKey(asked, name.c_str(), nullptr);
+            if ((theirs.state & CMPI_notFound) != 0 && same(name, "CreationClassName")) {
+                continue;  // the class of the path says it already
+            }
             if ((theirs.state & CMPI_notFound) != 0) {
-                if (same(text(name), "Name") || mine.type == CMPI_ref || same(text(name), "InstanceID")) {
-                    return false;  // the identifying keys must be given
-                }
-                continue;  // system keys may be left out
+                return false;
             }
             if (mine.type == CMPI_ref) {
                 if (!same(refName(mine), refName(theirs))) {
