@@ -1,19 +1,16 @@
 #include "orv/indication/interop_provider.hpp"
 
-#include <strings.h>
-
 #include <functional>
 #include <optional>
 
+#include "names.hpp"
 #include "orv/repository/class_repository.hpp"
 
 namespace orv::indication {
 
 namespace {
 
-bool same(std::string_view a, std::string_view b) {
-    return a.size() == b.size() && strncasecmp(a.data(), b.data(), a.size()) == 0;
-}
+constexpr auto same = detail::equalsNoCase;
 
 std::string text(const CMPIString* s) { return s != nullptr && s->hdl != nullptr ? static_cast<const char*>(s->hdl) : ""; }
 

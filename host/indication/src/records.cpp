@@ -3,19 +3,13 @@
 #include <charconv>
 #include <map>
 
+#include "names.hpp"
+
 namespace orv::indication {
 
 namespace {
 
-std::string lower(std::string_view text) {
-    std::string out(text);
-    for (char& c : out) {
-        if (c >= 'A' && c <= 'Z') {
-            c = static_cast<char>(c - 'A' + 'a');
-        }
-    }
-    return out;
-}
+using detail::lowerCase;
 
 std::string escaped(std::string_view value) {
     std::string out;
@@ -129,11 +123,11 @@ std::string storedText(const SubscriptionRecord& s) {
         .take();
 }
 
-std::string storeId(const FilterRecord& filter) { return "filter:" + lower(filter.name); }
-std::string storeId(const DestinationRecord& destination) { return "destination:" + lower(destination.name); }
+std::string storeId(const FilterRecord& filter) { return "filter:" + lowerCase(filter.name); }
+std::string storeId(const DestinationRecord& destination) { return "destination:" + lowerCase(destination.name); }
 std::string storeId(const SubscriptionRecord& s) {
     // The filter name's length keeps the pair unambiguous whatever the names hold.
-    return "subscription:" + std::to_string(s.filterName.size()) + ":" + lower(s.filterName) + lower(s.handlerName);
+    return "subscription:" + std::to_string(s.filterName.size()) + ":" + lowerCase(s.filterName) + lowerCase(s.handlerName);
 }
 
 ParsedRecord parseStored(std::string_view text, std::string* error) {

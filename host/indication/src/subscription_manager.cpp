@@ -5,22 +5,14 @@
 #include "orv/cimxml/object_encoder.hpp"
 #include "orv/host/wql.hpp"
 #include "orv/repository/class_repository.hpp"
+#include "names.hpp"
 
 namespace orv::indication {
 
 namespace {
 
-std::string lower(std::string_view text) {
-    std::string out(text);
-    for (char& c : out) {
-        if (c >= 'A' && c <= 'Z') {
-            c = static_cast<char>(c - 'A' + 'a');
-        }
-    }
-    return out;
-}
-
-bool sameName(std::string_view a, std::string_view b) { return lower(a) == lower(b); }
+using detail::lowerCase;
+constexpr auto sameName = detail::equalsNoCase;
 
 Status refused(CMPIrc rc, std::string message) { return Status{rc, std::move(message)}; }
 
@@ -138,8 +130,8 @@ void SubscriptionManager::publishSnapshot() {
             }
         }
         if (!kept) {
-            const FilterRecord& filter = filters_.at(lower(subscription.filterName));
-            const DestinationRecord& destination = destinations_.at(lower(subscription.handlerName));
+            const FilterRecord& filter = filters_.at(lowerCase(subscription.filterName));
+            const DestinationRecord& destination = destinations_.at(lowerCase(subscription.handlerName));
             kept = std::make_shared<Active>(id, host::WqlQuery::parse(filter.query), filter.sourceNamespace,
                                             destination.destination, policyOf(subscription));
         }
@@ -212,14 +204,14 @@ Status SubscriptionManager::createFilter(FilterRecord filter, const std::string&
         return status;
     }
     std::lock_guard lock(mutex_);
-    if (filters_.count(lower(filter.name)) != 0) {
+    if (filters_.count(lowerCase(filter.name)) != 0) {
         return refused(CMPI_RC_ERR_ALREADY_EXISTS, "filter " + filter.name + " already exists");
     }
     if (Status status = persist(storeId(filter), storedText(filter)); !status.ok()) {
         return status;
     }
     log(Severity::Info, "filter " + filter.name + " created: " + filter.query);
-    filters_.emplace(lower(filter.name), std::move(filter));
+    filters_.emplace(lowerCase(filter.name), std::move(filter));
     return {};
 }
 
@@ -237,21 +229,21 @@ Status SubscriptionManager::createDestination(DestinationRecord destination) {
         return refused(CMPI_RC_ERR_NOT_SUPPORTED, "only the CIM-XML protocol (2) is supported");
     }
     std::lock_guard lock(mutex_);
-    if (destinations_.count(lower(destination.name)) != 0) {
+    if (destinations_.count(lowerCase(destination.name)) != 0) {
         return refused(CMPI_RC_ERR_ALREADY_EXISTS, "destination " + destination.name + " already exists");
     }
     if (Status status = persist(storeId(destination), storedText(destination)); !status.ok()) {
         return status;
     }
     log(Severity::Info, "destination " + destination.name + " created: " + destination.destination);
-    destinations_.emplace(lower(destination.name), std::move(destination));
+    destinations_.emplace(lowerCase(destination.name), std::move(destination));
     return {};
 }
 
 // Under mutex_: the first enabled subscription of a filter activates it at the providers.
 Status SubscriptionManager::activate(const SubscriptionRecord& subscription, const std::string& principal) {
-    const FilterRecord& filter = filters_.at(lower(subscription.filterName));
-    unsigned& users = filterUse_[lower(filter.name)];
+    const FilterRecord& filter = filters_.at(lowerCase(subscription.filterName));
+    unsigned& users = filterUse_[lowerCase(filter.name)];
     if (users == 0) {
         host::CallOptions caller;
         caller.principal = principal;
@@ -268,7 +260,7 @@ Status SubscriptionManager::activate(const SubscriptionRecord& subscription, con
 }
 
 void SubscriptionManager::deactivate(const SubscriptionRecord& subscription) {
-    const std::string key = lower(subscription.filterName);
+    const std::string key = lowerCase(subscription.filterName);
     unsigned& users = filterUse_[key];
     if (users == 0 || --users > 0) {
         return;
@@ -283,11 +275,11 @@ void SubscriptionManager::deactivate(const SubscriptionRecord& subscription) {
 
 Status SubscriptionManager::createSubscription(SubscriptionRecord subscription, const std::string& principal) {
     std::lock_guard lock(mutex_);
-    auto filter = filters_.find(lower(subscription.filterName));
+    auto filter = filters_.find(lowerCase(subscription.filterName));
     if (filter == filters_.end()) {
         return refused(CMPI_RC_ERR_NOT_FOUND, "Filter not found: " + subscription.filterName);
     }
-    auto destination = destinations_.find(lower(subscription.handlerName));
+    auto destination = destinations_.find(lowerCase(subscription.handlerName));
     if (destination == destinations_.end()) {
         return refused(CMPI_RC_ERR_NOT_FOUND, "Handler not found: " + subscription.handlerName);
     }
@@ -321,7 +313,7 @@ Status SubscriptionManager::createSubscription(SubscriptionRecord subscription, 
 
 Status SubscriptionManager::deleteFilter(std::string_view name) {
     std::lock_guard lock(mutex_);
-    auto found = filters_.find(lower(name));
+    auto found = filters_.find(lowerCase(name));
     if (found == filters_.end()) {
         return refused(CMPI_RC_ERR_NOT_FOUND, "Filter not found: " + std::string(name));
     }
@@ -341,7 +333,7 @@ Status SubscriptionManager::deleteFilter(std::string_view name) {
 
 Status SubscriptionManager::deleteDestination(std::string_view name) {
     std::lock_guard lock(mutex_);
-    auto found = destinations_.find(lower(name));
+    auto found = destinations_.find(lowerCase(name));
     if (found == destinations_.end()) {
         return refused(CMPI_RC_ERR_NOT_FOUND, "Handler not found: " + std::string(name));
     }
@@ -419,9 +411,9 @@ std::vector<std::string> SubscriptionManager::restore() {
                 problems.push_back("stored filter " + parsed.filter->name + ": " + status.message);
                 continue;
             }
-            filters_.emplace(lower(parsed.filter->name), std::move(*parsed.filter));
+            filters_.emplace(lowerCase(parsed.filter->name), std::move(*parsed.filter));
         } else if (parsed.destination) {
-            destinations_.emplace(lower(parsed.destination->name), std::move(*parsed.destination));
+            destinations_.emplace(lowerCase(parsed.destination->name), std::move(*parsed.destination));
         } else if (parsed.subscription) {
             pending.push_back(std::move(*parsed.subscription));
         } else {
@@ -429,8 +421,8 @@ std::vector<std::string> SubscriptionManager::restore() {
         }
     }
     for (SubscriptionRecord& subscription : pending) {
-        if (filters_.count(lower(subscription.filterName)) == 0 ||
-            destinations_.count(lower(subscription.handlerName)) == 0) {
+        if (filters_.count(lowerCase(subscription.filterName)) == 0 ||
+            destinations_.count(lowerCase(subscription.handlerName)) == 0) {
             problems.push_back("stored subscription " + subscription.id() + ": its filter or destination is missing");
             continue;
         }
@@ -447,43 +439,48 @@ std::vector<std::string> SubscriptionManager::restore() {
     return problems;
 }
 
-std::vector<FilterRecord> SubscriptionManager::filters() const {
-    std::lock_guard lock(mutex_);
-    std::vector<FilterRecord> out;
-    for (const auto& [key, filter] : filters_) {
-        out.push_back(filter);
+namespace {
+
+template <class Record>
+std::vector<Record> valuesOf(const std::map<std::string, Record>& records) {
+    std::vector<Record> out;
+    for (const auto& [key, record] : records) {
+        out.push_back(record);
     }
     return out;
+}
+
+template <class Record>
+std::optional<Record> findIn(const std::map<std::string, Record>& records, const std::string& key) {
+    auto found = records.find(key);
+    return found != records.end() ? std::optional(found->second) : std::nullopt;
+}
+
+}  // namespace
+
+std::vector<FilterRecord> SubscriptionManager::filters() const {
+    std::lock_guard lock(mutex_);
+    return valuesOf(filters_);
 }
 
 std::vector<DestinationRecord> SubscriptionManager::destinations() const {
     std::lock_guard lock(mutex_);
-    std::vector<DestinationRecord> out;
-    for (const auto& [key, destination] : destinations_) {
-        out.push_back(destination);
-    }
-    return out;
+    return valuesOf(destinations_);
 }
 
 std::vector<SubscriptionRecord> SubscriptionManager::subscriptions() const {
     std::lock_guard lock(mutex_);
-    std::vector<SubscriptionRecord> out;
-    for (const auto& [key, subscription] : subscriptions_) {
-        out.push_back(subscription);
-    }
-    return out;
+    return valuesOf(subscriptions_);
 }
 
 std::optional<FilterRecord> SubscriptionManager::filter(std::string_view name) const {
     std::lock_guard lock(mutex_);
-    auto found = filters_.find(lower(name));
-    return found != filters_.end() ? std::optional(found->second) : std::nullopt;
+    return findIn(filters_, lowerCase(name));
 }
 
 std::optional<DestinationRecord> SubscriptionManager::destination(std::string_view name) const {
     std::lock_guard lock(mutex_);
-    auto found = destinations_.find(lower(name));
-    return found != destinations_.end() ? std::optional(found->second) : std::nullopt;
+    return findIn(destinations_, lowerCase(name));
 }
 
 std::optional<SubscriptionRecord> SubscriptionManager::subscription(std::string_view filterName,
@@ -492,8 +489,7 @@ std::optional<SubscriptionRecord> SubscriptionManager::subscription(std::string_
     probe.filterName = std::string(filterName);
     probe.handlerName = std::string(handlerName);
     std::lock_guard lock(mutex_);
-    auto found = subscriptions_.find(storeId(probe));
-    return found != subscriptions_.end() ? std::optional(found->second) : std::nullopt;
+    return findIn(subscriptions_, storeId(probe));
 }
 
 }  // namespace orv::indication
