@@ -92,7 +92,6 @@ CimHost::CimHost(const HostConfig& config) : impl_(std::make_unique<Impl>()) {
     if (config.preload) {
         detail::createAllProviders(*impl_->core);
     }
-    impl_->indications->restore();
     impl_->dispatcher = std::make_unique<CimDispatcher>(*impl_->core, impl_->core->classes(), hostName,
                                                         config.providerCallLimit);
     const CimDispatcher* dispatcher = impl_->dispatcher.get();
@@ -101,6 +100,9 @@ CimHost::CimHost(const HostConfig& config) : impl_(std::make_unique<Impl>()) {
         [dispatcher](const http::Request& request) { return handleCimRequest(request, *dispatcher); },
         logRequest);
     impl_->server->bind();
+    // Subscriptions are activated once the host is sure to serve: a start that fails
+    // (port taken) activates nothing and says only why it failed.
+    impl_->indications->restore();
 }
 
 CimHost::~CimHost() {
