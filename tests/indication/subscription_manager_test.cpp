@@ -142,6 +142,28 @@ TEST_F(SubscriptionManagerTest, MatchingIndicationsReachTheSinkWithTheSelectList
     EXPECT_EQ(m.matchCounts().at("f -> d"), 1U);
 }
 
+TEST_F(SubscriptionManagerTest, EachSubscriptionGetsTheIndicationWithItsOwnSelectList) {
+    SubscriptionManager& m = startManager();
+    ASSERT_TRUE(m.createFilter(filter("all", "SELECT * FROM Raw_Indication")).ok());
+    ASSERT_TRUE(m.createFilter(filter("seq", "SELECT Sequence FROM Raw_Indication")).ok());
+    ASSERT_TRUE(m.createFilter(filter("all2", "SELECT * FROM Raw_Indication")).ok());
+    ASSERT_TRUE(m.createDestination(destination("d")).ok());
+    for (const char* name : {"all", "seq", "all2"}) {
+        ASSERT_TRUE(m.createSubscription(subscription(name, "d")).ok());
+    }
+    raise("Raw_Indication", 7, "text");
+    auto items = sink_.items();
+    ASSERT_EQ(items.size(), 3U);
+    for (const auto& item : items) {
+        EXPECT_THAT(item.xml, HasSubstr("<VALUE>7</VALUE>"));
+        if (item.subscriptionId == "seq -> d") {
+            EXPECT_THAT(item.xml, Not(HasSubstr("Message")));
+        } else {
+            EXPECT_THAT(item.xml, HasSubstr("<VALUE>text</VALUE>")) << item.subscriptionId;
+        }
+    }
+}
+
 TEST_F(SubscriptionManagerTest, FilterOnAParentClassMatchesSubclassIndicationsOfItsNamespaceOnly) {
     SubscriptionManager& m = startManager();
     ASSERT_TRUE(m.createFilter(filter("all", "SELECT * FROM Raw_Indication")).ok());

@@ -1,5 +1,6 @@
 #include "orv/indication/subscription_manager.hpp"
 
+#include <algorithm>
 #include <ctime>
 
 #include "orv/cimxml/object_encoder.hpp"
@@ -83,24 +84,32 @@ exporter::DeliveryPolicy SubscriptionManager::policyOf(const SubscriptionRecord&
 }
 
 // On the provider's thread: read the snapshot, match, encode, hand over. The sink
-// only queues, so this costs the matching and the encoding of matched indications.
+// only queues, so this costs the matching and the encoding; subscriptions with the
+// same SELECT list share one encoding of the indication.
 void SubscriptionManager::deliver(std::string_view ns, const CMPIInstance* indication) {
     if (!delivering_.load(std::memory_order_relaxed)) {
         return;
     }
     std::shared_ptr<const Snapshot> snapshot = std::atomic_load(&snapshot_);
+    std::vector<std::pair<const std::vector<std::string>*, std::string>> encoded;
     for (const std::shared_ptr<Active>& active : snapshot->active) {
         if (!sameName(active->sourceNamespace, ns) || !active->query.matches(indication)) {
             continue;
         }
         active->matched.fetch_add(1, std::memory_order_relaxed);
-        cimxml::InstanceEncoding encoding;
-        if (!active->query.selectList().empty()) {
-            encoding.propertyList = active->query.selectList();
+        const std::vector<std::string>& selectList = active->query.selectList();
+        auto done = std::find_if(encoded.begin(), encoded.end(),
+                                 [&selectList](const auto& item) { return *item.first == selectList; });
+        if (done == encoded.end()) {
+            cimxml::InstanceEncoding encoding;
+            if (!selectList.empty()) {
+                encoding.propertyList = selectList;
+            }
+            cimxml::XmlWriter out;
+            cimxml::writeInstance(out, indication, encoding);
+            done = encoded.emplace(encoded.end(), &selectList, out.take());
         }
-        cimxml::XmlWriter out;
-        cimxml::writeInstance(out, indication, encoding);
-        sink_(active->id, active->url, out.take(), active->policy);
+        sink_(active->id, active->url, done->second, active->policy);
     }
 }
 
