@@ -92,6 +92,19 @@ TEST(Exporter, AConnectionTheListenerClosedWhileIdleIsOpenedAgainWithoutARetry) 
     EXPECT_EQ(exporter.counts("s").retried, 0U);
 }
 
+TEST(Exporter, AnIdleSenderEndsAndANewOneTakesTheNextIndication) {
+    TestListener listener;
+    ExporterConfig config;
+    config.idleTimeout = 20ms;
+    Exporter exporter(config);
+    for (int round = 0; round < 3; ++round) {
+        exporter.submit("s", listener.url(), indicationXml("Round" + std::to_string(round)), quickPolicy(0));
+        ASSERT_TRUE(eventually([&] { return exporter.counts("s").delivered == static_cast<unsigned>(round + 1); }));
+        std::this_thread::sleep_for(60ms);  // the sender has ended by now
+    }
+    EXPECT_EQ(listener.accepted(), (std::vector<std::string>{"Round0", "Round1", "Round2"}));
+}
+
 TEST(Exporter, KeepsTheOrderOfIndicationsPerDestination) {
     TestListener listener;
     Exporter exporter;

@@ -14,33 +14,11 @@ bool sameText(std::string_view a, std::string_view b) {
     return a.size() == b.size() && strncasecmp(a.data(), b.data(), a.size()) == 0;
 }
 
-std::string_view trimmed(std::string_view text) {
-    while (!text.empty() && (text.front() == ' ' || text.front() == '\t')) {
-        text.remove_prefix(1);
-    }
-    while (!text.empty() && (text.back() == ' ' || text.back() == '\t')) {
-        text.remove_suffix(1);
-    }
-    return text;
-}
-
 http::Response cimFailure(int status, std::string_view cimError) {
     http::Response response;
     response.status = status;
     response.headers.emplace_back("CIMError", std::string(cimError));
     return response;
-}
-
-std::pair<int, std::string_view> protocolFailure(ProtocolError::Kind kind) {
-    switch (kind) {
-        case ProtocolError::Kind::NotWellFormed: return {400, "request-not-well-formed"};
-        case ProtocolError::Kind::NotValid: return {400, "request-not-valid"};
-        case ProtocolError::Kind::UnsupportedCimVersion: return {501, "unsupported-cim-version"};
-        case ProtocolError::Kind::UnsupportedDtdVersion: return {501, "unsupported-dtd-version"};
-        case ProtocolError::Kind::UnsupportedProtocolVersion: return {501, "unsupported-protocol-version"};
-        case ProtocolError::Kind::MultipleRequestsUnsupported: return {501, "multiple-requests-unsupported"};
-    }
-    return {400, "request-not-valid"};
 }
 
 int hexDigit(char c) {
@@ -65,7 +43,7 @@ bool objectHeaderMatches(const http::Request& request, const cimxml::CimRequest&
     if (!cim.intrinsic) {
         return true;  // an object path; its namespace was checked by the parser
     }
-    std::string decoded = percentDecode(trimmed(*header));
+    std::string decoded = percentDecode(http::trimBlanks(*header));
     while (!decoded.empty() && decoded.front() == '/') {
         decoded.erase(0, 1);
     }
@@ -103,23 +81,21 @@ std::string percentDecode(std::string_view text) {
 
 http::Response handleCimRequest(const http::Request& request, const CimDispatcher& dispatcher,
                                 const cimxml::XmlLimits& limits) {
-    const std::string* operation = request.header("CIMOperation");
-    if (operation == nullptr || !sameText(trimmed(*operation), "MethodCall")) {
+    if (!request.headerIs("CIMOperation", "MethodCall")) {
         return cimFailure(400, "unsupported-operation");
     }
     const std::string* version = request.header("CIMProtocolVersion");
-    if (version != nullptr && trimmed(*version).substr(0, 2) != "1.") {
+    if (version != nullptr && http::trimBlanks(*version).substr(0, 2) != "1.") {
         return cimFailure(501, "unsupported-protocol-version");
     }
     cimxml::CimRequest cim;
     try {
         cim = cimxml::parseRequest(request.body, limits);
     } catch (const ProtocolError& error) {
-        auto [status, cimError] = protocolFailure(error.kind());
-        return cimFailure(status, cimError);
+        const cimxml::HttpFailure failure = cimxml::httpFailure(error.kind());
+        return cimFailure(failure.status, failure.cimError);
     }
-    const std::string* method = request.header("CIMMethod");
-    if (method == nullptr || !sameText(trimmed(*method), cim.methodName) || !objectHeaderMatches(request, cim)) {
+    if (!request.headerIs("CIMMethod", cim.methodName) || !objectHeaderMatches(request, cim)) {
         return cimFailure(400, "header-mismatch");
     }
     return success(dispatcher.respond(cim, request.user));

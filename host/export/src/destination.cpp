@@ -12,8 +12,12 @@ constexpr std::chrono::milliseconds kInterruptPeriod{10};
 }  // namespace
 
 Destination::Destination(std::string url, const DestinationUrl& parsed, const SenderOptions& options,
-                         std::size_t queueLimit, DeliveryEvents& events)
-    : url_(std::move(url)), queueLimit_(queueLimit), events_(events), sender_(parsed, options) {
+                         std::size_t queueLimit, std::chrono::milliseconds idleTimeout, DeliveryEvents& events)
+    : url_(std::move(url)),
+      queueLimit_(queueLimit),
+      idleTimeout_(idleTimeout),
+      events_(events),
+      sender_(parsed, options) {
     thread_ = std::thread([this] { run(); });
 }
 
@@ -22,14 +26,17 @@ Destination::~Destination() {
     stopAndJoin();
 }
 
-bool Destination::enqueue(QueuedIndication indication) {
+Destination::Enqueued Destination::enqueue(QueuedIndication& indication) {
     bool startsOverflow = false;
     {
         std::lock_guard lock(mutex_);
+        if (finished_) {
+            return Enqueued::SenderEnded;
+        }
         if (!stopping_ && queue_.size() < queueLimit_) {
             queue_.push_back(std::move(indication));
             wake_.notify_one();
-            return true;
+            return Enqueued::Yes;
         }
         startsOverflow = !stopping_ && !overflowing_;
         overflowing_ = overflowing_ || startsOverflow;
@@ -38,7 +45,12 @@ bool Destination::enqueue(QueuedIndication indication) {
         events_.log(ExportLogLevel::Warning, "queue for " + url_ + " is full (" + std::to_string(queueLimit_) +
                                                  " indications): dropping new indications");
     }
-    return false;
+    return Enqueued::QueueFull;
+}
+
+bool Destination::ended() {
+    std::lock_guard lock(mutex_);
+    return finished_;
 }
 
 void Destination::beginShutdown(Clock::time_point deadline) {
@@ -81,7 +93,10 @@ void Destination::dropQueued(std::unique_lock<std::mutex>& lock) {
 
 bool Destination::nextIndication(QueuedIndication& out) {
     std::unique_lock lock(mutex_);
-    wake_.wait(lock, [this] { return !queue_.empty() || stopping_; });
+    if (!wake_.wait_for(lock, idleTimeout_, [this] { return !queue_.empty() || stopping_; })) {
+        finished_ = true;  // idle: the thread and its connection go until the next indication
+        return false;
+    }
     if (pastDeadline()) {
         dropQueued(lock);
     }

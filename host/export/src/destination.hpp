@@ -42,13 +42,17 @@ struct QueuedIndication {
 class Destination {
 public:
     Destination(std::string url, const DestinationUrl& parsed, const SenderOptions& options,
-                std::size_t queueLimit, DeliveryEvents& events);
+                std::size_t queueLimit, std::chrono::milliseconds idleTimeout, DeliveryEvents& events);
     ~Destination();
     Destination(const Destination&) = delete;
     Destination& operator=(const Destination&) = delete;
 
-    // Queues the indication; false when the queue is full (nothing queued).
-    bool enqueue(QueuedIndication indication);
+    enum class Enqueued { Yes, QueueFull, SenderEnded };
+    // Queues the indication; nothing is queued when the queue is full or when the
+    // sender has ended (idle too long, or shut down).
+    Enqueued enqueue(QueuedIndication& indication);
+    // True once the sender has ended; the destination can then be replaced.
+    bool ended();
     // Lets the sender deliver what is queued until the deadline, then drop the rest.
     void beginShutdown(Clock::time_point deadline);
     // Waits until the sender has ended or the deadline passed; true when it has ended.
@@ -68,6 +72,7 @@ private:
 
     const std::string url_;
     const std::size_t queueLimit_;
+    const std::chrono::milliseconds idleTimeout_;
     DeliveryEvents& events_;
     HttpSender sender_;
 

@@ -74,8 +74,12 @@ struct Exporter::Impl final : DeliveryEvents {
 
 Destination* Exporter::Impl::destinationFor(const std::string& url) {
     if (auto found = destinations.find(url); found != destinations.end()) {
-        return found->second.get();
+        if (!found->second->ended()) {
+            return found->second.get();
+        }
+        destinations.erase(found);
     }
+    std::erase_if(destinations, [](const auto& entry) { return entry.second->ended(); });
     std::string why;
     std::optional<DestinationUrl> parsed = parseDestinationUrl(url, &why);
     if (parsed && parsed->https && !tlsSupported()) {
@@ -88,7 +92,8 @@ Destination* Exporter::Impl::destinationFor(const std::string& url) {
         }
         return nullptr;
     }
-    auto destination = std::make_unique<Destination>(url, *parsed, senderOptions, config.queueLimit, *this);
+    auto destination =
+        std::make_unique<Destination>(url, *parsed, senderOptions, config.queueLimit, config.idleTimeout, *this);
     return destinations.emplace(url, std::move(destination)).first->second.get();
 }
 
@@ -103,9 +108,18 @@ void Exporter::submit(const std::string& subscriptionId, const std::string& dest
     bool queued = false;
     {
         std::lock_guard lock(impl_->mutex);
-        Destination* destination = impl_->stopped ? nullptr : impl_->destinationFor(destinationUrl);
-        if (destination != nullptr) {
-            queued = destination->enqueue(QueuedIndication{subscriptionId, std::move(instanceXml), policy});
+        QueuedIndication indication{subscriptionId, std::move(instanceXml), policy};
+        // A sender that has just ended for being idle is replaced by a new one.
+        for (int attempt = 0; attempt < 2 && !impl_->stopped && !queued; ++attempt) {
+            Destination* destination = impl_->destinationFor(destinationUrl);
+            if (destination == nullptr) {
+                break;
+            }
+            const Destination::Enqueued result = destination->enqueue(indication);
+            queued = result == Destination::Enqueued::Yes;
+            if (result == Destination::Enqueued::QueueFull) {
+                break;
+            }
         }
     }
     if (!queued) {

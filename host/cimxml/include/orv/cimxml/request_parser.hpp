@@ -30,6 +30,13 @@ private:
     Kind kind_;
 };
 
+// The HTTP status and CIMError header value that answer a ProtocolError.
+struct HttpFailure {
+    int status;
+    std::string_view cimError;
+};
+HttpFailure httpFailure(ProtocolError::Kind kind) noexcept;
+
 // Parses the body; throws ProtocolError.
 CimRequest parseRequest(std::string_view body, const XmlLimits& limits = {});
 

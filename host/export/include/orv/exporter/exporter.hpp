@@ -47,6 +47,9 @@ struct ExporterConfig {
     std::size_t queueLimit = 1000;
     std::chrono::milliseconds connectTimeout{5000};
     std::chrono::milliseconds readTimeout{10000};
+    // A sender with nothing to send for this long ends, closing its connection; the
+    // next indication for its destination starts a new one.
+    std::chrono::milliseconds idleTimeout{60000};
     // Verify the listener's certificate on https destinations.
     bool verifyPeer = true;
     std::string caFile;  // certificates to verify with; system default when empty
@@ -67,7 +70,7 @@ public:
     Exporter& operator=(const Exporter&) = delete;
 
     // Never blocks on the network: queues the indication for the destination's
-    // sender thread (started on the first submit to that URL). instanceXml is the
+    // sender thread (started on the first submit to that URL, or after it was idle). instanceXml is the
     // CIM-XML <INSTANCE> element of the indication, with the property list already
     // applied and embedded instances already encoded. After shutdown() the indication
     // is dropped and counted.

@@ -39,7 +39,13 @@ struct Request {
 
     // The first header of this name (any case), or nullptr.
     const std::string* header(std::string_view name) const noexcept;
+    // True when that header is present and its value, without surrounding blanks, is
+    // `expected` in any case.
+    bool headerIs(std::string_view name, std::string_view expected) const noexcept;
 };
+
+// A header value without the spaces and tabs around it.
+std::string_view trimBlanks(std::string_view text) noexcept;
 
 struct Response {
     int status = 200;
