@@ -468,6 +468,41 @@ static void* indicationThread(void* arg)
     return NULL;
 }
 
+static const char* argText(const CMPIArgs* in, const char* name, const char* otherwise)
+{
+    CMPIData d = in->ft->getArg(in, name, NULL);
+    return d.type == CMPI_string && d.state == CMPI_goodValue && d.value.string != NULL
+               ? (const char*)d.value.string->hdl
+               : otherwise;
+}
+
+static CMPIUint32 argUint(const CMPIArgs* in, const char* name, CMPIUint32 otherwise)
+{
+    CMPIData d = in->ft->getArg(in, name, NULL);
+    return d.type == CMPI_uint32 && d.state == CMPI_goodValue ? d.value.uint32 : otherwise;
+}
+
+/* Raise: Count indications (1 when not given) delivered on the calling thread. */
+static CMPIUint32 raiseIndications(const CMPIContext* ctx, const CMPIArgs* in)
+{
+    const char* cls = argText(in, "IndicationClass", "Raw_Indication");
+    const char* message = argText(in, "Message", "");
+    CMPIUint32 seq = argUint(in, "Sequence", 0);
+    CMPIUint32 count = argUint(in, "Count", 1), i, accepted = 0;
+    for (i = 0; i < count; ++i, ++seq) {
+        CMPIObjectPath* op = broker->eft->newObjectPath(broker, kNamespace, cls, NULL);
+        CMPIInstance* ind = broker->eft->newInstance(broker, op, NULL);
+        CMPIStatus st;
+        ind->ft->setProperty(ind, "Message", (const CMPIValue*)message, CMPI_chars);
+        ind->ft->setProperty(ind, "Sequence", (const CMPIValue*)&seq, CMPI_uint32);
+        st = broker->bft->deliverIndication(broker, ctx, kNamespace, ind);
+        accepted += st.rc == CMPI_RC_OK ? 1U : 0U;
+        ind->ft->release(ind);
+        op->ft->release(op);
+    }
+    return accepted;
+}
+
 static CMPIStatus methInvoke(CMPIMethodMI* mi, const CMPIContext* ctx, const CMPIResult* rslt,
                              const CMPIObjectPath* op, const char* method, const CMPIArgs* in, CMPIArgs* out)
 {
@@ -497,6 +532,8 @@ static CMPIStatus methInvoke(CMPIMethodMI* mi, const CMPIContext* ctx, const CMP
         pthread_create(&thread, NULL, indicationThread, &job);
         pthread_join(thread, NULL);
         answer = (CMPIUint32)job.delivered;
+    } else if (is(method, "Raise")) {
+        answer = raiseIndications(ctx, in);
     } else if (is(method, "UpCallGet")) {
         CMPIStatus st = {CMPI_RC_OK, NULL};
         CMPIObjectPath* path = elementPath("Raw_Element", "fetched");

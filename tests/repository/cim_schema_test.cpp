@@ -147,5 +147,42 @@ TEST(CimParentClasses, AgreeWithThePublishedSchema) {
     }
 }
 
+const ClassRepository& interop() {
+    static const ClassRepository repo = [] {
+        ClassRepository r;
+        r.loadFile(testing::sourceDir() / "cim/mof/interop/interop.mof");
+        return r;
+    }();
+    return repo;
+}
+
+constexpr std::string_view kInterop = "root/interop";
+
+TEST(InteropClasses, LoadIntoTheInteropNamespaceWithTheirKeys) {
+    EXPECT_FALSE(interop().hasNamespace(kNs));
+    EXPECT_EQ(interop().keyNames(kInterop, "CIM_IndicationFilter"),
+              (Names{"SystemCreationClassName", "SystemName", "CreationClassName", "Name"}));
+    EXPECT_EQ(interop().keyNames(kInterop, "CIM_IndicationSubscription"), (Names{"Filter", "Handler"}));
+    EXPECT_EQ(interop().keyNames(kInterop, "CIM_IndicationHandlerCIMXML"),
+              (Names{"SystemCreationClassName", "SystemName", "CreationClassName", "Name"}));
+    EXPECT_TRUE(interop().isA(kInterop, "CIM_IndicationHandlerCIMXML", "CIM_ListenerDestination"));
+    EXPECT_TRUE(interop().isA(kInterop, "CIM_ObjectManager", "CIM_Service"));
+    EXPECT_TRUE(interop().isAssociation(kInterop, "CIM_IndicationSubscription"));
+}
+
+TEST(InteropClasses, AgreeWithThePublishedSchema) {
+    const auto reference = testing::sourceDir() / "../shared/reference/cim-schema-2.28";
+    if (!std::filesystem::exists(reference / "cim_schema_2.28.0.mof")) {
+        GTEST_SKIP() << "reference schema not present at " << reference;
+    }
+    ClassRepository published;
+    published.loadFile(reference / "cim_schema_2.28.0.mof");
+    for (const auto& name : interop().classNames(kInterop, "", true)) {
+        const ClassDecl* theirs = published.getClass(kNs, name);
+        ASSERT_NE(theirs, nullptr) << name << " is not a 2.28 class";
+        expectSameClass(*interop().getClass(kInterop, name), *theirs);
+    }
+}
+
 }  // namespace
 }  // namespace orv::repository

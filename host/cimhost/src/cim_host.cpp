@@ -11,6 +11,7 @@
 #include "orv/cimhost/log.hpp"
 #include "orv/host/broker_core.hpp"
 #include "orv/http/http_server.hpp"
+#include "host_indications.hpp"
 #include "startup_checks.hpp"
 
 namespace orv::cimhost {
@@ -19,6 +20,7 @@ namespace fs = std::filesystem;
 
 struct CimHost::Impl {
     std::unique_ptr<host::BrokerCore> core;
+    std::unique_ptr<detail::HostIndications> indications;
     std::unique_ptr<CimDispatcher> dispatcher;
     std::unique_ptr<http::HttpServer> server;
     std::atomic<bool> stopRequested{false};
@@ -67,6 +69,9 @@ host::CoreConfig coreConfig(const HostConfig& config) {
     core.providerDirs = config.providerDirs;
     core.registrationFiles = config.registrationFiles;
     core.mofPaths = config.mofFiles;
+    if (!config.interopMof.empty()) {
+        core.mofPaths.push_back(config.interopMof);
+    }
     core.mofNamespace = config.mofNamespace;
     core.warningSink = [](const std::string& line) { logLine(LogLevel::Warning, line); };
     return core;
@@ -83,21 +88,31 @@ CimHost::CimHost(const HostConfig& config) : impl_(std::make_unique<Impl>()) {
         throw std::runtime_error(error.what());
     }
     detail::preloadProviders(*impl_->core);
-    impl_->dispatcher = std::make_unique<CimDispatcher>(
-        *impl_->core, impl_->core->classes(), config.hostName.empty() ? machineName() : config.hostName,
-        config.providerCallLimit, config.arrayNullElements);
+    const std::string hostName = config.hostName.empty() ? machineName() : config.hostName;
+    impl_->indications = std::make_unique<detail::HostIndications>(*impl_->core, config, hostName);
+    if (config.preload) {
+        detail::createAllProviders(*impl_->core);
+    }
+    impl_->dispatcher = std::make_unique<CimDispatcher>(*impl_->core, impl_->core->classes(), hostName,
+                                                        config.providerCallLimit, config.arrayNullElements);
     const CimDispatcher* dispatcher = impl_->dispatcher.get();
     impl_->server = std::make_unique<http::HttpServer>(
         serverOptions(config),
         [dispatcher](const http::Request& request) { return handleCimRequest(request, *dispatcher); },
         logRequest);
     impl_->server->bind();
+    // Subscriptions are activated once the host is sure to serve: a start that fails
+    // (port taken) activates nothing and says only why it failed.
+    impl_->indications->restore();
 }
 
 CimHost::~CimHost() {
     stop();
     if (impl_->dispatcher) {
         impl_->dispatcher->drain();
+    }
+    if (impl_->indications) {
+        impl_->indications->stop();
     }
     if (impl_->core) {
         impl_->core->shutdown();
@@ -114,7 +129,10 @@ void CimHost::run() {
         impl_->server->run();
     }
     impl_->runFinished.store(true);
+    // Stop order: no new requests, the requests in flight finished, the queued
+    // indications flushed (bounded), then the providers cleaned up and their threads joined.
     impl_->dispatcher->drain();
+    impl_->indications->stop();
     impl_->core->shutdown();
 }
 

@@ -61,6 +61,16 @@ cimxml::ArrayNullElements arrayNullElements(std::string_view value) {
     throw ConfigError("'" + std::string(value) + "' is not drop or value-null");
 }
 
+bool parseSwitch(std::string_view value) {
+    if (value == "true" || value == "yes" || value == "1") {
+        return true;
+    }
+    if (value == "false" || value == "no" || value == "0") {
+        return false;
+    }
+    throw ConfigError("'" + std::string(value) + "' is not true or false");
+}
+
 std::string platformName(std::string_view value) {
     if (value != "sim" && value != "linux") {
         throw ConfigError("'" + std::string(value) + "' is not sim or linux");
@@ -117,6 +127,27 @@ constexpr std::array kKeys = {
     ConfigKey{"arrayNullElements", "array-null-elements",
               "NULL array elements: drop (left out, as sfcb) or value-null (DSP0201 VALUE.NULL) (drop)",
               [](HostConfig& c, std::string_view v, Base) { c.arrayNullElements = arrayNullElements(v); }},
+    ConfigKey{"stateDir", "state-dir", "folder keeping indication subscriptions across restarts (<build>/state)",
+              [](HostConfig& c, std::string_view v, Base b) { c.stateDir = resolve(v, b); }},
+    ConfigKey{"interopMof", "interop-mof", "MOF of the root/interop classes (cim/mof/interop/interop.mof)",
+              [](HostConfig& c, std::string_view v, Base b) { c.interopMof = resolve(v, b); }},
+    ConfigKey{"preload", "preload", "load and initialize every registered provider at start (false)",
+              [](HostConfig& c, std::string_view v, Base) { c.preload = parseSwitch(v); }},
+    ConfigKey{"deliveryRetryAttempts", "delivery-retry-attempts",
+              "further attempts to deliver an indication after a failed one (3)",
+              [](HostConfig& c, std::string_view v, Base) { c.deliveryRetryAttempts = parseNumber<unsigned>(v, 0, 100); }},
+    ConfigKey{"deliveryRetryInterval", "delivery-retry-interval", "seconds between two delivery attempts (20)",
+              [](HostConfig& c, std::string_view v, Base) { c.deliveryRetryInterval = seconds(v); }},
+    ConfigKey{"indicationQueueLimit", "indication-queue-limit",
+              "indications waiting per destination before more are dropped (1000)",
+              [](HostConfig& c, std::string_view v, Base) {
+                  c.indicationQueueLimit = parseNumber<std::size_t>(v, 1, 1000000);
+              }},
+    ConfigKey{"indicationFlushTimeout", "indication-flush-timeout",
+              "seconds the queued indications get at shutdown before they are dropped (5)",
+              [](HostConfig& c, std::string_view v, Base) {
+                  c.indicationFlushTimeout = std::chrono::seconds(parseNumber<long>(v, 0, 3600));
+              }},
 };
 
 }  // namespace

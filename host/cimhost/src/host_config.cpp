@@ -24,6 +24,8 @@ HostConfig defaultConfig() {
     config.providerDirs = {fs::path(ORV_DEFAULT_PROVIDER_DIR)};
     config.registrationFiles = {fs::path(ORV_DEFAULT_MOF_DIR) / "orvprovider.reg"};
     config.mofFiles = {fs::path(ORV_DEFAULT_MOF_DIR) / "orvprovider.mof"};
+    config.interopMof = fs::path(ORV_DEFAULT_MOF_DIR) / "interop" / "interop.mof";
+    config.stateDir = fs::path(ORV_DEFAULT_STATE_DIR);
     return config;
 }
 
@@ -108,6 +110,10 @@ CommandLine parseCommandLine(int argc, const char* const* argv) {
         const std::string arg = argv[i];
         if (arg == "--help" || arg == "-h") {
             result.showHelp = true;
+            continue;
+        }
+        if (arg == "--preload") {
+            options.emplace_back("preload", "true");  // a switch: the value may be left out
             continue;
         }
         if (arg.rfind("--", 0) != 0) {

@@ -3,6 +3,8 @@
 #include <cstdlib>
 #include <stdexcept>
 
+#include "orv/cimhost/log.hpp"
+
 namespace orv::cimhost::detail {
 
 namespace fs = std::filesystem;
@@ -44,6 +46,12 @@ void preloadProviders(host::BrokerCore& core) {
     const std::vector<std::string> failures = core.preloadProviders();
     if (!failures.empty()) {
         startFailure(failures.front());
+    }
+}
+
+void createAllProviders(host::BrokerCore& core) {
+    for (const std::string& failure : core.createAllProviders()) {
+        logLine(LogLevel::Error, "preload: " + failure);
     }
 }
 

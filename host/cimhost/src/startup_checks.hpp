@@ -14,5 +14,8 @@ void checkInputFiles(const HostConfig& config);
 // libraries stay loaded for the requests); the first one that fails to load stops
 // the start with the dynamic loader's text.
 void preloadProviders(host::BrokerCore& core);
+// --preload: creates every registered provider's MIs now; each one that fails is
+// logged as an error and the host serves the others.
+void createAllProviders(host::BrokerCore& core);
 
 }  // namespace orv::cimhost::detail

@@ -115,6 +115,8 @@ const orv::repository::ClassRepository& BrokerCore::classes() const noexcept { r
 
 std::vector<std::string> BrokerCore::preloadProviders() { return impl_->services.preloadProviders(); }
 
+std::vector<std::string> BrokerCore::createAllProviders() { return impl_->services.createAllProviders(); }
+
 namespace {
 
 Reply send(detail::CoreServices& services, Request request, const CallOptions& opts) {
@@ -244,6 +246,11 @@ Reply BrokerCore::enableIndications(std::string_view ns, std::string_view classN
 
 Reply BrokerCore::disableIndications(std::string_view ns, std::string_view className) {
     return reply(impl_->services.indicationSwitch(ns, className, false));
+}
+
+void BrokerCore::addBuiltInProvider(const std::string& name, orv::repository::ProviderKind kind, void* mi,
+                                    std::string_view ns, const std::vector<std::string>& classNames) {
+    impl_->services.addBuiltIn(name, kind, mi, ns, classNames);
 }
 
 std::uint64_t BrokerCore::addIndicationSubscriber(IndicationSubscriber subscriber) {

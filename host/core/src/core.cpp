@@ -56,12 +56,47 @@ CoreServices::CoreServices(const CoreConfig& config) : broker_(makeBroker(this))
 
 CoreServices::~CoreServices() { loader_->shutdown(); }
 
+void CoreServices::addBuiltIn(const std::string& name, ProviderKind kind, void* mi, std::string_view ns,
+                              const std::vector<std::string>& classNames) {
+    for (const std::string& className : classNames) {
+        ProviderRegistration reg;
+        reg.className = className;
+        reg.provider = name;
+        reg.kinds = static_cast<std::uint8_t>(kind);
+        reg.namespaces = {std::string(ns)};
+        reg.unloadNever = true;
+        reg.file = "(built in)";
+        builtIns_.push_back(std::move(reg));
+        registrations_.push_back(&builtIns_.back());
+    }
+    loader_->addBuiltIn(name, kind, mi);
+}
+
 std::vector<std::string> CoreServices::preloadProviders() {
     std::vector<std::string> failures;
     std::set<std::string> seen;
     for (const ProviderRegistration* reg : registrations_) {
-        if (seen.insert(reg->location).second) {
+        if (!reg->location.empty() && seen.insert(reg->location).second) {
             if (std::string error = loader_->preload(reg->location); !error.empty()) {
+                failures.push_back(std::move(error));
+            }
+        }
+    }
+    return failures;
+}
+
+std::vector<std::string> CoreServices::createAllProviders() {
+    constexpr ProviderKind kKinds[] = {ProviderKind::Instance, ProviderKind::Association, ProviderKind::Method,
+                                       ProviderKind::Property, ProviderKind::Indication};
+    std::vector<std::string> failures;
+    std::set<std::string> seen;
+    for (const ProviderRegistration* reg : registrations_) {
+        for (ProviderKind kind : kKinds) {
+            if (!reg->has(kind) || !seen.insert(reg->provider + "/" + kindName(kind)).second) {
+                continue;
+            }
+            std::string error;
+            if (loader_->mi(*reg, kind, &error) == nullptr) {
                 failures.push_back(std::move(error));
             }
         }

@@ -7,6 +7,7 @@
 #include <cmpift.h>
 
 #include <functional>
+#include <deque>
 #include <map>
 #include <memory>
 #include <mutex>
@@ -96,8 +97,13 @@ public:
     CMPIStatus deliver(const char* ns, const CMPIInstance* indication);
 
     ProviderLoader& loader() noexcept { return *loader_; }
+    // Registers an MI of the host's own for classes of one namespace (see BrokerCore).
+    void addBuiltIn(const std::string& name, ProviderKind kind, void* mi, std::string_view ns,
+                    const std::vector<std::string>& classNames);
     // Loads each registered library once; the errors of those that failed.
     std::vector<std::string> preloadProviders();
+    // Creates every registration's MIs; the errors of those that failed.
+    std::vector<std::string> createAllProviders();
 
     // ClassSource
     const std::vector<std::string>* keyNames(std::string_view ns, std::string_view className) const override;
@@ -117,10 +123,15 @@ private:
     // Logs, once per provider, that it handed object paths to an instance request.
     void warnPathsAsInstances(const Target& target, const Request& request);
     void warn(const std::string& line) const;
+    // One filter off on one provider and class: disableIndications first when it
+    // was the provider's last filter, then deActivateFilter.
+    CMPIStatus filterOff(ProviderEntry& entry, void* mi, const CMPIContext* ctx, const CMPISelectExp* se,
+                         std::string_view ns, const std::string& className);
 
     orv::repository::ClassRepository repository_;
     std::vector<orv::repository::RegistrationSet> registrationSets_;
     std::vector<const ProviderRegistration*> registrations_;
+    std::deque<ProviderRegistration> builtIns_;  // registrations of the host's own MIs
     CMPIBroker broker_;
     std::unique_ptr<ProviderLoader> loader_;
 
@@ -130,6 +141,7 @@ private:
     std::function<void(const std::string&)> warningSink_;
     std::mutex warnedMutex_;
     std::set<std::string> warnedProviders_;
+    std::mutex filterMutex_;  // filter activation and the enable switch, one at a time
 
     std::mutex subscriberMutex_;
     std::map<std::uint64_t, std::shared_ptr<IndicationSubscriber>> subscribers_;

@@ -164,6 +164,18 @@ std::string ProviderLoader::preload(const std::string& location) {
     return library(location).error;
 }
 
+void ProviderLoader::addBuiltIn(const std::string& name, ProviderKind kind, void* mi) {
+    std::lock_guard lock(mutex_);
+    auto& slot = providers_[name];
+    if (!slot) {
+        slot = std::make_unique<ProviderEntry>();
+        slot->name = name;
+        order_.push_back(name);
+    }
+    slot->unloadNever = true;
+    slot->mis[kind] = LoadedMI{mi, {}};
+}
+
 ProviderEntry* ProviderLoader::provider(const std::string& name) {
     std::lock_guard lock(mutex_);
     auto found = providers_.find(name);

@@ -43,6 +43,8 @@ struct ProviderEntry {
     std::map<ProviderKind, LoadedMI> mis;
     bool indicationsEnabled = false;
     unsigned activeFilters = 0;
+    // Active filters per class name (lower case) the MI was activated with.
+    std::map<std::string, unsigned> classFilters;
 };
 
 class ProviderLoader {
@@ -58,6 +60,9 @@ public:
     // Loads the library of `location` now (once, as mi() would); its load
     // error, or "" when it is loaded.
     std::string preload(const std::string& location);
+    // An MI of the host's own under a provider name: mi() answers it, nothing is
+    // loaded, it is never unloaded, and shutdown() cleans it up like the others.
+    void addBuiltIn(const std::string& name, ProviderKind kind, void* mi);
     // The provider's record (after mi() succeeded once), for indication state.
     ProviderEntry* provider(const std::string& name);
 

@@ -95,6 +95,28 @@ std::optional<CMPIPredOp> operatorOf(const Token& token) {
     return std::nullopt;
 }
 
+using Dnf = std::vector<Conjunction>;
+constexpr std::size_t kMaxGroups = 256;
+
+// The operator that holds exactly when `op` does not (for a non-null value).
+CMPIPredOp negation(CMPIPredOp op) {
+    switch (op) {
+    case CMPI_PredOp_Equals: return CMPI_PredOp_NotEquals;
+    case CMPI_PredOp_NotEquals: return CMPI_PredOp_Equals;
+    case CMPI_PredOp_LessThan: return CMPI_PredOp_GreaterThanOrEquals;
+    case CMPI_PredOp_GreaterThanOrEquals: return CMPI_PredOp_LessThan;
+    case CMPI_PredOp_GreaterThan: return CMPI_PredOp_LessThanOrEquals;
+    case CMPI_PredOp_LessThanOrEquals: return CMPI_PredOp_GreaterThan;
+    case CMPI_PredOp_Isa: return CMPI_PredOp_NotIsa;
+    case CMPI_PredOp_NotIsa: return CMPI_PredOp_Isa;
+    case CMPI_PredOp_Like: return CMPI_PredOp_NotLike;
+    case CMPI_PredOp_NotLike: return CMPI_PredOp_Like;
+    case CMPI_PredOp_Null: return CMPI_PredOp_Not_Null;
+    case CMPI_PredOp_Not_Null: return CMPI_PredOp_Null;
+    default: return op;
+    }
+}
+
 class Parser {
 public:
     Parser(std::string_view text, std::string* error) : lexer_(text), error_(error) { advance(); }
@@ -125,6 +147,10 @@ private:
     void advance() { current_ = lexer_.next(); }
 
     std::nullopt_t fail(const std::string& expected) {
+        if (failed_) {
+            return std::nullopt;  // the first error is the one reported
+        }
+        failed_ = true;
         if (error_ != nullptr) {
             *error_ = "expected " + expected + (current_.kind == Token::End ? " at the end" : " before '" + current_.text + "'");
         }
@@ -157,23 +183,92 @@ private:
         return false;
     }
 
+    // condition := term { OR term }; term := factor { AND factor };
+    // factor := NOT factor | "(" condition ")" | predicate. Each level answers
+    // its condition in disjunctive normal form, NOT pushed into the predicates.
     bool parseCondition(Query& query) {
-        query.where.emplace_back();
-        while (true) {
-            std::optional<Predicate> predicate = parsePredicate();
-            if (!predicate) {
-                return false;
+        std::optional<Dnf> dnf = parseOr(false);
+        if (!dnf) {
+            return false;
+        }
+        query.where = std::move(*dnf);
+        return true;
+    }
+
+    std::optional<Dnf> parseOr(bool negated) {
+        std::optional<Dnf> left = parseAnd(negated);
+        while (left && isWord(current_, "OR")) {
+            advance();
+            std::optional<Dnf> right = parseAnd(negated);
+            if (!right) {
+                return std::nullopt;
             }
-            query.where.back().push_back(std::move(*predicate));
-            if (isWord(current_, "AND")) {
-                advance();
-            } else if (isWord(current_, "OR")) {
-                advance();
-                query.where.emplace_back();
-            } else {
-                return true;
+            left = negated ? both(*left, *right) : either(std::move(*left), std::move(*right));
+        }
+        return left;
+    }
+
+    std::optional<Dnf> parseAnd(bool negated) {
+        std::optional<Dnf> left = parseFactor(negated);
+        while (left && isWord(current_, "AND")) {
+            advance();
+            std::optional<Dnf> right = parseFactor(negated);
+            if (!right) {
+                return std::nullopt;
+            }
+            left = negated ? either(std::move(*left), std::move(*right)) : both(*left, *right);
+        }
+        return left;
+    }
+
+    std::optional<Dnf> parseFactor(bool negated) {
+        if (isWord(current_, "NOT")) {
+            advance();
+            return parseFactor(!negated);
+        }
+        if (current_.kind == Token::Symbol && current_.text == "(") {
+            advance();
+            std::optional<Dnf> inner = parseOr(negated);
+            if (!inner) {
+                return std::nullopt;
+            }
+            if (!(current_.kind == Token::Symbol && current_.text == ")")) {
+                return fail("')'");
+            }
+            advance();
+            return inner;
+        }
+        std::optional<Predicate> predicate = parsePredicate();
+        if (!predicate) {
+            return std::nullopt;
+        }
+        if (negated) {
+            predicate->op = negation(predicate->op);
+        }
+        return Dnf{Conjunction{std::move(*predicate)}};
+    }
+
+    static Dnf either(Dnf left, Dnf right) {
+        for (Conjunction& group : right) {
+            left.push_back(std::move(group));
+        }
+        return left;
+    }
+
+    // (a OR b) AND (c OR d) = ac OR ad OR bc OR bd, refused past kMaxGroups.
+    std::optional<Dnf> both(const Dnf& left, const Dnf& right) {
+        if (left.size() * right.size() > kMaxGroups) {
+            return fail("a simpler condition (more than " + std::to_string(kMaxGroups) + " alternatives)");
+        }
+        Dnf out;
+        for (const Conjunction& a : left) {
+            for (const Conjunction& b : right) {
+                Conjunction group = a;
+                group.insert(group.end(), b.begin(), b.end());
+                out.push_back(std::move(group));
             }
         }
+        return out;
     }
 
     std::optional<Predicate> parsePredicate() {
@@ -224,6 +319,7 @@ private:
     Lexer lexer_;
     std::string* error_;
     Token current_;
+    bool failed_ = false;
 };
 
 // SQL LIKE with '%' (any run) and '_' (one character).

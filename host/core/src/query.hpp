@@ -1,8 +1,11 @@
 // A small WQL/CQL reader for select expressions:
-//   SELECT * | prop [, prop ...] FROM Class [WHERE pred [AND|OR pred ...]]
-// with pred = prop op literal | prop IS [NOT] NULL | prop ISA Class, and
-// op one of = <> != < <= > >= LIKE. AND binds tighter than OR; the condition is
-// kept in disjunctive normal form (a list of AND-groups). No parentheses.
+//   SELECT * | prop [, prop ...] FROM Class [WHERE condition]
+// where a condition combines predicates with AND, OR, NOT and parentheses, and
+// pred = prop op literal | prop IS [NOT] NULL | prop ISA Class, with op one of
+// = <> != < <= > >= LIKE. NOT binds tightest, then AND, then OR. The condition
+// is kept in disjunctive normal form (a list of AND-groups) with every NOT pushed
+// into its predicate (= becomes <>, < becomes >=, ISA becomes NOT ISA, ...); a
+// condition whose normal form has more than 256 groups is refused.
 #pragma once
 
 #include <cmpidt.h>
@@ -33,6 +36,7 @@ struct Query {
 std::optional<Query> parseQuery(std::string_view text, std::string* error);
 
 // Whether one predicate holds for a value given in text form (isNull: no value).
+// Not for ISA / NOT ISA, which need the class of an embedded instance.
 bool predicateHolds(const Predicate& predicate, const std::string& value, bool isNull);
 
 }  // namespace orv::host::detail

@@ -18,9 +18,29 @@ bool classMatches(const InstanceImpl& inst, const std::string& fromClass) {
     return inst.classes != nullptr && inst.classes->isA(inst.nameSpace, inst.className, fromClass);
 }
 
+// "prop ISA Class": the property holds an embedded instance of the class or a subclass.
+bool isaHolds(const Predicate& predicate, const NamedValue* property, const InstanceImpl& owner) {
+    if (property == nullptr || (property->data.state & CMPI_nullValue) != 0 || property->data.type != CMPI_instance) {
+        return false;
+    }
+    const InstanceImpl* embedded = instanceImpl(property->data.value.inst);
+    if (embedded == nullptr) {
+        return false;
+    }
+    bool isa = classMatches(*embedded, predicate.rhs) ||
+               (owner.classes != nullptr && owner.classes->isA(owner.nameSpace, embedded->className, predicate.rhs));
+    return predicate.op == CMPI_PredOp_Isa ? isa : !isa;
+}
+
 bool conjunctionHolds(const Conjunction& group, const InstanceImpl& inst) {
     for (const Predicate& predicate : group) {
         const NamedValue* property = inst.properties.find(predicate.lhs);
+        if (predicate.op == CMPI_PredOp_Isa || predicate.op == CMPI_PredOp_NotIsa) {
+            if (!isaHolds(predicate, property, inst)) {
+                return false;
+            }
+            continue;
+        }
         bool isNull = property == nullptr || (property->data.state & CMPI_nullValue) != 0;
         if (!predicateHolds(predicate, isNull ? std::string() : valueText(property->data), isNull)) {
             return false;
@@ -151,14 +171,18 @@ CMPISelectExp* cloneSelectExp(const CMPISelectExp* exp, Owner owner) {
 }
 
 bool selectExpMatches(const SelectExpImpl& exp, const CMPIInstance* instance) {
+    return queryMatches(exp.query, instance);
+}
+
+bool queryMatches(const Query& query, const CMPIInstance* instance) {
     InstanceImpl* inst = instanceImpl(instance);
-    if (inst == nullptr || !classMatches(*inst, exp.query.fromClass)) {
+    if (inst == nullptr || !classMatches(*inst, query.fromClass)) {
         return false;
     }
-    if (exp.query.where.empty()) {
+    if (query.where.empty()) {
         return true;
     }
-    for (const Conjunction& group : exp.query.where) {
+    for (const Conjunction& group : query.where) {
         if (conjunctionHolds(group, *inst)) {
             return true;
         }

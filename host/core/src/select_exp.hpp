@@ -28,6 +28,9 @@ CMPISelectExp* cloneSelectExp(const CMPISelectExp* exp, Owner owner);
 SelectExpImpl* selectExpImpl(const CMPISelectExp* exp) noexcept;
 // Whether the instance is of the FROM class (or a subclass) and meets the WHERE clause.
 bool selectExpMatches(const SelectExpImpl& exp, const CMPIInstance* instance);
+// The same for a parsed query: FROM class with inheritance, then the WHERE clause
+// ("prop ISA Class" tests the class of an embedded instance).
+bool queryMatches(const Query& query, const CMPIInstance* instance);
 
 // Condition objects (select_cond.cpp).
 struct SelectCondImpl {

@@ -39,6 +39,15 @@ struct HostConfig {
     // NULL elements of array values: left out as sfcb does (what wbemcli and pywbem
     // read), or sent as DSP0201's VALUE.NULL.
     cimxml::ArrayNullElements arrayNullElements = cimxml::ArrayNullElements::Drop;
+
+    // Indications.
+    std::filesystem::path stateDir;    // where subscriptions are kept across restarts
+    std::filesystem::path interopMof;  // classes of root/interop
+    bool preload = false;              // load (and initialize) every registered provider at start
+    unsigned deliveryRetryAttempts = 3;
+    std::chrono::seconds deliveryRetryInterval{20};
+    std::size_t indicationQueueLimit = 1000;       // per destination
+    std::chrono::seconds indicationFlushTimeout{5};  // at shutdown, for what is queued
 };
 
 // Bad configuration input; what() is one line naming the file and line or the option.

@@ -34,6 +34,7 @@
 #include <vector>
 
 #include "orv/repository/class_repository.hpp"
+#include "orv/repository/registration.hpp"
 
 namespace orv::host {
 
@@ -155,6 +156,10 @@ public:
     // so that a host can refuse to start on a broken one. Returns one line per
     // library that failed: "cannot load provider library <path>: <dlerror text>".
     std::vector<std::string> preloadProviders();
+    // Creates the MI of every registration and kind now (factories and their
+    // initialize, as a first request would), so that threads providers start there
+    // run from the start. Returns the error of each MI that could not be created.
+    std::vector<std::string> createAllProviders();
 
     // Instance operations. The namespace is the path's namespace.
     Reply enumerateInstances(const CMPIObjectPath* classPath, const CallOptions& opts = {});
@@ -185,8 +190,13 @@ public:
                        const CallOptions& opts = {});
 
     // Indication control for the indication providers registered for the FROM
-    // class of `query` (and its subclasses): authorizeFilter, mustPoll and
-    // activateFilter(firstActivation = true) / deActivateFilter(lastActivation = true).
+    // class of `query` (and its subclasses), one filter per call, in sfcb's order:
+    // activation calls authorizeFilter, mustPoll and activateFilter on each (with
+    // firstActivation set when the provider had no active filter on that class),
+    // then enableIndications on each provider that had no active filter; a refusal
+    // deactivates what the call activated. Deactivation calls disableIndications on
+    // a provider losing its last filter, then deActivateFilter (lastActivation set
+    // when no filter on that class is left).
     Reply activateFilter(std::string_view ns, std::string_view query, std::string_view lang = "WQL",
                          const CallOptions& opts = {});
     Reply deactivateFilter(std::string_view ns, std::string_view query,
@@ -195,6 +205,13 @@ public:
     // class (each provider once, as sfcb keeps one flag per provider).
     Reply enableIndications(std::string_view ns, std::string_view className);
     Reply disableIndications(std::string_view ns, std::string_view className);
+
+    // Serves classes of `ns` through an MI of the host's own (no library): requests
+    // for them reach `mi` (a CMPIInstanceMI*, ... of `kind`) as they would reach a
+    // registered provider named `name`. Call before requests are sent; the MI must
+    // stay valid until shutdown(), which calls its cleanup like any provider's.
+    void addBuiltInProvider(const std::string& name, orv::repository::ProviderKind kind, void* mi,
+                            std::string_view ns, const std::vector<std::string>& classNames);
 
     // Subscribers receive every delivered indication; ids are never reused.
     std::uint64_t addIndicationSubscriber(IndicationSubscriber subscriber);
