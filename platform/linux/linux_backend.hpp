@@ -1,6 +1,7 @@
 // The Linux substitute: every platform area answered by the running machine.
 #pragma once
 
+#include "canonical_name.hpp"
 #include "ethtool_channel.hpp"
 #include "ethtool_netlink_channel.hpp"
 #include "linux_ksi.hpp"
@@ -43,9 +44,14 @@ private:
 
 class LinuxHost final : public orv::platform::HostBackend {
 public:
+    explicit LinuxHost(CanonicalNameCache::Resolver resolver = resolveCanonicalName,
+                       CanonicalNameCache::Timing timing = CanonicalNameCache::Timing{});
     bool fqdn(std::string& out) override;
     bool hostName(std::string& out) override;
     int sysInfo(struct sysinfo& out) override;
+
+private:
+    CanonicalNameCache canonical_;
 };
 
 void fillVersionRecord(const SystemVersion& version, TmkuserVersion_SystemVersionInfo& info);
