@@ -86,7 +86,8 @@ NN::Duplex LinuxPnic::GetConfiguredDuplex() const
 NN::Duplex LinuxPnic::GetDuplex() const
 {
     return guarded("GetDuplex", [&] {
-        auto duplex = attributes().duplex;
+        if (!linkUp()) return NN::DUPLEX_MODE_AUTO;  // drivers keep the last speed and duplex after the link drops
+        auto duplex = sysfs_.duplex(name_);
         return duplex == "full" ? NN::DUPLEX_MODE_FULL : duplex == "half" ? NN::DUPLEX_MODE_HALF : NN::DUPLEX_MODE_AUTO;
     });
 }
@@ -122,7 +123,8 @@ NN::LinkSpeed LinuxPnic::GetConfiguredLinkSpeed() const
 NN::LinkSpeed LinuxPnic::GetLinkSpeed() const
 {
     return guarded("GetLinkSpeed", [&] {
-        auto speed = attributes().speed.value_or(-1);
+        if (!linkUp()) return NN::CONNECTION_AUTO;
+        auto speed = sysfs_.speed(name_).value_or(-1);
         return speed > 0 ? toLinkSpeed(static_cast<std::uint32_t>(speed)) : NN::CONNECTION_AUTO;
     });
 }

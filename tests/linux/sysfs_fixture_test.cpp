@@ -2,6 +2,7 @@
 // behind a virtio device, a virtual device without a bus, and a CPU topology.
 #include "cpu_topology.hpp"
 #include "linux_call_error.hpp"
+#include "linux_pnic.hpp"
 #include "sysfs_net.hpp"
 
 #include <filesystem>
@@ -60,6 +61,39 @@ protected:
         link(virtio / "net/eth0", root_ / "class/net/eth0");
         netDevice(root_ / "devices/virtual/net/veth0", "2", "1500");
         link(root_ / "devices/virtual/net/veth0", root_ / "class/net/veth0");
+        buildUsbNic();
+        buildLinkDownNic();
+    }
+    // A USB NIC: its interface sits under the USB host controller, a PCI function.
+    void buildUsbNic()
+    {
+        const fs::path controller = root_ / "devices/pci0000:00/0000:00:14.0";
+        write(controller / "vendor", "0x8086\n");
+        write(controller / "device", "0xa36d\n");
+        link(root_ / "bus/pci", controller / "subsystem");
+        const fs::path device = controller / "usb1/1-1";
+        write(device / "idVendor", "0bda\n");
+        link(root_ / "bus/usb", device / "subsystem");
+        const fs::path interface = device / "1-1:1.0";
+        link(root_ / "bus/usb", interface / "subsystem");
+        netDevice(interface / "net/usb0", "5", "1500");
+        link(interface, interface / "net/usb0/device");
+        link(interface / "net/usb0", root_ / "class/net/usb0");
+    }
+    // A PCI NIC whose cable is out: up, no carrier, the driver still showing the last speed.
+    void buildLinkDownNic()
+    {
+        const fs::path pci = root_ / "devices/pci0000:00/0000:00:05.0";
+        write(pci / "vendor", "0x8086\n");
+        write(pci / "device", "0x10fb\n");
+        link(root_ / "bus/pci", pci / "subsystem");
+        netDevice(pci / "net/eth1", "6", "1500");
+        write(pci / "net/eth1/carrier", "0\n");
+        write(pci / "net/eth1/operstate", "down\n");
+        write(pci / "net/eth1/speed", "10000\n");
+        write(pci / "net/eth1/duplex", "full\n");
+        link(pci, pci / "net/eth1/device");
+        link(pci / "net/eth1", root_ / "class/net/eth1");
     }
     void buildCpus()
     {
@@ -83,8 +117,8 @@ protected:
 TEST_F(SysfsTree, NicsAreTheDevicesWithABusDevice)
 {
     SysfsNet sysfs(root_.string());
-    EXPECT_EQ(sysfs.allDevices(), (std::vector<std::string>{"veth0", "eth0"}));  // interface-index order
-    EXPECT_EQ(sysfs.busDevices(), std::vector<std::string>{"eth0"});
+    EXPECT_EQ(sysfs.allDevices(), (std::vector<std::string>{"veth0", "eth0", "usb0", "eth1"}));  // interface-index order
+    EXPECT_EQ(sysfs.busDevices(), (std::vector<std::string>{"eth0", "usb0", "eth1"}));
     EXPECT_FALSE(sysfs.hasBusDevice("veth0"));
 }
 
@@ -120,7 +154,36 @@ TEST_F(SysfsTree, LinkAttributesAndAVanishedDevice)
     } catch (const LinuxCallError& error) {
         EXPECT_TRUE(error.vanished());
     }
-    EXPECT_TRUE(sysfs.busDevices().empty());
+    EXPECT_EQ(sysfs.busDevices(), (std::vector<std::string>{"usb0", "eth1"}));
+}
+
+TEST_F(SysfsTree, PciNicIsItsOwnPciFunction)
+{
+    auto pci = SysfsNet(root_.string()).pciDevice("eth1");
+    ASSERT_TRUE(pci);
+    EXPECT_EQ(pci->address.slot, 5);
+    EXPECT_EQ(pci->vendorId, 0x8086);
+    EXPECT_EQ(pci->deviceId, 0x10fb);
+}
+
+TEST_F(SysfsTree, UsbNicHasNoPciIdentityOfItsHostController)
+{
+    SysfsNet sysfs(root_.string());
+    EXPECT_FALSE(sysfs.pciDevice("usb0"));
+    LinuxPnic pnic("usb0", root_.string(), std::make_shared<IoctlEthtoolChannel>());
+    EXPECT_EQ(pnic.GetPciDevice(), nullptr);
+}
+
+TEST_F(SysfsTree, LinkDownNicShowsNoSpeedOrDuplex)
+{
+    LinuxPnic pnic("eth1", root_.string(), std::make_shared<IoctlEthtoolChannel>());
+    EXPECT_FALSE(pnic.IsLinkUp());
+    EXPECT_EQ(pnic.GetLinkSpeed(), NodeMgr::Network::CONNECTION_AUTO);
+    EXPECT_EQ(pnic.GetDuplex(), NodeMgr::Network::DUPLEX_MODE_AUTO);
+    write(root_ / "class/net/eth1/carrier", "1\n");  // the cable back in
+    EXPECT_TRUE(pnic.IsLinkUp());
+    EXPECT_EQ(pnic.GetLinkSpeed(), NodeMgr::Network::CONNECTION_10000);
+    EXPECT_EQ(pnic.GetDuplex(), NodeMgr::Network::DUPLEX_MODE_FULL);
 }
 
 TEST_F(SysfsTree, PackagesCoresAndCpuOrder)
