@@ -288,16 +288,7 @@ void LinuxPnic::GetPnicRingInfo(NN::PnicRingInfo& preset, NN::PnicRingInfo& curr
 
 void LinuxPnic::GetPnicOffloadInfo(NN::PnicOffloadInfo& info) const
 {
-    guarded("GetPnicOffloadInfo", [&] {
-        EthtoolReader reader = ethtool();
-        info.rxChecksum = reader.value(ETHTOOL_GRXCSUM, "ETHTOOL_GRXCSUM") != 0;
-        info.txChecksum = reader.value(ETHTOOL_GTXCSUM, "ETHTOOL_GTXCSUM") != 0;
-        info.scatterGather = reader.value(ETHTOOL_GSG, "ETHTOOL_GSG") != 0;
-        info.tcpSegmentation = reader.value(ETHTOOL_GTSO, "ETHTOOL_GTSO") != 0;
-        info.udpFragmentation = reader.value(ETHTOOL_GUFO, "ETHTOOL_GUFO") != 0;
-        info.genericSegmentation = reader.value(ETHTOOL_GGSO, "ETHTOOL_GGSO") != 0;
-        info.largeReceive = (reader.value(ETHTOOL_GFLAGS, "ETHTOOL_GFLAGS") & ETH_FLAG_LRO) != 0;
-    });
+    guarded("GetPnicOffloadInfo", [&] { info = toOffloadInfo(ethtool().activeFeatures()); });
 }
 
 void LinuxPnic::GetPnicSoftwareSimulationInfo(NN::PnicSoftwareSimulationInfo& info) const

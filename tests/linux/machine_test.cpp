@@ -358,3 +358,22 @@ TEST(Machine, HostNameFqdnAndUptime)
     double uptime = std::stod(toolOutput("cat /proc/uptime").value_or("0"));
     EXPECT_NEAR(static_cast<double>(info.uptime), uptime, 2.0);
 }
+
+TEST(Machine, OffloadsEqualEthtoolFeatures)
+{
+    auto backend = machine();
+    auto isOn = [](const std::string& text, const std::string& key) { return fieldAfter(text, key).rfind("on", 0) == 0; };
+    for (const auto& name : pnicNames(*backend)) {
+        auto pnic = pnicNamed(*backend, name);
+        NN::PnicOffloadInfo info;
+        ASSERT_NO_THROW(pnic->GetPnicOffloadInfo(info)) << name;
+        auto features = toolOutput("ethtool -k " + name);
+        ASSERT_TRUE(features) << name;
+        EXPECT_EQ(info.rxChecksum, isOn(*features, "rx-checksumming")) << name;
+        EXPECT_EQ(info.scatterGather, isOn(*features, "scatter-gather")) << name;
+        EXPECT_EQ(info.tcpSegmentation, isOn(*features, "tcp-segmentation-offload")) << name;
+        EXPECT_EQ(info.genericSegmentation, isOn(*features, "generic-segmentation-offload")) << name;
+        EXPECT_EQ(info.largeReceive, isOn(*features, "large-receive-offload")) << name;
+        EXPECT_EQ(info.udpFragmentation, isOn(*features, "udp-fragmentation-offload")) << name;
+    }
+}
