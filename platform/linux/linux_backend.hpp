@@ -4,6 +4,7 @@
 #include "canonical_name.hpp"
 #include "ethtool_channel.hpp"
 #include "ethtool_netlink_channel.hpp"
+#include "link_statistics.hpp"
 #include "linux_ksi.hpp"
 #include "os_version.hpp"
 
@@ -26,6 +27,7 @@ private:
     std::string sysRoot_;
     std::shared_ptr<EthtoolChannel> channel_;
     std::shared_ptr<EthtoolNetlinkChannel> netlink_;
+    std::shared_ptr<RouteStatistics> route_;  // one rtnetlink socket for every NIC
 };
 
 // Version record from os-release and uname; host type from configuration.

@@ -17,8 +17,12 @@ namespace NN = NodeMgr::Network;
 using NodeMgr::Lib::NodeMgrException;
 
 LinuxPnic::LinuxPnic(std::string name, std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
-                     std::shared_ptr<EthtoolNetlinkChannel> netlink)
-    : name_(std::move(name)), sysfs_(std::move(sysRoot)), channel_(std::move(channel)), netlink_(std::move(netlink))
+                     std::shared_ptr<EthtoolNetlinkChannel> netlink, std::shared_ptr<RouteStatistics> route)
+    : name_(std::move(name)),
+      sysfs_(std::move(sysRoot)),
+      channel_(std::move(channel)),
+      netlink_(std::move(netlink)),
+      route_(route ? std::move(route) : std::make_shared<RouteStatistics>())
 {
 }
 
@@ -45,15 +49,17 @@ bool LinuxPnic::linkUp() const
 
 std::optional<ethtool_wolinfo> LinuxPnic::wakeOnLan() const
 {
+    if (wol_) return *wol_;
     try {
-        return ethtool().wakeOnLan();
+        wol_ = ethtool().wakeOnLan();
     } catch (const LinuxCallError& error) {
         if (!error.unsupported()) throw;
-        return std::nullopt;
+        wol_ = std::optional<ethtool_wolinfo>();
     }
+    return *wol_;
 }
 
-void LinuxPnic::Refresh() {}  // every operation reads the kernel afresh
+void LinuxPnic::Refresh() { wol_.reset(); }
 void LinuxPnic::SaveConfig() { refuse("SaveConfig"); }
 void LinuxPnic::LoadConfig() { refuse("LoadConfig"); }
 
@@ -212,8 +218,7 @@ bool LinuxPnic::IsPseudoDevice() const { return false; }
 void LinuxPnic::GetSourcePortStats(NN::PnicSourcePortStats& stats) const
 {
     guarded("GetSourcePortStats", [&] {
-        NetlinkSocket route(NETLINK_ROUTE);
-        auto link = readLinkStatistics(route, name_);
+        auto link = route_->read(name_);
         stats = NN::PnicSourcePortStats{link.tx_packets, link.rx_packets, link.tx_bytes, link.rx_bytes};
     });
 }
@@ -221,8 +226,7 @@ void LinuxPnic::GetSourcePortStats(NN::PnicSourcePortStats& stats) const
 void LinuxPnic::GetPnicStats(NN::PnicStats& stats) const
 {
     guarded("GetPnicStats", [&] {
-        NetlinkSocket route(NETLINK_ROUTE);
-        auto link = readLinkStatistics(route, name_);
+        auto link = route_->read(name_);
         std::vector<DriverStatistic> driver;
         try {
             driver = ethtool().driverStatistics();
