@@ -8,6 +8,7 @@
 #include "linux_backend.hpp"
 #include "linux_pnic.hpp"
 #include "sysfs_net.hpp"
+#include "nic_records.hpp"
 
 #include "nodemgr/lib/NodeMgrException.h"
 
@@ -32,6 +33,7 @@
 
 using namespace orv::linuxhost;
 namespace NN = NodeMgr::Network;
+using orv::linuxbench::tolerate;
 
 namespace {
 
@@ -196,33 +198,10 @@ void floorPackage(const std::vector<unsigned>& cpus)
 
 // ---- the substitute ------------------------------------------------------------------
 
-template <typename Call>
-void tolerate(Call&& call)
-{
-    try {
-        call();
-    } catch (const std::exception&) {
-        // a query the driver does not support costs its refusal
-    }
-}
-
 void substituteNicRecords(LinuxNetwork& network, const std::string& name)
 {
     std::unique_ptr<NN::Pnic> pnic(network.getPnicByName(name));
-    NN::PnicInfo info;
-    NN::PnicStats stats;
-    NN::PnicDriverInfo driver;
-    NN::PnicCoalesceInfo coalesce;
-    NN::PnicPauseInfo pause;
-    NN::PnicRingInfo preset, current;
-    tolerate([&] { pnic->GetPnicInfo(info); });
-    tolerate([&] { pnic->GetPnicStats(stats); });
-    tolerate([&] { pnic->GetPnicDriverInfo(driver); });
-    tolerate([&] { pnic->GetPnicCoalesceInfo(coalesce); });
-    tolerate([&] { pnic->GetPnicPauseInfo(pause); });
-    tolerate([&] { pnic->GetPnicRingInfo(preset, current); });
-    tolerate([&] { (void)pnic->GetMacAddress(); });
-    (void)pnic->GetPciDevice();
+    orv::linuxbench::readAllNicRecords(*pnic);
 }
 
 // The calls the Ethernet port provider makes for one instance.

@@ -1,6 +1,7 @@
 // The whole Linux substitute against this machine: every value equals what
 // ip, ethtool, uname and /proc report.
 #include "linux_backend.hpp"
+#include "stack_params.hpp"
 #include "tool_output.hpp"
 
 #include "nodemgr/lib/NodeMgrException.h"
@@ -15,6 +16,7 @@
 
 using namespace orv::linuxhost;
 using orv::linuxtest::fieldAfter;
+using orv::linuxtest::stackParams;
 using orv::linuxtest::toolOutput;
 using json = nlohmann::json;
 namespace NN = NodeMgr::Network;
@@ -57,13 +59,6 @@ std::string macText(const NN::MacAddress& mac)
     char text[18];
     std::snprintf(text, sizeof text, "%02x:%02x:%02x:%02x:%02x:%02x", bytes[0], bytes[1], bytes[2], bytes[3], bytes[4], bytes[5]);
     return text;
-}
-
-orv::platform::KsiParams stackParams(std::initializer_list<std::string> rest)
-{
-    orv::platform::KsiParams params{KSI_Param::ofString(kDefaultStack)};
-    for (const auto& item : rest) params.push_back(KSI_Param::ofString(item));
-    return params;
 }
 
 // Values of "key : value" lines of /proc/cpuinfo, in order.

@@ -5,6 +5,7 @@
 // so it is a kernel interface for the address nodes but never a NIC.
 #include "linux_backend.hpp"
 #include "linux_pnic.hpp"
+#include "stack_params.hpp"
 #include "tool_output.hpp"
 
 #include "nodemgr/lib/NodeMgrException.h"
@@ -18,18 +19,12 @@
 
 using namespace orv::linuxhost;
 using orv::linuxtest::runTool;
+using orv::linuxtest::stackParams;
 using orv::linuxtest::toolOutput;
 namespace NN = NodeMgr::Network;
 using Params = orv::platform::KsiParams;
 
 namespace {
-
-Params stackParams(std::initializer_list<std::string> rest)
-{
-    Params params{KSI_Param::ofString(kDefaultStack)};
-    for (const auto& item : rest) params.push_back(KSI_Param::ofString(item));
-    return params;
-}
 
 class VethNamespace : public ::testing::Test {
 protected:

@@ -5,11 +5,13 @@
 // interfaces never fails half way because another request started or an
 // interface vanished.
 #include "linux_backend.hpp"
+#include "stack_params.hpp"
 #include "tool_output.hpp"
 
 #include <atomic>
 #include <chrono>
 #include <fcntl.h>
+#include <functional>
 #include <gtest/gtest.h>
 #include <sched.h>
 #include <thread>
@@ -17,16 +19,10 @@
 
 using namespace orv::linuxhost;
 using orv::linuxtest::runTool;
+using orv::linuxtest::stackParams;
 using Params = orv::platform::KsiParams;
 
 namespace {
-
-Params stackParams(std::initializer_list<std::string> rest)
-{
-    Params params{KSI_Param::ofString(kDefaultStack)};
-    for (const auto& item : rest) params.push_back(KSI_Param::ofString(item));
-    return params;
-}
 
 // The walk the kernel IP endpoint provider makes in one request: the listing,
 // then per interface its IPv4 address and netmask and its IPv6 summaries. An
@@ -104,6 +100,25 @@ protected:
         return joined;
     }
 
+    // Runs body on `count` threads, each joined to the test namespace first;
+    // answers how many threads could not join it.
+    unsigned runClients(int count, const std::function<void()>& body)
+    {
+        std::atomic<unsigned> notEntered{0};
+        std::vector<std::thread> clients;
+        for (int client = 0; client < count; ++client) {
+            clients.emplace_back([&] {
+                if (!enter()) {
+                    ++notEntered;
+                    return;
+                }
+                body();
+            });
+        }
+        for (auto& client : clients) client.join();
+        return notEntered;
+    }
+
     // A thread that creates and deletes veth pairs with addresses, one after another.
     void startChurn()
     {
@@ -139,26 +154,18 @@ TEST_F(ChurningNamespace, ConcurrentEndpointWalksSeeTheStayingInterfaceAndNeverF
 {
     LinuxKsi ksi(LinuxRoots{});
     startChurn();
-    std::atomic<unsigned> walks{0}, failures{0}, missing{0}, notEntered{0};
-    std::vector<std::thread> clients;
-    for (int client = 0; client < 4; ++client) {
-        clients.emplace_back([&] {
-            if (!enter()) {
-                ++notEntered;
-                return;
-            }
-            const auto until = std::chrono::steady_clock::now() + std::chrono::seconds(3);
-            while (std::chrono::steady_clock::now() < until) {
-                Walk walk = walkEndpoints(ksi);
-                ++walks;
-                if (walk.failed) ++failures;
-                if (std::find(walk.names.begin(), walk.names.end(), "stay0") == walk.names.end() || walk.records < 2) ++missing;
-            }
-        });
-    }
-    for (auto& client : clients) client.join();
+    std::atomic<unsigned> walks{0}, failures{0}, missing{0};
+    const unsigned notEntered = runClients(4, [&] {
+        const auto until = std::chrono::steady_clock::now() + std::chrono::seconds(3);
+        while (std::chrono::steady_clock::now() < until) {
+            Walk walk = walkEndpoints(ksi);
+            ++walks;
+            if (walk.failed) ++failures;
+            if (std::find(walk.names.begin(), walk.names.end(), "stay0") == walk.names.end() || walk.records < 2) ++missing;
+        }
+    });
     stopChurn();
-    ASSERT_EQ(notEntered.load(), 0u);
+    ASSERT_EQ(notEntered, 0u);
     EXPECT_GT(rounds_.load(), 0u) << "no interface was created and deleted during the walks";
     EXPECT_GT(walks.load(), 0u);
     EXPECT_EQ(failures.load(), 0u) << "of " << walks.load() << " walks";
@@ -168,29 +175,21 @@ TEST_F(ChurningNamespace, ConcurrentEndpointWalksSeeTheStayingInterfaceAndNeverF
 TEST_F(ChurningNamespace, ConcurrentProcessorAndInterfaceListingsAreNeverEmpty)
 {
     LinuxKsi ksi(LinuxRoots{});
-    std::atomic<unsigned> empty{0}, listings{0}, notEntered{0};
-    std::vector<std::thread> clients;
-    for (int client = 0; client < 4; ++client) {
-        clients.emplace_back([&] {
-            if (!enter()) {
-                ++notEntered;
-                return;
-            }
-            for (int request = 0; request < 400; ++request) {
-                ksi.invalidate();
-                std::optional<Params> vnics, packages, cpus;
-                ksi.getInstanceList(KSI_NODE_net_tcpip_instances_vNics, stackParams({}), vnics);
-                ksi.getInstanceList(KSI_NODE_hardware_cpu_packageList, {}, packages);
-                ksi.getInstanceList(KSI_NODE_hardware_cpu_cpuList, {}, cpus);
-                listings += 3;
-                if (!vnics || vnics->empty()) ++empty;
-                if (!packages || packages->empty()) ++empty;
-                if (!cpus || cpus->empty()) ++empty;
-            }
-        });
-    }
-    for (auto& client : clients) client.join();
-    ASSERT_EQ(notEntered.load(), 0u);
+    std::atomic<unsigned> empty{0}, listings{0};
+    const unsigned notEntered = runClients(4, [&] {
+        for (int request = 0; request < 400; ++request) {
+            ksi.invalidate();
+            std::optional<Params> vnics, packages, cpus;
+            ksi.getInstanceList(KSI_NODE_net_tcpip_instances_vNics, stackParams({}), vnics);
+            ksi.getInstanceList(KSI_NODE_hardware_cpu_packageList, {}, packages);
+            ksi.getInstanceList(KSI_NODE_hardware_cpu_cpuList, {}, cpus);
+            listings += 3;
+            if (!vnics || vnics->empty()) ++empty;
+            if (!packages || packages->empty()) ++empty;
+            if (!cpus || cpus->empty()) ++empty;
+        }
+    });
+    ASSERT_EQ(notEntered, 0u);
     EXPECT_EQ(empty.load(), 0u) << "of " << listings.load() << " listings";
 }
 

@@ -47,18 +47,29 @@ protected:
         write(dir / "speed", "-1\n");
         write(dir / "duplex", "unknown\n");
     }
+    // A PCI function at devices/pci0000:00/<address> with its identity files.
+    fs::path pciFunction(const std::string& address, const std::string& vendor, const std::string& device)
+    {
+        const fs::path pci = root_ / "devices/pci0000:00" / address;
+        write(pci / "vendor", vendor + "\n");
+        write(pci / "device", device + "\n");
+        link(root_ / "bus/pci", pci / "subsystem");
+        return pci;
+    }
+    // The net device `name` of a bus device, with its `device` link and class entry.
+    fs::path netDeviceOf(const fs::path& busDevice, const std::string& name, const std::string& index)
+    {
+        netDevice(busDevice / "net" / name, index, "1500");
+        link(busDevice, busDevice / "net" / name / "device");
+        link(busDevice / "net" / name, root_ / "class/net" / name);
+        return busDevice / "net" / name;
+    }
     void buildNet()
     {
-        const fs::path pci = root_ / "devices/pci0000:00/0000:00:03.0";
-        write(pci / "vendor", "0x1af4\n");
-        write(pci / "device", "0x1000\n");
-        link(root_ / "bus/pci", pci / "subsystem");
-        const fs::path virtio = pci / "virtio2";
+        const fs::path virtio = pciFunction("0000:00:03.0", "0x1af4", "0x1000") / "virtio2";
         write(virtio / "vendor", "0x1af4\n");
         link(root_ / "bus/virtio", virtio / "subsystem");
-        netDevice(virtio / "net/eth0", "4", "1400");
-        link(virtio, virtio / "net/eth0/device");
-        link(virtio / "net/eth0", root_ / "class/net/eth0");
+        write(netDeviceOf(virtio, "eth0", "4") / "mtu", "1400\n");
         netDevice(root_ / "devices/virtual/net/veth0", "2", "1500");
         link(root_ / "devices/virtual/net/veth0", root_ / "class/net/veth0");
         buildUsbNic();
@@ -67,33 +78,21 @@ protected:
     // A USB NIC: its interface sits under the USB host controller, a PCI function.
     void buildUsbNic()
     {
-        const fs::path controller = root_ / "devices/pci0000:00/0000:00:14.0";
-        write(controller / "vendor", "0x8086\n");
-        write(controller / "device", "0xa36d\n");
-        link(root_ / "bus/pci", controller / "subsystem");
-        const fs::path device = controller / "usb1/1-1";
+        const fs::path device = pciFunction("0000:00:14.0", "0x8086", "0xa36d") / "usb1/1-1";
         write(device / "idVendor", "0bda\n");
         link(root_ / "bus/usb", device / "subsystem");
         const fs::path interface = device / "1-1:1.0";
         link(root_ / "bus/usb", interface / "subsystem");
-        netDevice(interface / "net/usb0", "5", "1500");
-        link(interface, interface / "net/usb0/device");
-        link(interface / "net/usb0", root_ / "class/net/usb0");
+        netDeviceOf(interface, "usb0", "5");
     }
     // A PCI NIC whose cable is out: up, no carrier, the driver still showing the last speed.
     void buildLinkDownNic()
     {
-        const fs::path pci = root_ / "devices/pci0000:00/0000:00:05.0";
-        write(pci / "vendor", "0x8086\n");
-        write(pci / "device", "0x10fb\n");
-        link(root_ / "bus/pci", pci / "subsystem");
-        netDevice(pci / "net/eth1", "6", "1500");
-        write(pci / "net/eth1/carrier", "0\n");
-        write(pci / "net/eth1/operstate", "down\n");
-        write(pci / "net/eth1/speed", "10000\n");
-        write(pci / "net/eth1/duplex", "full\n");
-        link(pci, pci / "net/eth1/device");
-        link(pci / "net/eth1", root_ / "class/net/eth1");
+        const fs::path eth1 = netDeviceOf(pciFunction("0000:00:05.0", "0x8086", "0x10fb"), "eth1", "6");
+        write(eth1 / "carrier", "0\n");
+        write(eth1 / "operstate", "down\n");
+        write(eth1 / "speed", "10000\n");
+        write(eth1 / "duplex", "full\n");
     }
     void buildCpus()
     {
