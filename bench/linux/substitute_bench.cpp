@@ -10,6 +10,7 @@
 #include "linux_pnic.hpp"
 #include "sysfs_net.hpp"
 #include "text_files.hpp"
+#include "nic_records.hpp"
 
 #include "nodemgr/lib/NodeMgrException.h"
 
@@ -17,6 +18,7 @@
 #include <linux/netlink.h>
 
 using namespace orv::linuxhost;
+using orv::linuxbench::tolerate;
 namespace NN = NodeMgr::Network;
 
 namespace {
@@ -27,16 +29,6 @@ std::string firstNic()
     return nics.empty() ? std::string() : nics.front();
 }
 
-template <typename Call>
-void tolerate(Call&& call)
-{
-    try {
-        call();
-    } catch (const std::exception&) {
-        // a query the driver does not support costs its refusal
-    }
-}
-
 void SubstitutePerNic(benchmark::State& state)
 {
     const std::string name = firstNic();
@@ -44,21 +36,7 @@ void SubstitutePerNic(benchmark::State& state)
     LinuxNetwork network("/sys", std::make_shared<IoctlEthtoolChannel>(), std::make_shared<GenlEthtoolChannel>());
     for (auto _ : state) {
         std::unique_ptr<NN::Pnic> pnic(network.getPnicByName(name));
-        NN::PnicInfo info;
-        NN::PnicStats stats;
-        NN::PnicDriverInfo driver;
-        NN::PnicCoalesceInfo coalesce;
-        NN::PnicPauseInfo pause;
-        NN::PnicRingInfo preset, current;
-        tolerate([&] { pnic->GetPnicInfo(info); });
-        tolerate([&] { pnic->GetPnicStats(stats); });
-        tolerate([&] { pnic->GetPnicDriverInfo(driver); });
-        tolerate([&] { pnic->GetPnicCoalesceInfo(coalesce); });
-        tolerate([&] { pnic->GetPnicPauseInfo(pause); });
-        tolerate([&] { pnic->GetPnicRingInfo(preset, current); });
-        tolerate([&] { benchmark::DoNotOptimize(pnic->GetMTU()); });
-        tolerate([&] { benchmark::DoNotOptimize(pnic->GetMacAddress()); });
-        benchmark::DoNotOptimize(pnic->GetPciDevice());
+        orv::linuxbench::readAllNicRecords(*pnic);
     }
 }
 

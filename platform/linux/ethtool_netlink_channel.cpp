@@ -33,17 +33,24 @@ nlmsghdr* buildQuery(char* buffer, std::uint16_t family, std::uint8_t command, c
 
 }  // namespace
 
-GenlEthtoolChannel::GenlEthtoolChannel(std::string family) : family_(std::move(family)) {}
+GenlEthtoolChannel::GenlEthtoolChannel(std::string family, std::chrono::milliseconds retryAfter)
+    : family_(std::move(family)), retryAfter_(retryAfter)
+{
+}
 
 int GenlEthtoolChannel::open()
 {
-    if (openError_ >= 0) return openError_;
+    if (socket_) return 0;
+    const auto now = std::chrono::steady_clock::now();
+    if (openError_ != 0 && now - failedAt_ < retryAfter_) return openError_;
     try {
-        socket_ = std::make_unique<NetlinkSocket>(NETLINK_GENERIC);
-        openError_ = resolveGenlFamily(*socket_, family_.c_str(), familyId_);
+        auto socket = std::make_unique<NetlinkSocket>(NETLINK_GENERIC);
+        openError_ = resolveGenlFamily(*socket, family_.c_str(), familyId_);
+        if (openError_ == 0) socket_ = std::move(socket);
     } catch (const LinuxCallError& error) {
         openError_ = error.error();
     }
+    failedAt_ = now;
     return openError_;
 }
 

@@ -5,6 +5,7 @@
 
 #include "netlink_socket.hpp"
 
+#include <chrono>
 #include <cstdint>
 #include <memory>
 #include <mutex>
@@ -24,11 +25,14 @@ public:
 };
 
 // One generic-netlink socket of the calling thread's network namespace, opened
-// and the family resolved at the first query; queries are serialised.
+// and the family resolved at the first query; queries are serialised. When the
+// socket cannot be opened or the family is unknown, queries answer that error
+// until `retryAfter` has passed, then the next query tries again.
 class GenlEthtoolChannel final : public EthtoolNetlinkChannel {
 public:
     // `family` is the generic-netlink family name; only tests name another one.
-    explicit GenlEthtoolChannel(std::string family = "ethtool");
+    explicit GenlEthtoolChannel(std::string family = "ethtool",
+                                std::chrono::milliseconds retryAfter = std::chrono::seconds(10));
 
     int query(std::uint8_t command, const std::string& ifname, NetlinkMessage& answer) override;
 
@@ -39,7 +43,9 @@ private:
     std::mutex mutex_;
     std::unique_ptr<NetlinkSocket> socket_;
     std::uint16_t familyId_ = 0;
-    int openError_ = -1;  // -1: not tried yet
+    std::chrono::milliseconds retryAfter_;
+    int openError_ = 0;  // of the last attempt that failed
+    std::chrono::steady_clock::time_point failedAt_;
 };
 
 }  // namespace orv::linuxhost

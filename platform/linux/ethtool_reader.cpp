@@ -211,24 +211,24 @@ std::vector<std::uint8_t> EthtoolReader::permanentAddress() const
     return address;
 }
 
-std::uint32_t EthtoolReader::statisticsCount() const
+std::uint32_t EthtoolReader::stringSetCount(std::uint32_t set) const
 {
     CommandBuffer buffer(sizeof(ethtool_sset_info) + sizeof(std::uint32_t));
     auto* request = buffer.as<ethtool_sset_info>();
     request->cmd = ETHTOOL_GSSET_INFO;
-    request->sset_mask = 1ull << ETH_SS_STATS;
+    request->sset_mask = 1ull << set;
     int error = channel_.exchange(ifname_, request, buffer.size);
-    if (error == EOPNOTSUPP) return driverInfo().n_stats;  // kernels before string-set queries
+    if (error == EOPNOTSUPP && set == ETH_SS_STATS) return driverInfo().n_stats;  // kernels before string-set queries
     if (error) throw LinuxCallError("ETHTOOL_GSSET_INFO", ifname_, error);
-    return (request->sset_mask & (1ull << ETH_SS_STATS)) ? request->data[0] : 0;
+    return (request->sset_mask & (1ull << set)) ? request->data[0] : 0;
 }
 
-std::vector<std::string> EthtoolReader::statisticNames(std::uint32_t count) const
+std::vector<std::string> EthtoolReader::stringSetNames(std::uint32_t set, std::uint32_t count) const
 {
     CommandBuffer buffer(sizeof(ethtool_gstrings) + std::size_t{count} * ETH_GSTRING_LEN);
     auto* request = buffer.as<ethtool_gstrings>();
     request->cmd = ETHTOOL_GSTRINGS;
-    request->string_set = ETH_SS_STATS;
+    request->string_set = set;
     request->len = count;
     exchange(request, buffer.size, "ETHTOOL_GSTRINGS");
     std::vector<std::string> names;
@@ -237,6 +237,24 @@ std::vector<std::string> EthtoolReader::statisticNames(std::uint32_t count) cons
         names.emplace_back(text, strnlen(text, ETH_GSTRING_LEN));
     }
     return names;
+}
+
+std::vector<std::string> EthtoolReader::activeFeatures() const
+{
+    const std::uint32_t count = stringSetCount(ETH_SS_FEATURES);
+    if (count == 0) return {};
+    auto names = stringSetNames(ETH_SS_FEATURES, count);
+    const std::uint32_t blocks = (count + 31) / 32;
+    CommandBuffer buffer(sizeof(ethtool_gfeatures) + std::size_t{blocks} * sizeof(ethtool_get_features_block));
+    auto* request = buffer.as<ethtool_gfeatures>();
+    request->cmd = ETHTOOL_GFEATURES;
+    request->size = blocks;
+    exchange(request, buffer.size, "ETHTOOL_GFEATURES");
+    std::vector<std::string> active;
+    for (std::uint32_t bit = 0; bit < std::min<std::size_t>(names.size(), std::size_t{request->size} * 32); ++bit) {
+        if (request->features[bit / 32].active & (1u << (bit % 32))) active.push_back(names[bit]);
+    }
+    return active;
 }
 
 std::vector<std::uint64_t> EthtoolReader::statisticValues(std::uint32_t count) const
@@ -251,9 +269,9 @@ std::vector<std::uint64_t> EthtoolReader::statisticValues(std::uint32_t count) c
 
 std::vector<DriverStatistic> EthtoolReader::driverStatistics() const
 {
-    const std::uint32_t count = statisticsCount();
+    const std::uint32_t count = stringSetCount(ETH_SS_STATS);
     if (count == 0) return {};
-    auto names = statisticNames(count);
+    auto names = stringSetNames(ETH_SS_STATS, count);
     auto values = statisticValues(count);
     std::vector<DriverStatistic> statistics;
     for (std::size_t i = 0; i < std::min(names.size(), values.size()); ++i) {

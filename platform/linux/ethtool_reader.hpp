@@ -59,6 +59,9 @@ public:
     std::uint32_t value(std::uint32_t command, const char* name) const;
     // The burnt-in address; empty when the driver reports none.
     std::vector<std::uint8_t> permanentAddress() const;
+    // Names of the device features that are on (string set ETH_SS_FEATURES with
+    // the active words of ETHTOOL_GFEATURES): "rx-checksum", "tx-scatter-gather", ...
+    std::vector<std::string> activeFeatures() const;
     // The driver's own counters (string set ETH_SS_STATS) with their names.
     std::vector<DriverStatistic> driverStatistics() const;
 
@@ -75,8 +78,9 @@ private:
     std::optional<LinkSettings> netlinkSettings() const;
     LinkSettings ioctlSettings() const;
     LinkSettings legacySettings() const;
-    std::uint32_t statisticsCount() const;
-    std::vector<std::string> statisticNames(std::uint32_t count) const;
+    // Size and names of a string set (ETH_SS_STATS, ETH_SS_FEATURES).
+    std::uint32_t stringSetCount(std::uint32_t set) const;
+    std::vector<std::string> stringSetNames(std::uint32_t set, std::uint32_t count) const;
     std::vector<std::uint64_t> statisticValues(std::uint32_t count) const;
 
     EthtoolChannel& channel_;

@@ -59,4 +59,11 @@ rtnl_link_stats64 readLinkStatistics(NetlinkSocket& route, const std::string& if
     throw LinuxCallError("RTM_GETLINK", ifname, ENODATA);
 }
 
+rtnl_link_stats64 RouteStatistics::read(const std::string& ifname)
+{
+    std::lock_guard<std::mutex> lock(mutex_);
+    if (!socket_) socket_ = std::make_unique<NetlinkSocket>(NETLINK_ROUTE);
+    return readLinkStatistics(*socket_, ifname);
+}
+
 }  // namespace orv::linuxhost

@@ -1,8 +1,10 @@
 // The Linux substitute: every platform area answered by the running machine.
 #pragma once
 
+#include "canonical_name.hpp"
 #include "ethtool_channel.hpp"
 #include "ethtool_netlink_channel.hpp"
+#include "link_statistics.hpp"
 #include "linux_ksi.hpp"
 #include "os_version.hpp"
 
@@ -25,6 +27,7 @@ private:
     std::string sysRoot_;
     std::shared_ptr<EthtoolChannel> channel_;
     std::shared_ptr<EthtoolNetlinkChannel> netlink_;
+    std::shared_ptr<RouteStatistics> route_;  // one rtnetlink socket for every NIC
 };
 
 // Version record from os-release and uname; host type from configuration.
@@ -43,11 +46,16 @@ private:
 
 class LinuxHost final : public orv::platform::HostBackend {
 public:
+    explicit LinuxHost(CanonicalNameCache::Resolver resolver = resolveCanonicalName,
+                       CanonicalNameCache::Timing timing = CanonicalNameCache::Timing{});
     bool fqdn(std::string& out) override;
     bool hostName(std::string& out) override;
     int sysInfo(struct sysinfo& out) override;
     int interfaceAddresses(ifaddrs*& list) override;
     void freeInterfaceAddresses(ifaddrs* list) override;
+
+private:
+    CanonicalNameCache canonical_;
 };
 
 void fillVersionRecord(const SystemVersion& version, TmkuserVersion_SystemVersionInfo& info);

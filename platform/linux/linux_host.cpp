@@ -2,9 +2,6 @@
 
 #include <cerrno>
 #include <ifaddrs.h>
-#include <memory>
-#include <netdb.h>
-#include <sys/socket.h>
 #include <unistd.h>
 
 namespace orv::linuxhost {
@@ -17,20 +14,18 @@ bool LinuxHost::hostName(std::string& out)
     return !out.empty();
 }
 
-// The canonical name the resolver gives the host name; the host name itself
-// when the resolver knows no other.
+LinuxHost::LinuxHost(CanonicalNameCache::Resolver resolver, CanonicalNameCache::Timing timing)
+    : canonical_(std::move(resolver), timing)
+{
+}
+
+// The canonical name the resolver gives the host name, as far as known
+// without waiting on the resolver; the host name itself otherwise.
 bool LinuxHost::fqdn(std::string& out)
 {
     std::string name;
     if (!hostName(name)) return false;
-    addrinfo hints{};
-    hints.ai_family = AF_UNSPEC;
-    hints.ai_flags = AI_CANONNAME;
-    addrinfo* result = nullptr;
-    out = name;
-    if (::getaddrinfo(name.c_str(), nullptr, &hints, &result) != 0) return true;
-    std::unique_ptr<addrinfo, void (*)(addrinfo*)> owner(result, freeaddrinfo);
-    if (result && result->ai_canonname && *result->ai_canonname) out = result->ai_canonname;
+    out = canonical_.nameFor(name);
     return true;
 }
 

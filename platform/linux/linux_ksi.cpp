@@ -5,8 +5,8 @@
 #include "linux_call_error.hpp"
 
 #include <algorithm>
+#include <atomic>
 #include <cstring>
-#include <net/if.h>
 #include <unistd.h>
 
 namespace orv::linuxhost {
@@ -52,35 +52,58 @@ bool onlyStack(const KsiParams& params, std::size_t count)
 
 }  // namespace
 
-LinuxKsi::LinuxKsi(LinuxRoots roots) : roots_(std::move(roots)) {}
+struct LinuxKsi::Snapshot {
+    std::uint64_t owner = 0;
+    std::shared_ptr<const Interfaces> interfaces;
+    std::shared_ptr<const CpuTopology> topology;
+    std::shared_ptr<const Activity> activity;
+};
 
-void LinuxKsi::invalidate()
+namespace {
+
+std::uint64_t nextInstanceId()
 {
-    std::lock_guard<std::mutex> lock(mutex_);
-    interfaces_.reset();
-    topology_.reset();
-    activity_.reset();
+    static std::atomic<std::uint64_t> counter{0};
+    return ++counter;
 }
+
+}  // namespace
+
+LinuxKsi::LinuxKsi(LinuxRoots roots)
+    : roots_(std::move(roots)), id_(nextInstanceId()), sampler_(roots_.loadWindow, roots_.proc)
+{
+}
+
+// A request runs on one thread, so the thread's own slot holds its snapshot;
+// a slot left by another instance is taken over.
+LinuxKsi::Snapshot& LinuxKsi::snapshot()
+{
+    thread_local Snapshot slot;
+    if (slot.owner != id_) slot = Snapshot{id_, nullptr, nullptr, nullptr};
+    return slot;
+}
+
+void LinuxKsi::invalidate() { snapshot() = Snapshot{id_, nullptr, nullptr, nullptr}; }
 
 std::shared_ptr<const LinuxKsi::Interfaces> LinuxKsi::interfaces()
 {
-    std::lock_guard<std::mutex> lock(mutex_);
-    if (!interfaces_) interfaces_ = std::make_shared<const Interfaces>(readInterfaceAddresses());
-    return interfaces_;
+    auto& slot = snapshot().interfaces;
+    if (!slot) slot = std::make_shared<const Interfaces>(readInterfaceAddresses());
+    return slot;
 }
 
 std::shared_ptr<const CpuTopology> LinuxKsi::topology()
 {
-    std::lock_guard<std::mutex> lock(mutex_);
-    if (!topology_) topology_ = std::make_shared<const CpuTopology>(readCpuTopology(roots_.sys));
-    return topology_;
+    auto& slot = snapshot().topology;
+    if (!slot) slot = std::make_shared<const CpuTopology>(readCpuTopology(roots_.sys));
+    return slot;
 }
 
 std::shared_ptr<const LinuxKsi::Activity> LinuxKsi::activity()
 {
-    std::lock_guard<std::mutex> lock(mutex_);
-    if (!activity_) activity_ = std::make_shared<const Activity>(sampleCpuActivity(roots_.loadWindow, roots_.proc));
-    return activity_;
+    auto& slot = snapshot().activity;
+    if (!slot) slot = std::make_shared<const Activity>(sampler_.sample());
+    return slot;
 }
 
 KSI_Status LinuxKsi::checkSig(const void* signature, uint32_t length, uint32_t* result)
@@ -88,6 +111,7 @@ KSI_Status LinuxKsi::checkSig(const void* signature, uint32_t length, uint32_t* 
     if (!signature || length != KSI_SIGNATURE_LENGTH || std::memcmp(signature, KSI_SIGNATURE, KSI_SIGNATURE_LENGTH) != 0) {
         return KSI_ERR_SIGNATURE;
     }
+    invalidate();  // every request begins with the signature check
     if (result) *result = KSI_INTERFACE_VERSION;
     return KSI_OK;
 }
@@ -96,7 +120,7 @@ const InterfaceAddresses* LinuxKsi::vnic(const Interfaces& all, const KsiParams&
 {
     if (params[0].text != kDefaultStack || !isString(params, 1)) return nullptr;
     for (const auto& entry : all) {
-        if (entry.name == params[1].text) return if_nametoindex(entry.name.c_str()) != 0 ? &entry : nullptr;
+        if (entry.name == params[1].text) return &entry;
     }
     return nullptr;
 }
@@ -108,8 +132,9 @@ KSI_Status LinuxKsi::getInstanceList(KSI_NodeId node, const KsiParams& params, s
         case KSI_NODE_net_tcpip_instances_vNics: {
             if (!onlyStack(params, 1)) return KSI_ERR_BAD_PARAM;
             if (params[0].text != kDefaultStack) return KSI_ERR_NOT_FOUND;
+            auto all = interfaces();  // held for the loop: another request may replace the snapshot meanwhile
             list.emplace();
-            for (const auto& entry : *interfaces()) list->push_back(KSI_Param::ofString(entry.name));
+            for (const auto& entry : *all) list->push_back(KSI_Param::ofString(entry.name));
             return KSI_OK;
         }
         case KSI_NODE_net_tcpip_instances_vNics_v6_addresses: {
@@ -121,11 +146,13 @@ KSI_Status LinuxKsi::getInstanceList(KSI_NodeId node, const KsiParams& params, s
             for (const auto& address : entry->ipv6) list->push_back(KSI_Param::ofString(address.address));
             return KSI_OK;
         }
-        case KSI_NODE_hardware_cpu_packageList:
+        case KSI_NODE_hardware_cpu_packageList: {
             if (!params.empty()) return KSI_ERR_BAD_PARAM;
+            auto topo = topology();
             list.emplace();
-            for (const auto& pkg : topology()->packages) list->push_back(KSI_Param::ofInt(pkg.packageId));
+            for (const auto& pkg : topo->packages) list->push_back(KSI_Param::ofInt(pkg.packageId));
             return KSI_OK;
+        }
         case KSI_NODE_hardware_cpu_cpuList:
             if (!params.empty()) return KSI_ERR_BAD_PARAM;
             list.emplace();

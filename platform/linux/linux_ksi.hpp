@@ -1,10 +1,12 @@
 // The kernel system-information nodes answered from the running machine.
-// Interface addresses and the CPU topology are read once per batch (one
-// request of a provider) and shared by the node reads of that batch; an
-// interface that vanished since the listing answers KSI_ERR_NOT_FOUND.
+// Interface addresses, the CPU topology and the CPU activity are read once per
+// request (from KSI_CheckSig on, on the calling thread) and shared by the node
+// reads of that request only: concurrent requests on other threads each have
+// their own snapshot, and an interface that vanishes during a request still
+// answers what the request's listing saw.
 #pragma once
 
-#include "cpu_state.hpp"
+#include "cpu_load_sampler.hpp"
 #include "cpu_topology.hpp"
 #include "interface_addresses.hpp"
 
@@ -13,7 +15,6 @@
 #include <chrono>
 #include <map>
 #include <memory>
-#include <mutex>
 
 namespace orv::linuxhost {
 
@@ -31,7 +32,7 @@ class LinuxKsi final : public orv::platform::KsiBackend {
 public:
     explicit LinuxKsi(LinuxRoots roots);
 
-    // Drops the per-batch snapshots.
+    // Drops the calling thread's snapshot: its next read starts a new request.
     void invalidate();
 
     KSI_Status checkSig(const void* signature, uint32_t length, uint32_t* result) override;
@@ -41,12 +42,15 @@ public:
 
 private:
     using Interfaces = std::vector<InterfaceAddresses>;
-    using Activity = std::map<unsigned, CpuActivity>;
+    using Activity = CpuActivities;
+    struct Snapshot;
 
     std::shared_ptr<const Interfaces> interfaces();
     std::shared_ptr<const CpuTopology> topology();
     std::shared_ptr<const Activity> activity();
-    // The interface named by params[1] after the stack in params[0], if it still exists.
+    // The calling thread's snapshot of this instance.
+    Snapshot& snapshot();
+    // The interface named by params[1] after the stack in params[0], as the request's snapshot has it.
     const InterfaceAddresses* vnic(const Interfaces& all, const orv::platform::KsiParams& params) const;
 
     KSI_Status getNetwork(KSI_NodeId node, const orv::platform::KsiParams& params, void* out, uint32_t outSize);
@@ -54,10 +58,8 @@ private:
     KSI_Status getScheduler(KSI_NodeId node, const orv::platform::KsiParams& params, void* out, uint32_t outSize);
 
     LinuxRoots roots_;
-    std::mutex mutex_;
-    std::shared_ptr<const Interfaces> interfaces_;
-    std::shared_ptr<const CpuTopology> topology_;
-    std::shared_ptr<const Activity> activity_;
+    const std::uint64_t id_;  // tells this instance's thread snapshots from another's
+    CpuLoadSampler sampler_;
 };
 
 }  // namespace orv::linuxhost

@@ -17,8 +17,12 @@ namespace NN = NodeMgr::Network;
 using NodeMgr::Lib::NodeMgrException;
 
 LinuxPnic::LinuxPnic(std::string name, std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
-                     std::shared_ptr<EthtoolNetlinkChannel> netlink)
-    : name_(std::move(name)), sysfs_(std::move(sysRoot)), channel_(std::move(channel)), netlink_(std::move(netlink))
+                     std::shared_ptr<EthtoolNetlinkChannel> netlink, std::shared_ptr<RouteStatistics> route)
+    : name_(std::move(name)),
+      sysfs_(std::move(sysRoot)),
+      channel_(std::move(channel)),
+      netlink_(std::move(netlink)),
+      route_(route ? std::move(route) : std::make_shared<RouteStatistics>())
 {
 }
 
@@ -45,15 +49,17 @@ bool LinuxPnic::linkUp() const
 
 std::optional<ethtool_wolinfo> LinuxPnic::wakeOnLan() const
 {
+    if (wol_) return *wol_;
     try {
-        return ethtool().wakeOnLan();
+        wol_ = ethtool().wakeOnLan();
     } catch (const LinuxCallError& error) {
         if (!error.unsupported()) throw;
-        return std::nullopt;
+        wol_ = std::optional<ethtool_wolinfo>();
     }
+    return *wol_;
 }
 
-void LinuxPnic::Refresh() {}  // every operation reads the kernel afresh
+void LinuxPnic::Refresh() { wol_.reset(); }
 void LinuxPnic::SaveConfig() { refuse("SaveConfig"); }
 void LinuxPnic::LoadConfig() { refuse("LoadConfig"); }
 
@@ -86,7 +92,8 @@ NN::Duplex LinuxPnic::GetConfiguredDuplex() const
 NN::Duplex LinuxPnic::GetDuplex() const
 {
     return guarded("GetDuplex", [&] {
-        auto duplex = attributes().duplex;
+        if (!linkUp()) return NN::DUPLEX_MODE_AUTO;  // drivers keep the last speed and duplex after the link drops
+        auto duplex = sysfs_.duplex(name_);
         return duplex == "full" ? NN::DUPLEX_MODE_FULL : duplex == "half" ? NN::DUPLEX_MODE_HALF : NN::DUPLEX_MODE_AUTO;
     });
 }
@@ -122,7 +129,8 @@ NN::LinkSpeed LinuxPnic::GetConfiguredLinkSpeed() const
 NN::LinkSpeed LinuxPnic::GetLinkSpeed() const
 {
     return guarded("GetLinkSpeed", [&] {
-        auto speed = attributes().speed.value_or(-1);
+        if (!linkUp()) return NN::CONNECTION_AUTO;
+        auto speed = sysfs_.speed(name_).value_or(-1);
         return speed > 0 ? toLinkSpeed(static_cast<std::uint32_t>(speed)) : NN::CONNECTION_AUTO;
     });
 }
@@ -210,8 +218,7 @@ bool LinuxPnic::IsPseudoDevice() const { return false; }
 void LinuxPnic::GetSourcePortStats(NN::PnicSourcePortStats& stats) const
 {
     guarded("GetSourcePortStats", [&] {
-        NetlinkSocket route(NETLINK_ROUTE);
-        auto link = readLinkStatistics(route, name_);
+        auto link = route_->read(name_);
         stats = NN::PnicSourcePortStats{link.tx_packets, link.rx_packets, link.tx_bytes, link.rx_bytes};
     });
 }
@@ -219,8 +226,7 @@ void LinuxPnic::GetSourcePortStats(NN::PnicSourcePortStats& stats) const
 void LinuxPnic::GetPnicStats(NN::PnicStats& stats) const
 {
     guarded("GetPnicStats", [&] {
-        NetlinkSocket route(NETLINK_ROUTE);
-        auto link = readLinkStatistics(route, name_);
+        auto link = route_->read(name_);
         std::vector<DriverStatistic> driver;
         try {
             driver = ethtool().driverStatistics();
@@ -286,16 +292,7 @@ void LinuxPnic::GetPnicRingInfo(NN::PnicRingInfo& preset, NN::PnicRingInfo& curr
 
 void LinuxPnic::GetPnicOffloadInfo(NN::PnicOffloadInfo& info) const
 {
-    guarded("GetPnicOffloadInfo", [&] {
-        EthtoolReader reader = ethtool();
-        info.rxChecksum = reader.value(ETHTOOL_GRXCSUM, "ETHTOOL_GRXCSUM") != 0;
-        info.txChecksum = reader.value(ETHTOOL_GTXCSUM, "ETHTOOL_GTXCSUM") != 0;
-        info.scatterGather = reader.value(ETHTOOL_GSG, "ETHTOOL_GSG") != 0;
-        info.tcpSegmentation = reader.value(ETHTOOL_GTSO, "ETHTOOL_GTSO") != 0;
-        info.udpFragmentation = reader.value(ETHTOOL_GUFO, "ETHTOOL_GUFO") != 0;
-        info.genericSegmentation = reader.value(ETHTOOL_GGSO, "ETHTOOL_GGSO") != 0;
-        info.largeReceive = (reader.value(ETHTOOL_GFLAGS, "ETHTOOL_GFLAGS") & ETH_FLAG_LRO) != 0;
-    });
+    guarded("GetPnicOffloadInfo", [&] { info = toOffloadInfo(ethtool().activeFeatures()); });
 }
 
 void LinuxPnic::GetPnicSoftwareSimulationInfo(NN::PnicSoftwareSimulationInfo& info) const

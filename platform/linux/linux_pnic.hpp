@@ -1,10 +1,13 @@
 // One physical NIC of the running machine behind the NIC library's Pnic
-// interface. Nothing is cached: every operation asks the kernel afresh, and a
-// kernel refusal (the NIC vanished, the driver does not implement the query)
-// fails that operation alone with NodeMgrException.
+// interface. A pnic object lives for one request: every operation asks the
+// kernel afresh, except wake-on-LAN and the PCI identity, read once per object
+// (a port instance asks wake-on-LAN three times). A kernel refusal (the NIC
+// vanished, the driver does not implement the query) fails that operation
+// alone with NodeMgrException.
 #pragma once
 
 #include "ethtool_reader.hpp"
+#include "link_statistics.hpp"
 #include "sysfs_net.hpp"
 
 #include "nodemgr/network/Pnic.h"
@@ -31,8 +34,9 @@ private:
 
 class LinuxPnic final : public NodeMgr::Network::Pnic {
 public:
+    // Without a shared rtnetlink socket the pnic opens one of its own.
     LinuxPnic(std::string name, std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
-              std::shared_ptr<EthtoolNetlinkChannel> netlink = nullptr);
+              std::shared_ptr<EthtoolNetlinkChannel> netlink = nullptr, std::shared_ptr<RouteStatistics> route = nullptr);
 
     void Refresh() override;
     void SaveConfig() override;
@@ -108,7 +112,9 @@ private:
     SysfsNet sysfs_;
     std::shared_ptr<EthtoolChannel> channel_;
     std::shared_ptr<EthtoolNetlinkChannel> netlink_;
+    std::shared_ptr<RouteStatistics> route_;
     mutable std::unique_ptr<LinuxPciDevice> pci_;
+    mutable std::optional<std::optional<ethtool_wolinfo>> wol_;  // outer: asked yet; inner: supported
 };
 
 }  // namespace orv::linuxhost

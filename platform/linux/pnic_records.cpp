@@ -2,6 +2,7 @@
 
 #include "link_modes.hpp"
 
+#include <algorithm>
 #include <cstdio>
 #include <cstring>
 #include <initializer_list>
@@ -89,6 +90,26 @@ void fillMessageLevel(NN::PnicInfo& info, const std::optional<std::uint32_t>& le
 {
     info.msglvlSupported = level.has_value();
     info.messageLevel = level.value_or(0);
+}
+
+NN::PnicOffloadInfo toOffloadInfo(const std::vector<std::string>& activeFeatures)
+{
+    auto on = [&](std::initializer_list<const char*> names) {
+        for (const char* name : names) {
+            if (std::find(activeFeatures.begin(), activeFeatures.end(), name) != activeFeatures.end()) return true;
+        }
+        return false;
+    };
+    NN::PnicOffloadInfo info;
+    info.rxChecksum = on({"rx-checksum"});
+    info.txChecksum = on({"tx-checksum-ipv4", "tx-checksum-ip-generic", "tx-checksum-ipv6"});
+    info.scatterGather = on({"tx-scatter-gather"});
+    info.tcpSegmentation = on({"tx-tcp-segmentation", "tx-tcp-ecn-segmentation", "tx-tcp-mangleid-segmentation",
+                               "tx-tcp6-segmentation"});
+    info.udpFragmentation = on({"tx-udp-fragmentation"});  // gone from kernels since 4.14: false there
+    info.genericSegmentation = on({"tx-generic-segmentation"});
+    info.largeReceive = on({"rx-lro"});
+    return info;
 }
 
 NN::PnicDriverInfo toDriverInfo(const ethtool_drvinfo& info)

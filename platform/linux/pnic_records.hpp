@@ -25,6 +25,8 @@ void fillWakeOnPart(NodeMgr::Network::PnicInfo& info, const std::optional<ethtoo
 void fillMessageLevel(NodeMgr::Network::PnicInfo& info, const std::optional<std::uint32_t>& level);
 
 NodeMgr::Network::PnicDriverInfo toDriverInfo(const ethtool_drvinfo& info);
+// The offload record from the names of the features that are on.
+NodeMgr::Network::PnicOffloadInfo toOffloadInfo(const std::vector<std::string>& activeFeatures);
 NodeMgr::Network::PnicCoalesceInfo toCoalesceInfo(const ethtool_coalesce& coalesce);
 NodeMgr::Network::PnicPauseInfo toPauseInfo(const ethtool_pauseparam& pause, const LinkSettings* settings);
 // preset from the maxima, current from the sizes in use.

@@ -14,21 +14,24 @@ namespace orv::linuxhost {
 
 namespace {
 
-bool isPciFunctionDir(const fs::path& dir)
+// The bus a sysfs device sits on: the name its `subsystem` link points to.
+std::string subsystemOf(const std::string& deviceDir)
 {
-    if (!parsePciAddress(dir.filename().string())) return false;
     std::error_code ec;
-    auto subsystem = fs::read_symlink(dir / "subsystem", ec);
-    return !ec && subsystem.filename() == "pci";
+    auto subsystem = fs::read_symlink(deviceDir + "/subsystem", ec);
+    return ec ? std::string() : subsystem.filename().string();
 }
 
-std::optional<PciDeviceInfo> readPciFunction(const fs::path& dir)
+// The PCI function at dir, named addressName in its parent.
+std::optional<PciDeviceInfo> readPciFunction(const std::string& dir, const std::string& addressName)
 {
-    auto vendor = readNumber((dir / "vendor").string());
-    auto device = readNumber((dir / "device").string());
+    auto address = parsePciAddress(addressName);
+    if (!address || subsystemOf(dir) != "pci") return std::nullopt;
+    auto vendor = readNumber(dir + "/vendor");
+    auto device = readNumber(dir + "/device");
     if (!vendor || !device) return std::nullopt;
     PciDeviceInfo info;
-    info.address = *parsePciAddress(dir.filename().string());
+    info.address = *address;
     info.vendorId = static_cast<std::uint16_t>(*vendor);
     info.deviceId = static_cast<std::uint16_t>(*device);
     return info;
@@ -79,13 +82,17 @@ bool SysfsNet::hasBusDevice(const std::string& name) const
 
 std::optional<PciDeviceInfo> SysfsNet::pciDevice(const std::string& name) const
 {
+    // The class entry names the whole device path: .../<bus parent>/<bus device>/net/<name>.
     std::error_code ec;
-    fs::path dir = fs::canonical(netDir(name) + "/device", ec);
+    const fs::path classTarget = fs::read_symlink(netDir(name), ec);
     if (ec) return std::nullopt;
-    fs::path stop = fs::canonical(root_, ec);
-    for (; !ec && dir != stop && dir.has_relative_path(); dir = dir.parent_path()) {
-        if (isPciFunctionDir(dir)) return readPciFunction(dir);
-    }
+    const fs::path deviceDir = classTarget.parent_path().parent_path();
+    const std::string device = netDir(name) + "/device";
+    const std::string bus = subsystemOf(device);
+    if (bus == "pci") return readPciFunction(device, deviceDir.filename().string());
+    // A virtio device is a function of the PCI device right above it; any other
+    // bus (USB, SDIO, a platform device) ends the search: the NIC is not on PCI.
+    if (bus == "virtio") return readPciFunction(device + "/..", deviceDir.parent_path().filename().string());
     return std::nullopt;
 }
 
@@ -100,8 +107,8 @@ SysfsLinkAttributes SysfsNet::linkAttributes(const std::string& name) const
     attributes.operstate = requireLine(dir + "/operstate");
     attributes.address = requireLine(dir + "/address");
     attributes.carrier = carrier(name);
-    attributes.speed = readSignedNumber(dir + "/speed");
-    attributes.duplex = readLine(dir + "/duplex").value_or("");
+    attributes.speed = speed(name);
+    attributes.duplex = duplex(name);
     return attributes;
 }
 
@@ -111,6 +118,16 @@ std::uint64_t SysfsNet::numberAttribute(const std::string& name, const char* fil
     auto value = parseNumber(requireLine(path));
     if (!value) throw LinuxCallError("parse", path, EINVAL);
     return *value;
+}
+
+std::optional<std::int64_t> SysfsNet::speed(const std::string& name) const
+{
+    return readSignedNumber(netDir(name) + "/speed");
+}
+
+std::string SysfsNet::duplex(const std::string& name) const
+{
+    return readLine(netDir(name) + "/duplex").value_or("");
 }
 
 std::optional<bool> SysfsNet::carrier(const std::string& name) const

@@ -37,13 +37,18 @@ public:
     // The devices that have a bus device (a `device` link), in interface-index order.
     std::vector<std::string> busDevices() const;
     bool hasBusDevice(const std::string& name) const;
-    // The PCI function that carries the device: the nearest ancestor of its bus device
-    // that is a PCI device. Nothing for a device on another bus.
+    // The PCI function that carries the device: its bus device when that is a PCI
+    // function, the PCI function above it when it is a virtio device. Nothing for a
+    // device on another bus (a USB NIC is not its host controller).
     std::optional<PciDeviceInfo> pciDevice(const std::string& name) const;
     // Throws LinuxCallError when the device is gone.
     SysfsLinkAttributes linkAttributes(const std::string& name) const;
     // One numeric attribute file ("mtu", "flags", ...); throws LinuxCallError.
     std::uint64_t numberAttribute(const std::string& name, const char* file) const;
+    // Speed in Mb/s (-1: unknown) and duplex text as the driver reports them,
+    // whether or not the link is up; nothing / empty when unreadable.
+    std::optional<std::int64_t> speed(const std::string& name) const;
+    std::string duplex(const std::string& name) const;
     // Carrier of an interface; nothing while it is administratively down.
     std::optional<bool> carrier(const std::string& name) const;
 

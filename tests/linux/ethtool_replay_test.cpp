@@ -2,6 +2,7 @@
 #include "ethtool_reader.hpp"
 #include "link_statistics.hpp"
 #include "linux_call_error.hpp"
+#include "linux_pnic.hpp"
 #include "pnic_records.hpp"
 #include "support/ethtool_replay.hpp"
 #include "support/test_data.hpp"
@@ -218,4 +219,13 @@ TEST(LegacyDriver, StatisticsCountFromDriverInfoWhenStringSetsAreUnsupported)
     EXPECT_TRUE(reader.driverStatistics().empty());  // n_stats 0 in the driver info
     EXPECT_EQ(channel.exchanges(ETHTOOL_GDRVINFO), 1u);
     EXPECT_EQ(errorOf([&] { reader.coalesce(); }), EOPNOTSUPP);
+}
+
+TEST(CopperAdapter, APortAsksWakeOnLanOnce)
+{
+    auto channel = std::make_shared<ReplayChannel>(fixture("composed_copper_1g"));
+    LinuxPnic pnic("eth0", "/nonexistent", channel);
+    EXPECT_TRUE(pnic.GetWakeOnLANSupported());
+    EXPECT_TRUE(pnic.GetWakeOnLANEnabled());  // magic packet
+    EXPECT_EQ(channel->exchanges(ETHTOOL_GWOL), 1u);
 }

@@ -1,6 +1,7 @@
 // The whole Linux substitute against this machine: every value equals what
 // ip, ethtool, uname and /proc report.
 #include "linux_backend.hpp"
+#include "stack_params.hpp"
 #include "tool_output.hpp"
 
 #include "nodemgr/lib/NodeMgrException.h"
@@ -15,6 +16,7 @@
 
 using namespace orv::linuxhost;
 using orv::linuxtest::fieldAfter;
+using orv::linuxtest::stackParams;
 using orv::linuxtest::toolOutput;
 using json = nlohmann::json;
 namespace NN = NodeMgr::Network;
@@ -57,13 +59,6 @@ std::string macText(const NN::MacAddress& mac)
     char text[18];
     std::snprintf(text, sizeof text, "%02x:%02x:%02x:%02x:%02x:%02x", bytes[0], bytes[1], bytes[2], bytes[3], bytes[4], bytes[5]);
     return text;
-}
-
-orv::platform::KsiParams stackParams(std::initializer_list<std::string> rest)
-{
-    orv::platform::KsiParams params{KSI_Param::ofString(kDefaultStack)};
-    for (const auto& item : rest) params.push_back(KSI_Param::ofString(item));
-    return params;
 }
 
 // Values of "key : value" lines of /proc/cpuinfo, in order.
@@ -357,4 +352,23 @@ TEST(Machine, HostNameFqdnAndUptime)
     ASSERT_EQ(backend->host().sysInfo(info), 0);
     double uptime = std::stod(toolOutput("cat /proc/uptime").value_or("0"));
     EXPECT_NEAR(static_cast<double>(info.uptime), uptime, 2.0);
+}
+
+TEST(Machine, OffloadsEqualEthtoolFeatures)
+{
+    auto backend = machine();
+    auto isOn = [](const std::string& text, const std::string& key) { return fieldAfter(text, key).rfind("on", 0) == 0; };
+    for (const auto& name : pnicNames(*backend)) {
+        auto pnic = pnicNamed(*backend, name);
+        NN::PnicOffloadInfo info;
+        ASSERT_NO_THROW(pnic->GetPnicOffloadInfo(info)) << name;
+        auto features = toolOutput("ethtool -k " + name);
+        ASSERT_TRUE(features) << name;
+        EXPECT_EQ(info.rxChecksum, isOn(*features, "rx-checksumming")) << name;
+        EXPECT_EQ(info.scatterGather, isOn(*features, "scatter-gather")) << name;
+        EXPECT_EQ(info.tcpSegmentation, isOn(*features, "tcp-segmentation-offload")) << name;
+        EXPECT_EQ(info.genericSegmentation, isOn(*features, "generic-segmentation-offload")) << name;
+        EXPECT_EQ(info.largeReceive, isOn(*features, "large-receive-offload")) << name;
+        EXPECT_EQ(info.udpFragmentation, isOn(*features, "udp-fragmentation-offload")) << name;
+    }
 }

@@ -10,6 +10,11 @@
 #include <gtest/gtest.h>
 #include <linux/ethtool_netlink.h>
 #include <optional>
+#include <chrono>
+#include <fcntl.h>
+#include <sys/resource.h>
+#include <unistd.h>
+#include <vector>
 
 using namespace orv::linuxhost;
 
@@ -116,4 +121,25 @@ TEST(EthtoolNetlinkMachine, DeviceThatDoesNotExistIsRefusedWithEnodev)
     GenlEthtoolChannel netlink;
     NetlinkMessage answer;
     EXPECT_EQ(netlink.query(ETHTOOL_MSG_LINKINFO_GET, "orvnosuch0", answer), ENODEV);
+}
+
+TEST(EthtoolNetlinkMachine, AChannelThatCouldNotOpenTriesAgainLater)
+{
+    GenlEthtoolChannel netlink("ethtool", std::chrono::milliseconds(0));
+    NetlinkMessage answer;
+    // Every descriptor taken: the channel cannot open its socket.
+    rlimit saved{};
+    ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &saved), 0);
+    std::vector<int> taken;
+    rlimit low = saved;
+    low.rlim_cur = 64;
+    ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &low), 0);
+    for (int fd; (fd = ::open("/dev/null", O_RDONLY | O_CLOEXEC)) >= 0;) taken.push_back(fd);
+    const int refused = netlink.query(ETHTOOL_MSG_LINKINFO_GET, "lo", answer);
+    for (int fd : taken) ::close(fd);
+    ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &saved), 0);
+    EXPECT_EQ(refused, EMFILE);
+    // Descriptors free again: the next query opens the channel ("lo" answers or is not supported).
+    const int again = netlink.query(ETHTOOL_MSG_LINKINFO_GET, "lo", answer);
+    EXPECT_TRUE(again == 0 || again == EOPNOTSUPP) << std::strerror(again);
 }

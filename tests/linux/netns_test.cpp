@@ -5,6 +5,7 @@
 // so it is a kernel interface for the address nodes but never a NIC.
 #include "linux_backend.hpp"
 #include "linux_pnic.hpp"
+#include "stack_params.hpp"
 #include "tool_output.hpp"
 
 #include "nodemgr/lib/NodeMgrException.h"
@@ -18,18 +19,12 @@
 
 using namespace orv::linuxhost;
 using orv::linuxtest::runTool;
+using orv::linuxtest::stackParams;
 using orv::linuxtest::toolOutput;
 namespace NN = NodeMgr::Network;
 using Params = orv::platform::KsiParams;
 
 namespace {
-
-Params stackParams(std::initializer_list<std::string> rest)
-{
-    Params params{KSI_Param::ofString(kDefaultStack)};
-    for (const auto& item : rest) params.push_back(KSI_Param::ofString(item));
-    return params;
-}
 
 class VethNamespace : public ::testing::Test {
 protected:
@@ -160,14 +155,21 @@ TEST_F(VethNamespace, UnknownStackAndWrongParametersAreRefused)
     EXPECT_EQ(ksi.get(KSI_NODE_net_tcpip_instances_vNics_v4_ipaddr, stackParams({inner_}), &address, 8), KSI_ERR_BUFFER_SIZE);
 }
 
-TEST_F(VethNamespace, InterfaceDeletedBetweenListingAndReading)
+TEST_F(VethNamespace, InterfaceDeletedDuringARequestIsGoneOnTheNext)
 {
     ASSERT_TRUE(inside("ip addr add 10.77.4.1/24 dev " + inner_));
     enter();
     LinuxKsi ksi(LinuxRoots{});
     ASSERT_EQ(vnics(ksi), std::vector<std::string>{inner_});
     ASSERT_TRUE(inside("ip link del " + inner_));  // takes the outer end with it
-    std::uint32_t address = 0;
+    // The request that listed it reads it as its listing saw it.
+    std::uint32_t address = 0, mask = 0;
+    EXPECT_EQ(ksi.get(KSI_NODE_net_tcpip_instances_vNics_v4_ipaddr, stackParams({inner_}), &address, 4), KSI_OK);
+    EXPECT_EQ(address, inet_addr("10.77.4.1"));
+    EXPECT_EQ(ksi.get(KSI_NODE_net_tcpip_instances_vNics_v4_netmask, stackParams({inner_}), &mask, 4), KSI_OK);
+    // The next request no longer finds it.
+    ksi.invalidate();
+    EXPECT_TRUE(vnics(ksi).empty());
     EXPECT_EQ(ksi.get(KSI_NODE_net_tcpip_instances_vNics_v4_ipaddr, stackParams({inner_}), &address, 4), KSI_ERR_NOT_FOUND);
     std::optional<Params> list;
     EXPECT_EQ(ksi.getInstanceList(KSI_NODE_net_tcpip_instances_vNics_v6_addresses, stackParams({inner_}), list),

@@ -2,6 +2,7 @@
 // behind a virtio device, a virtual device without a bus, and a CPU topology.
 #include "cpu_topology.hpp"
 #include "linux_call_error.hpp"
+#include "linux_pnic.hpp"
 #include "sysfs_net.hpp"
 
 #include <filesystem>
@@ -46,20 +47,52 @@ protected:
         write(dir / "speed", "-1\n");
         write(dir / "duplex", "unknown\n");
     }
+    // A PCI function at devices/pci0000:00/<address> with its identity files.
+    fs::path pciFunction(const std::string& address, const std::string& vendor, const std::string& device)
+    {
+        const fs::path pci = root_ / "devices/pci0000:00" / address;
+        write(pci / "vendor", vendor + "\n");
+        write(pci / "device", device + "\n");
+        link(root_ / "bus/pci", pci / "subsystem");
+        return pci;
+    }
+    // The net device `name` of a bus device, with its `device` link and class entry.
+    fs::path netDeviceOf(const fs::path& busDevice, const std::string& name, const std::string& index)
+    {
+        netDevice(busDevice / "net" / name, index, "1500");
+        link(busDevice, busDevice / "net" / name / "device");
+        link(busDevice / "net" / name, root_ / "class/net" / name);
+        return busDevice / "net" / name;
+    }
     void buildNet()
     {
-        const fs::path pci = root_ / "devices/pci0000:00/0000:00:03.0";
-        write(pci / "vendor", "0x1af4\n");
-        write(pci / "device", "0x1000\n");
-        link(root_ / "bus/pci", pci / "subsystem");
-        const fs::path virtio = pci / "virtio2";
+        const fs::path virtio = pciFunction("0000:00:03.0", "0x1af4", "0x1000") / "virtio2";
         write(virtio / "vendor", "0x1af4\n");
         link(root_ / "bus/virtio", virtio / "subsystem");
-        netDevice(virtio / "net/eth0", "4", "1400");
-        link(virtio, virtio / "net/eth0/device");
-        link(virtio / "net/eth0", root_ / "class/net/eth0");
+        write(netDeviceOf(virtio, "eth0", "4") / "mtu", "1400\n");
         netDevice(root_ / "devices/virtual/net/veth0", "2", "1500");
         link(root_ / "devices/virtual/net/veth0", root_ / "class/net/veth0");
+        buildUsbNic();
+        buildLinkDownNic();
+    }
+    // A USB NIC: its interface sits under the USB host controller, a PCI function.
+    void buildUsbNic()
+    {
+        const fs::path device = pciFunction("0000:00:14.0", "0x8086", "0xa36d") / "usb1/1-1";
+        write(device / "idVendor", "0bda\n");
+        link(root_ / "bus/usb", device / "subsystem");
+        const fs::path interface = device / "1-1:1.0";
+        link(root_ / "bus/usb", interface / "subsystem");
+        netDeviceOf(interface, "usb0", "5");
+    }
+    // A PCI NIC whose cable is out: up, no carrier, the driver still showing the last speed.
+    void buildLinkDownNic()
+    {
+        const fs::path eth1 = netDeviceOf(pciFunction("0000:00:05.0", "0x8086", "0x10fb"), "eth1", "6");
+        write(eth1 / "carrier", "0\n");
+        write(eth1 / "operstate", "down\n");
+        write(eth1 / "speed", "10000\n");
+        write(eth1 / "duplex", "full\n");
     }
     void buildCpus()
     {
@@ -83,8 +116,8 @@ protected:
 TEST_F(SysfsTree, NicsAreTheDevicesWithABusDevice)
 {
     SysfsNet sysfs(root_.string());
-    EXPECT_EQ(sysfs.allDevices(), (std::vector<std::string>{"veth0", "eth0"}));  // interface-index order
-    EXPECT_EQ(sysfs.busDevices(), std::vector<std::string>{"eth0"});
+    EXPECT_EQ(sysfs.allDevices(), (std::vector<std::string>{"veth0", "eth0", "usb0", "eth1"}));  // interface-index order
+    EXPECT_EQ(sysfs.busDevices(), (std::vector<std::string>{"eth0", "usb0", "eth1"}));
     EXPECT_FALSE(sysfs.hasBusDevice("veth0"));
 }
 
@@ -120,7 +153,36 @@ TEST_F(SysfsTree, LinkAttributesAndAVanishedDevice)
     } catch (const LinuxCallError& error) {
         EXPECT_TRUE(error.vanished());
     }
-    EXPECT_TRUE(sysfs.busDevices().empty());
+    EXPECT_EQ(sysfs.busDevices(), (std::vector<std::string>{"usb0", "eth1"}));
+}
+
+TEST_F(SysfsTree, PciNicIsItsOwnPciFunction)
+{
+    auto pci = SysfsNet(root_.string()).pciDevice("eth1");
+    ASSERT_TRUE(pci);
+    EXPECT_EQ(pci->address.slot, 5);
+    EXPECT_EQ(pci->vendorId, 0x8086);
+    EXPECT_EQ(pci->deviceId, 0x10fb);
+}
+
+TEST_F(SysfsTree, UsbNicHasNoPciIdentityOfItsHostController)
+{
+    SysfsNet sysfs(root_.string());
+    EXPECT_FALSE(sysfs.pciDevice("usb0"));
+    LinuxPnic pnic("usb0", root_.string(), std::make_shared<IoctlEthtoolChannel>());
+    EXPECT_EQ(pnic.GetPciDevice(), nullptr);
+}
+
+TEST_F(SysfsTree, LinkDownNicShowsNoSpeedOrDuplex)
+{
+    LinuxPnic pnic("eth1", root_.string(), std::make_shared<IoctlEthtoolChannel>());
+    EXPECT_FALSE(pnic.IsLinkUp());
+    EXPECT_EQ(pnic.GetLinkSpeed(), NodeMgr::Network::CONNECTION_AUTO);
+    EXPECT_EQ(pnic.GetDuplex(), NodeMgr::Network::DUPLEX_MODE_AUTO);
+    write(root_ / "class/net/eth1/carrier", "1\n");  // the cable back in
+    EXPECT_TRUE(pnic.IsLinkUp());
+    EXPECT_EQ(pnic.GetLinkSpeed(), NodeMgr::Network::CONNECTION_10000);
+    EXPECT_EQ(pnic.GetDuplex(), NodeMgr::Network::DUPLEX_MODE_FULL);
 }
 
 TEST_F(SysfsTree, PackagesCoresAndCpuOrder)

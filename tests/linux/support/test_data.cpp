@@ -3,13 +3,20 @@
 #include "linux_call_error.hpp"
 
 #include <cstdlib>
+#include <stdexcept>
+#include <sys/stat.h>
 
 namespace orv::linuxtest {
 
 std::string testData(const std::string& name)
 {
     const char* source = std::getenv("ORV_SOURCE_DIR");
-    return std::string(source ? source : ".") + "/tests/linux/data/" + name;
+    const std::string directory = std::string(source ? source : ORV_TEST_SOURCE_DIR) + "/tests/linux/data/";
+    struct stat status {};
+    if (::stat(directory.c_str(), &status) != 0 || !S_ISDIR(status.st_mode)) {
+        throw std::runtime_error("the captured answers are not in " + directory + " (ORV_SOURCE_DIR names the source tree)");
+    }
+    return directory + name;
 }
 
 int errorOf(const std::function<void()>& call)
