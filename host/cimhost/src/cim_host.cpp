@@ -46,6 +46,7 @@ http::ServerOptions serverOptions(const HostConfig& config) {
     options.writeTimeout = config.writeTimeout;
     options.keepAliveTimeout = config.keepAliveTimeout;
     options.keepAliveMaxRequests = config.keepAliveMaxRequests;
+    options.maxConnectionsPerClient = config.maxConnectionsPerClient;
     if (!config.credentialsFile.empty()) {
         options.credentials = http::Credentials::loadFile(config.credentialsFile);
     }
@@ -60,6 +61,10 @@ void logRequest(const http::Request& request, const http::Response& response) {
     logLine(LogLevel::Debug, request.method + " " + request.path + " " + (method ? *method : std::string("-")) +
                                  " -> " + std::to_string(response.status) + " (" +
                                  std::to_string(response.body.size()) + " bytes)");
+}
+
+void logServerEvent(const std::string& line) {
+    logLine(LogLevel::Warning, line);
 }
 
 host::CoreConfig coreConfig(const HostConfig& config) {
@@ -89,7 +94,7 @@ CimHost::CimHost(const HostConfig& config) : impl_(std::make_unique<Impl>()) {
     impl_->server = std::make_unique<http::HttpServer>(
         serverOptions(config),
         [dispatcher](const http::Request& request) { return handleCimRequest(request, *dispatcher); },
-        logRequest);
+        logRequest, logServerEvent);
     impl_->server->bind();
 }
 

@@ -97,6 +97,11 @@ constexpr std::array kKeys = {
               }},
     ConfigKey{"threads", "threads", "worker threads serving requests (8)",
               [](HostConfig& c, std::string_view v, Base) { c.threads = parseNumber<std::size_t>(v, 1, 256); }},
+    ConfigKey{"maxClientConnections", "max-client-connections",
+              "connections one client address may hold open; more are closed at once (64)",
+              [](HostConfig& c, std::string_view v, Base) {
+                  c.maxConnectionsPerClient = parseNumber<std::size_t>(v, 1, 100000);
+              }},
     ConfigKey{"providerCallLimit", "provider-call-limit",
               "seconds a request may wait for its providers before CIM_ERR_FAILED (60; 0: no limit)",
               [](HostConfig& c, std::string_view v, Base) {

@@ -31,6 +31,7 @@ struct HostConfig {
     std::chrono::seconds keepAliveTimeout{5};
     std::size_t keepAliveMaxRequests = 100;
     std::size_t threads = 8;
+    std::size_t maxConnectionsPerClient = 64;  // open connections of one client address
     // Longest a request may wait for its providers (0: no limit); see CimDispatcher.
     std::chrono::seconds providerCallLimit{60};
     std::string hostName;  // HOST of instance paths in responses; empty: this machine's name

@@ -1,5 +1,7 @@
-// The HTTP side of the host: a thread-pooled server with keep-alive, request size and
-// time limits and optional basic authentication, handing each POST to one handler.
+// The HTTP side of the host: an event-driven server (one I/O thread for every connection,
+// a pool of workers for the handler) with keep-alive, pipelining, request size and time
+// limits, per-address connection limits and optional basic authentication, handing each
+// POST to one handler.
 #pragma once
 
 #include <chrono>
@@ -20,9 +22,12 @@ struct ServerOptions {
     std::string address = "127.0.0.1";
     int port = 5988;                  // 0: any free port (see HttpServer::port())
     std::string path = "/cimom";      // the one path that takes requests
-    std::size_t threads = 8;
-    std::size_t maxRequestBytes = 4U << 20U;  // larger bodies answer 413
-    std::chrono::seconds readTimeout{30};     // a client silent this long is dropped
+    std::size_t threads = 8;                  // workers running the handler
+    std::size_t maxRequestBytes = 4U << 20U;  // larger bodies answer 413, chunked ones too
+    std::size_t maxHeaderBytes = 16U << 10U;  // a larger request head answers 431
+    std::size_t maxHeaderCount = 100;         // more header fields answer 431
+    std::size_t maxConnectionsPerClient = 64; // further connections of one address are closed
+    std::chrono::seconds readTimeout{30};     // deadline of a request head, and of its body
     std::chrono::seconds writeTimeout{30};
     std::chrono::seconds keepAliveTimeout{5};
     std::size_t keepAliveMaxRequests = 100;
@@ -51,10 +56,12 @@ struct Response {
 using Handler = std::function<Response(const Request&)>;
 // One line per request served, when set.
 using AccessLog = std::function<void(const Request&, const Response&)>;
+// Lines worth logging at the default level, such as failed logins (rate-limited).
+using EventLog = std::function<void(const std::string&)>;
 
 class HttpServer {
 public:
-    HttpServer(ServerOptions options, Handler handler, AccessLog accessLog = {});
+    HttpServer(ServerOptions options, Handler handler, AccessLog accessLog = {}, EventLog eventLog = {});
     ~HttpServer();
     HttpServer(const HttpServer&) = delete;
     HttpServer& operator=(const HttpServer&) = delete;
@@ -66,8 +73,8 @@ public:
     int port() const noexcept;
     // Serves until stop(); returns after the requests in flight have been answered.
     void run();
-    // Stops accepting connections; callable from any thread. Has no effect before
-    // run() has started listening (see running()).
+    // Stops accepting connections and closes the idle ones; callable from any thread,
+    // also before run() (which then returns at once).
     void stop();
     // True while run() is listening.
     bool running() const noexcept;
