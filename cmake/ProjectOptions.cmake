@@ -34,9 +34,9 @@ function(orv_project_target target)
 endfunction()
 
 # A GoogleTest suite registered with ctest. Usage:
-#   orv_add_gtest(name SOURCES a.cpp b.cpp LIBS lib1 lib2)
+#   orv_add_gtest(name SOURCES a.cpp b.cpp LIBS lib1 lib2 [LABELS load])
 function(orv_add_gtest name)
-  cmake_parse_arguments(ARG "" "" "SOURCES;LIBS" ${ARGN})
+  cmake_parse_arguments(ARG "" "" "SOURCES;LIBS;LABELS" ${ARGN})
   add_executable(${name} ${ARG_SOURCES})
   orv_project_target(${name})
   target_link_libraries(${name} PRIVATE ${ARG_LIBS} GTest::gtest GTest::gtest_main GTest::gmock Threads::Threads)
@@ -45,7 +45,11 @@ function(orv_add_gtest name)
   # its first entry on its way through gtest_discover_tests.
   set_target_properties(${name} PROPERTIES CROSSCOMPILING_EMULATOR
     "/usr/bin/env;ORV_BUILD_DIR=${CMAKE_BINARY_DIR};ORV_SOURCE_DIR=${CMAKE_SOURCE_DIR}")
-  gtest_discover_tests(${name} DISCOVERY_TIMEOUT 60)
+  if(ARG_LABELS)
+    gtest_discover_tests(${name} DISCOVERY_TIMEOUT 60 PROPERTIES LABELS "${ARG_LABELS}")
+  else()
+    gtest_discover_tests(${name} DISCOVERY_TIMEOUT 60)
+  endif()
 endfunction()
 
 # Adds every sub-folder of the current folder that has a CMakeLists.txt, in name order.
