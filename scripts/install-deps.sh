@@ -9,9 +9,9 @@ PACKAGES=(
   # test and measurement tools
   libgtest-dev libgmock-dev googletest libbenchmark-dev valgrind
   # libraries the project links against
-  libboost-dev nlohmann-json3-dev libcpp-httplib-dev libexpat1-dev libmnl-dev
+  libboost-dev libssl-dev nlohmann-json3-dev libcpp-httplib-dev libexpat1-dev libmnl-dev
   # tools the end-to-end and Linux tests drive
-  sblim-wbemcli ethtool iproute2 curl procps
+  sblim-wbemcli ethtool iproute2 curl procps openssl
 )
 
 SUDO=""

@@ -40,6 +40,11 @@ http::ServerOptions serverOptions(const HostConfig& config) {
     http::ServerOptions options;
     options.address = config.listenAddress;
     options.port = config.httpPort;
+    options.http = config.enableHttp;
+    options.https = config.enableHttps;
+    options.httpsPort = config.httpsPort;
+    options.certificateFile = config.sslCertificateFile.string();
+    options.keyFile = config.sslKeyFile.string();
     options.threads = config.threads;
     options.maxRequestBytes = config.maxRequestBytes;
     options.readTimeout = config.readTimeout;
@@ -110,6 +115,10 @@ CimHost::~CimHost() {
 
 int CimHost::port() const noexcept {
     return impl_->server->port();
+}
+
+int CimHost::httpsPort() const noexcept {
+    return impl_->server->httpsPort();
 }
 
 void CimHost::run() {

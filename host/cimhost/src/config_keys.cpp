@@ -51,6 +51,16 @@ LogLevel parseLogLevel(std::string_view value) {
     throw ConfigError("'" + std::string(value) + "' is not one of error, warning, info, debug");
 }
 
+bool parseBoolean(std::string_view value) {
+    if (strncasecmp(std::string(value).c_str(), "true", 5) == 0) {
+        return true;
+    }
+    if (strncasecmp(std::string(value).c_str(), "false", 6) == 0) {
+        return false;
+    }
+    throw ConfigError("'" + std::string(value) + "' is not true or false");
+}
+
 std::string platformName(std::string_view value) {
     if (value != "sim" && value != "linux") {
         throw ConfigError("'" + std::string(value) + "' is not sim or linux");
@@ -65,6 +75,16 @@ constexpr std::array kKeys = {
               [](HostConfig& c, std::string_view v, Base) { c.listenAddress = std::string(v); }},
     ConfigKey{"httpPort", "port", "HTTP port (5988; 0 picks a free port)",
               [](HostConfig& c, std::string_view v, Base) { c.httpPort = parseNumber<int>(v, 0, 65535); }},
+    ConfigKey{"enableHttp", "enable-http", "serve HTTP on httpPort: true or false (true)",
+              [](HostConfig& c, std::string_view v, Base) { c.enableHttp = parseBoolean(v); }},
+    ConfigKey{"enableHttps", "enable-https", "serve HTTPS (TLS 1.2 and later) on httpsPort: true or false (false)",
+              [](HostConfig& c, std::string_view v, Base) { c.enableHttps = parseBoolean(v); }},
+    ConfigKey{"httpsPort", "https-port", "HTTPS port (5989; 0 picks a free port)",
+              [](HostConfig& c, std::string_view v, Base) { c.httpsPort = parseNumber<int>(v, 0, 65535); }},
+    ConfigKey{"sslCertificateFilePath", "ssl-certificate", "PEM certificate (chain) of the HTTPS side",
+              [](HostConfig& c, std::string_view v, Base b) { c.sslCertificateFile = resolve(v, b); }},
+    ConfigKey{"sslKeyFilePath", "ssl-key", "PEM private key of that certificate",
+              [](HostConfig& c, std::string_view v, Base b) { c.sslKeyFile = resolve(v, b); }},
     ConfigKey{"providerDirs", "provider-dir", "folders searched for lib<location>.so",
               [](HostConfig& c, std::string_view v, Base b) { c.providerDirs = pathList(v, b); }},
     ConfigKey{"registrationFile", "registration", "provider registration file(s)",

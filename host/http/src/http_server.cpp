@@ -12,6 +12,7 @@
 
 #include "server_context.hpp"
 #include "session.hpp"
+#include "tls_context.hpp"
 
 namespace orv::http {
 
@@ -27,39 +28,56 @@ const std::string* Request::header(std::string_view name) const noexcept {
     return nullptr;
 }
 
+namespace {
+
+// One listening socket, plain or TLS.
+struct Listener {
+    explicit Listener(asio::io_context& io, bool isTls) : acceptor(io), retry(io), tls(isTls) {}
+    tcp::acceptor acceptor;
+    asio::steady_timer retry;
+    bool tls;
+    int port = -1;
+};
+
+}  // namespace
+
 struct HttpServer::Impl {
     detail::ServerContext context;
-    tcp::acceptor acceptor{context.io};
-    asio::steady_timer acceptRetry{context.io};
-    int boundPort = -1;
+    Listener plain{context.io, false};
+    Listener secure{context.io, true};
+    std::unique_ptr<asio::ssl::context> tls;
     std::atomic<bool> running{false};
 
-    void accept();
-    void admit(tcp::socket socket);
+    void listen(Listener& listener, int port);
+    void accept(Listener& listener);
+    void admit(tcp::socket socket, bool isTls);
     void beginStop();
 };
 
-void HttpServer::Impl::accept() {
-    acceptor.async_accept([this](boost::system::error_code ec, tcp::socket socket) {
+void HttpServer::Impl::accept(Listener& listener) {
+    if (!listener.acceptor.is_open()) {
+        return;
+    }
+    listener.acceptor.async_accept([this, &listener](boost::system::error_code ec, tcp::socket socket) {
         if (context.stopping || ec == asio::error::operation_aborted) {
             return;
         }
         if (ec) {
             // Out of descriptors or the like: try again a little later instead of spinning.
-            acceptRetry.expires_after(std::chrono::milliseconds(50));
-            acceptRetry.async_wait([this](boost::system::error_code waited) {
+            listener.retry.expires_after(std::chrono::milliseconds(50));
+            listener.retry.async_wait([this, &listener](boost::system::error_code waited) {
                 if (!waited && !context.stopping) {
-                    accept();
+                    accept(listener);
                 }
             });
             return;
         }
-        admit(std::move(socket));
-        accept();
+        admit(std::move(socket), listener.tls);
+        accept(listener);
     });
 }
 
-void HttpServer::Impl::admit(tcp::socket socket) {
+void HttpServer::Impl::admit(tcp::socket socket, bool isTls) {
     boost::system::error_code ec;
     const tcp::endpoint peer = socket.remote_endpoint(ec);
     if (ec) {
@@ -77,16 +95,24 @@ void HttpServer::Impl::admit(tcp::socket socket) {
     ++count;
     // Responses go out as head then body; without this Nagle holds the body back.
     socket.set_option(tcp::no_delay(true), ec);
-    std::make_shared<detail::Session>(std::move(socket), std::move(address), context)->start();
+    if (isTls) {
+        std::make_shared<detail::Session<detail::TlsStream>>(std::move(address), context, std::move(socket), *tls)
+            ->start();
+    } else {
+        std::make_shared<detail::Session<detail::PlainStream>>(std::move(address), context, std::move(socket))
+            ->start();
+    }
 }
 
 void HttpServer::Impl::beginStop() {
     context.stopping = true;
     boost::system::error_code ignored;
-    acceptor.close(ignored);
-    acceptRetry.cancel();
-    const std::vector<detail::Session*> sessions(context.sessions.begin(), context.sessions.end());
-    for (detail::Session* session : sessions) {
+    for (Listener* listener : {&plain, &secure}) {
+        listener->acceptor.close(ignored);
+        listener->retry.cancel();
+    }
+    const std::vector<detail::SessionBase*> sessions(context.sessions.begin(), context.sessions.end());
+    for (detail::SessionBase* session : sessions) {
         session->stopServing();
     }
 }
@@ -103,16 +129,15 @@ HttpServer::~HttpServer() {
     stop();
 }
 
-void HttpServer::bind() {
-    const ServerOptions& options = impl_->context.options;
-    const std::string where = options.address + ":" + std::to_string(options.port);
+void HttpServer::Impl::listen(Listener& listener, int port) {
+    const std::string where = context.options.address + ":" + std::to_string(port);
     boost::system::error_code ec;
-    const asio::ip::address address = asio::ip::make_address(options.address, ec);
+    const asio::ip::address address = asio::ip::make_address(context.options.address, ec);
     if (ec) {
         throw std::runtime_error("cannot listen on " + where + ": not an IP address");
     }
-    const tcp::endpoint endpoint(address, static_cast<unsigned short>(options.port));
-    tcp::acceptor& acceptor = impl_->acceptor;
+    const tcp::endpoint endpoint(address, static_cast<unsigned short>(port));
+    tcp::acceptor& acceptor = listener.acceptor;
     acceptor.open(endpoint.protocol(), ec);
     if (!ec) {
         // Only SO_REUSEADDR: a port another process listens on must make bind() fail.
@@ -129,11 +154,31 @@ void HttpServer::bind() {
         acceptor.close(ignored);
         throw std::runtime_error("cannot listen on " + where + ": " + ec.message());
     }
-    impl_->boundPort = acceptor.local_endpoint().port();
+    listener.port = acceptor.local_endpoint().port();
+}
+
+void HttpServer::bind() {
+    const ServerOptions& options = impl_->context.options;
+    if (!options.http && !options.https) {
+        throw std::runtime_error("neither HTTP nor HTTPS is enabled");
+    }
+    if (options.https) {
+        impl_->tls = detail::serverTlsContext(options.certificateFile, options.keyFile);
+    }
+    if (options.http) {
+        impl_->listen(impl_->plain, options.port);
+    }
+    if (options.https) {
+        impl_->listen(impl_->secure, options.httpsPort);
+    }
 }
 
 int HttpServer::port() const noexcept {
-    return impl_->boundPort;
+    return impl_->plain.port;
+}
+
+int HttpServer::httpsPort() const noexcept {
+    return impl_->secure.port;
 }
 
 void HttpServer::run() {
@@ -141,7 +186,8 @@ void HttpServer::run() {
     asio::thread_pool workers(threads);
     impl_->context.workers = &workers;
     impl_->running.store(true);
-    impl_->accept();
+    impl_->accept(impl_->plain);
+    impl_->accept(impl_->secure);
     impl_->context.io.run();
     impl_->running.store(false);
     workers.join();

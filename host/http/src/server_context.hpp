@@ -16,7 +16,7 @@
 
 namespace orv::http::detail {
 
-class Session;
+class SessionBase;
 
 struct ServerContext {
     ServerOptions options;
@@ -27,7 +27,7 @@ struct ServerContext {
     boost::asio::thread_pool* workers = nullptr;  // set while run() serves
     LoginThrottle logins;
     std::unordered_map<std::string, std::size_t> connectionsPerAddress;
-    std::unordered_set<Session*> sessions;
+    std::unordered_set<SessionBase*> sessions;
     bool stopping = false;
 
     void event(const std::string& line) const {

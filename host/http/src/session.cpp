@@ -1,6 +1,7 @@
 #include "session.hpp"
 
 #include <boost/asio/post.hpp>
+#include <boost/asio/ssl/stream_base.hpp>
 #include <boost/asio/write.hpp>
 #include <boost/beast/http/error.hpp>
 #include <boost/beast/http/read.hpp>
@@ -59,16 +60,12 @@ Response callHandler(const Handler& handler, const Request& request) {
 
 }  // namespace
 
-Session::Session(asio::ip::tcp::socket socket, std::string address, ServerContext& context)
-    : stream_(std::move(socket)),
-      buffer_(context.options.maxHeaderBytes + 65536),
-      address_(std::move(address)),
-      context_(context),
-      delay_(context.io) {
+SessionBase::SessionBase(std::string address, ServerContext& context)
+    : address_(std::move(address)), context_(context) {
     context_.sessions.insert(this);
 }
 
-Session::~Session() {
+SessionBase::~SessionBase() {
     context_.sessions.erase(this);
     auto count = context_.connectionsPerAddress.find(address_);
     if (count != context_.connectionsPerAddress.end() && --count->second == 0) {
@@ -76,23 +73,37 @@ Session::~Session() {
     }
 }
 
-void Session::start() {
-    awaitRequest();
-}
-
-void Session::stopServing() {
-    if (state_ == State::Idle || state_ == State::Head || state_ == State::Delaying) {
-        delay_.cancel();
-        stream_.close();
+template <class Stream>
+void Session<Stream>::start() {
+    if constexpr (kTls) {
+        transport().expires_after(context_.options.readTimeout);
+        stream_.async_handshake(asio::ssl::stream_base::server, [self = shared_from_this()](error_code ec) {
+            if (!ec) {
+                self->awaitRequest();
+            }
+        });
+    } else {
+        awaitRequest();
     }
 }
 
-bool Session::keepAliveAfterThis() const {
+template <class Stream>
+void Session<Stream>::stopServing() {
+    if (state_ == State::Handshake || state_ == State::Idle || state_ == State::Head ||
+        state_ == State::Delaying) {
+        delay_.cancel();
+        transport().close();
+    }
+}
+
+template <class Stream>
+bool Session<Stream>::keepAliveAfterThis() const {
     return parser_ && parser_->is_done() && parser_->keep_alive() && !context_.stopping &&
            served_ < context_.options.keepAliveMaxRequests;
 }
 
-void Session::awaitRequest() {
+template <class Stream>
+void Session<Stream>::awaitRequest() {
     state_ = State::Idle;
     request_ = Request{};
     parser_.emplace(request_, context_.options.maxHeaderBytes, context_.options.maxHeaderCount,
@@ -102,7 +113,7 @@ void Session::awaitRequest() {
         return;
     }
     // Between requests a connection may stay silent for the keep-alive time only.
-    stream_.expires_after(context_.options.keepAliveTimeout);
+    transport().expires_after(context_.options.keepAliveTimeout);
     stream_.async_read_some(buffer_.prepare(4096), [self = shared_from_this()](error_code ec, std::size_t n) {
         if (ec) {
             return;  // closed, timed out or the server stopped
@@ -112,15 +123,17 @@ void Session::awaitRequest() {
     });
 }
 
-void Session::readHead() {
+template <class Stream>
+void Session<Stream>::readHead() {
     state_ = State::Head;
     // One deadline for the whole head, however slowly its bytes arrive.
-    stream_.expires_after(context_.options.readTimeout);
+    transport().expires_after(context_.options.readTimeout);
     beasthttp::async_read_header(stream_, buffer_, *parser_,
                                  [self = shared_from_this()](error_code ec, std::size_t) { self->onHead(ec); });
 }
 
-void Session::onHead(error_code ec) {
+template <class Stream>
+void Session<Stream>::onHead(error_code ec) {
     if (ec) {
         if (isParseError(ec)) {
             refuse(refusalStatus(ec, parser_->tooManyHeaders()));
@@ -143,7 +156,7 @@ void Session::onHead(error_code ec) {
     }
     const std::string* expect = request_.header("Expect");
     if (expect != nullptr && sameText(*expect, "100-continue") && !parser_->is_done()) {
-        stream_.expires_after(context_.options.writeTimeout);
+        transport().expires_after(context_.options.writeTimeout);
         asio::async_write(stream_, asio::buffer(kContinue.data(), kContinue.size()),
                           [self = shared_from_this()](error_code written, std::size_t) {
                               if (!written) {
@@ -155,7 +168,8 @@ void Session::onHead(error_code ec) {
     readBody();
 }
 
-bool Session::loginAccepted() {
+template <class Stream>
+bool Session<Stream>::loginAccepted() {
     if (!context_.options.credentials) {
         return true;
     }
@@ -170,7 +184,8 @@ bool Session::loginAccepted() {
     return true;
 }
 
-void Session::refuseLogin() {
+template <class Stream>
+void Session<Stream>::refuseLogin() {
     Response response = status(401);
     response.headers.emplace_back("WWW-Authenticate", "Basic realm=\"" + context_.options.realm + "\"");
     const std::string* authorization = request_.header("Authorization");
@@ -200,14 +215,16 @@ void Session::refuseLogin() {
     });
 }
 
-void Session::readBody() {
+template <class Stream>
+void Session<Stream>::readBody() {
     state_ = State::Body;
-    stream_.expires_after(context_.options.readTimeout);
+    transport().expires_after(context_.options.readTimeout);
     beasthttp::async_read(stream_, buffer_, *parser_,
                           [self = shared_from_this()](error_code ec, std::size_t) { self->onBody(ec); });
 }
 
-void Session::onBody(error_code ec) {
+template <class Stream>
+void Session<Stream>::onBody(error_code ec) {
     if (ec) {
         if (isParseError(ec)) {
             refuse(refusalStatus(ec, false));
@@ -217,9 +234,10 @@ void Session::onBody(error_code ec) {
     work();
 }
 
-void Session::work() {
+template <class Stream>
+void Session<Stream>::work() {
     state_ = State::Working;
-    stream_.expires_never();
+    transport().expires_never();
     // The worker reads request_ while this connection waits; nothing else touches it.
     asio::post(*context_.workers, [self = shared_from_this(), guard = asio::make_work_guard(context_.io)]() mutable {
         Response response = callHandler(self->context_.handler, self->request_);
@@ -231,15 +249,18 @@ void Session::work() {
     });
 }
 
-void Session::finish(Response response) {
+template <class Stream>
+void Session<Stream>::finish(Response response) {
     reply(std::move(response), keepAliveAfterThis());
 }
 
-void Session::refuse(int code) {
+template <class Stream>
+void Session<Stream>::refuse(int code) {
     reply(status(code), false);
 }
 
-void Session::reply(Response response, bool keepAlive) {
+template <class Stream>
+void Session<Stream>::reply(Response response, bool keepAlive) {
     ++served_;
     if (context_.accessLog) {
         context_.accessLog(request_, response);
@@ -257,13 +278,14 @@ void Session::reply(Response response, bool keepAlive) {
     response_.keep_alive(keepAlive);
     response_.prepare_payload();
     state_ = State::Writing;
-    stream_.expires_after(context_.options.writeTimeout);
+    transport().expires_after(context_.options.writeTimeout);
     beasthttp::async_write(stream_, response_, [self = shared_from_this(), keepAlive](error_code ec, std::size_t) {
         self->onWritten(ec, keepAlive);
     });
 }
 
-void Session::onWritten(error_code ec, bool keepAlive) {
+template <class Stream>
+void Session<Stream>::onWritten(error_code ec, bool keepAlive) {
     if (ec) {
         return;
     }
@@ -274,23 +296,32 @@ void Session::onWritten(error_code ec, bool keepAlive) {
     closeGracefully();
 }
 
-void Session::closeGracefully() {
+template <class Stream>
+void Session<Stream>::closeGracefully() {
     state_ = State::Closing;
-    error_code ignored;
-    stream_.socket().shutdown(asio::ip::tcp::socket::shutdown_send, ignored);
-    stream_.expires_after(kDrainTime);
-    drain();
+    transport().expires_after(kDrainTime);
+    if constexpr (kTls) {
+        stream_.async_shutdown([self = shared_from_this()](error_code) { self->transport().close(); });
+    } else {
+        error_code ignored;
+        stream_.socket().shutdown(asio::ip::tcp::socket::shutdown_send, ignored);
+        drain();
+    }
 }
 
-void Session::drain() {
+template <class Stream>
+void Session<Stream>::drain() {
     stream_.async_read_some(asio::buffer(scratch_), [self = shared_from_this()](error_code ec, std::size_t n) {
         self->drained_ += n;
         if (ec || self->drained_ > kMaxDrainBytes) {
-            self->stream_.close();
+            self->transport().close();
             return;
         }
         self->drain();
     });
 }
+
+template class Session<PlainStream>;
+template class Session<TlsStream>;
 
 }  // namespace orv::http::detail

@@ -17,6 +17,11 @@ enum class LogLevel { Error, Warning, Info, Debug };
 struct HostConfig {
     std::string listenAddress = "127.0.0.1";
     int httpPort = 5988;
+    bool enableHttp = true;
+    bool enableHttps = false;
+    int httpsPort = 5989;
+    std::filesystem::path sslCertificateFile;  // PEM, for HTTPS
+    std::filesystem::path sslKeyFile;          // PEM, for HTTPS
     std::vector<std::filesystem::path> providerDirs;
     std::vector<std::filesystem::path> registrationFiles;
     std::vector<std::filesystem::path> mofFiles;  // files, or folders of *.mof files

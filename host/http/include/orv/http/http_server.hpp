@@ -20,7 +20,12 @@ namespace orv::http {
 
 struct ServerOptions {
     std::string address = "127.0.0.1";
+    bool http = true;                 // serve plain HTTP on `port`
     int port = 5988;                  // 0: any free port (see HttpServer::port())
+    bool https = false;               // serve HTTPS (TLS 1.2 and later) on `httpsPort`
+    int httpsPort = 5989;             // 0: any free port (see HttpServer::httpsPort())
+    std::string certificateFile;      // PEM certificate chain of the HTTPS side
+    std::string keyFile;              // PEM private key of that certificate
     std::string path = "/cimom";      // the one path that takes requests
     std::size_t threads = 8;                  // workers running the handler
     std::size_t maxRequestBytes = 4U << 20U;  // larger bodies answer 413, chunked ones too
@@ -66,11 +71,12 @@ public:
     HttpServer(const HttpServer&) = delete;
     HttpServer& operator=(const HttpServer&) = delete;
 
-    // Opens the listening socket; throws std::runtime_error
-    // ("cannot listen on 127.0.0.1:5988: Address already in use").
+    // Opens the listening sockets and reads the certificate and key; throws
+    // std::runtime_error ("cannot listen on 127.0.0.1:5988: Address already in use").
     void bind();
-    // The port bound (the chosen one when the options asked for 0).
+    // The ports bound (the chosen ones when the options asked for 0); -1 when not served.
     int port() const noexcept;
+    int httpsPort() const noexcept;
     // Serves until stop(); returns after the requests in flight have been answered.
     void run();
     // Stops accepting connections and closes the idle ones; callable from any thread,
