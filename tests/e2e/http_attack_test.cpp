@@ -198,6 +198,21 @@ TEST_F(HttpAttackTest, PipelinedRequestsAreAnsweredInOrder) {
     }
 }
 
+TEST_F(HttpAttackTest, ConnectionClosesAfterTheHundredthRequest) {
+    RawConnection client(host_->port());
+    std::string requests;
+    for (int id = 1; id <= 101; ++id) {
+        requests += cimPost(enumerateClassNamesBody(id), "EnumerateClassNames", kUser);
+    }
+    client.send(requests);
+    for (int id = 1; id <= 100; ++id) {
+        auto response = client.readResponse(kAtOnce);
+        ASSERT_TRUE(response) << "response " << id;
+        EXPECT_EQ(response->headers["connection"], id == 100 ? "close" : "") << "response " << id;
+    }
+    EXPECT_TRUE(client.closedWithin(kAtOnce));
+}
+
 std::string headWithContentLength(const std::string& length) {
     std::string head = cimPost("", "EnumerateClassNames", kUser);
     head.replace(head.find("Content-Length: 0"), 17, "Content-Length: " + length);

@@ -99,7 +99,7 @@ void Session<Stream>::stopServing() {
 template <class Stream>
 bool Session<Stream>::keepAliveAfterThis() const {
     return parser_ && parser_->is_done() && parser_->keep_alive() && !context_.stopping &&
-           served_ < context_.options.keepAliveMaxRequests;
+           served_ + 1 < context_.options.keepAliveMaxRequests;
 }
 
 template <class Stream>
