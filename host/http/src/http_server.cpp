@@ -4,7 +4,6 @@
 #include <boost/asio/post.hpp>
 #include <boost/asio/steady_timer.hpp>
 #include <boost/asio/thread_pool.hpp>
-#include <strings.h>
 
 #include <atomic>
 #include <stdexcept>
@@ -18,15 +17,6 @@ namespace orv::http {
 
 namespace asio = boost::asio;
 using asio::ip::tcp;
-
-const std::string* Request::header(std::string_view name) const noexcept {
-    for (const auto& [key, value] : headers) {
-        if (key.size() == name.size() && strncasecmp(key.data(), name.data(), name.size()) == 0) {
-            return &value;
-        }
-    }
-    return nullptr;
-}
 
 namespace {
 

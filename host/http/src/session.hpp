@@ -93,7 +93,6 @@ private:
     State state_ = State::Handshake;
 };
 
-extern template class Session<PlainStream>;
-extern template class Session<TlsStream>;
+// session.cpp holds the members and instantiates both kinds of connection.
 
 }  // namespace orv::http::detail
