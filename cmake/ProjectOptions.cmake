@@ -20,6 +20,12 @@ elseif(NOT ORV_SANITIZE STREQUAL "")
   message(FATAL_ERROR "ORV_SANITIZE must be empty, 'address' or 'thread', not '${ORV_SANITIZE}'")
 endif()
 
+# A fuzz build instruments the libraries under test (fuzz/CMakeLists.txt); every program
+# linking them then needs the coverage callbacks, which this link option brings.
+if(ORV_FUZZ AND CMAKE_CXX_COMPILER_ID MATCHES "Clang")
+  add_link_options(-fsanitize=fuzzer-no-link)
+endif()
+
 # Warnings as errors on the project's own code. Call it for every target the
 # project defines; third-party headers are included as SYSTEM and stay quiet.
 function(orv_project_target target)

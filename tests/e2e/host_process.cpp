@@ -10,6 +10,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <regex>
+#include <sstream>
 #include <thread>
 
 namespace orv::e2e {
@@ -44,12 +45,23 @@ HostProcess::HostProcess(std::vector<std::string> args, bool choosePort) {
         close(pipeFds[0]);
         close(pipeFds[1]);
         std::vector<char*> argv;
+        // ORV_HOST_WRAPPER runs the host under a tool, e.g. "valgrind --log-file=/tmp/vg.%p".
+        std::vector<std::string> wrapper;
+        if (const char* tool = std::getenv("ORV_HOST_WRAPPER")) {
+            std::istringstream words(tool);
+            for (std::string word; words >> word;) {
+                wrapper.push_back(word);
+            }
+        }
+        for (auto& word : wrapper) {
+            argv.push_back(word.data());
+        }
         argv.push_back(const_cast<char*>(binary.c_str()));
         for (auto& arg : args) {
             argv.push_back(arg.data());
         }
         argv.push_back(nullptr);
-        execv(binary.c_str(), argv.data());
+        execvp(argv[0], argv.data());
         _exit(127);
     }
     close(pipeFds[1]);

@@ -24,6 +24,7 @@ public:
     // Waits up to 10 s for the "listening on" line; false when the host exited first.
     bool waitReady();
     int port() const noexcept { return port_; }
+    pid_t pid() const noexcept { return pid_; }
     // Sends `signal` and waits up to 10 s; the exit status, or -1 on a timeout / a signal death.
     int stop(int signal);
     // Waits up to 10 s for the process to end on its own; its exit status or -1.

@@ -42,12 +42,18 @@ http::ServerOptions serverOptions(const HostConfig& config) {
     http::ServerOptions options;
     options.address = config.listenAddress;
     options.port = config.httpPort;
+    options.http = config.enableHttp;
+    options.https = config.enableHttps;
+    options.httpsPort = config.httpsPort;
+    options.certificateFile = config.sslCertificateFile.string();
+    options.keyFile = config.sslKeyFile.string();
     options.threads = config.threads;
     options.maxRequestBytes = config.maxRequestBytes;
     options.readTimeout = config.readTimeout;
     options.writeTimeout = config.writeTimeout;
     options.keepAliveTimeout = config.keepAliveTimeout;
     options.keepAliveMaxRequests = config.keepAliveMaxRequests;
+    options.maxConnectionsPerClient = config.maxConnectionsPerClient;
     if (!config.credentialsFile.empty()) {
         options.credentials = http::Credentials::loadFile(config.credentialsFile);
     }
@@ -62,6 +68,10 @@ void logRequest(const http::Request& request, const http::Response& response) {
     logLine(LogLevel::Debug, request.method + " " + request.path + " " + (method ? *method : std::string("-")) +
                                  " -> " + std::to_string(response.status) + " (" +
                                  std::to_string(response.body.size()) + " bytes)");
+}
+
+void logServerEvent(const std::string& line) {
+    logLine(LogLevel::Warning, line);
 }
 
 host::CoreConfig coreConfig(const HostConfig& config) {
@@ -99,7 +109,7 @@ CimHost::CimHost(const HostConfig& config) : impl_(std::make_unique<Impl>()) {
     impl_->server = std::make_unique<http::HttpServer>(
         serverOptions(config),
         [dispatcher](const http::Request& request) { return handleCimRequest(request, *dispatcher); },
-        logRequest);
+        logRequest, logServerEvent);
     impl_->server->bind();
     // Subscriptions are activated once the host is sure to serve: a start that fails
     // (port taken) activates nothing and says only why it failed.
@@ -121,6 +131,10 @@ CimHost::~CimHost() {
 
 int CimHost::port() const noexcept {
     return impl_->server->port();
+}
+
+int CimHost::httpsPort() const noexcept {
+    return impl_->server->httpsPort();
 }
 
 void CimHost::run() {

@@ -85,6 +85,16 @@ constexpr std::array kKeys = {
               [](HostConfig& c, std::string_view v, Base) { c.listenAddress = std::string(v); }},
     ConfigKey{"httpPort", "port", "HTTP port (5988; 0 picks a free port)",
               [](HostConfig& c, std::string_view v, Base) { c.httpPort = parseNumber<int>(v, 0, 65535); }},
+    ConfigKey{"enableHttp", "enable-http", "serve HTTP on httpPort: true or false (true)",
+              [](HostConfig& c, std::string_view v, Base) { c.enableHttp = parseBoolean(v); }},
+    ConfigKey{"enableHttps", "enable-https", "serve HTTPS (TLS 1.2 and later) on httpsPort: true or false (false)",
+              [](HostConfig& c, std::string_view v, Base) { c.enableHttps = parseBoolean(v); }},
+    ConfigKey{"httpsPort", "https-port", "HTTPS port (5989; 0 picks a free port)",
+              [](HostConfig& c, std::string_view v, Base) { c.httpsPort = parseNumber<int>(v, 0, 65535); }},
+    ConfigKey{"sslCertificateFilePath", "ssl-certificate", "PEM certificate (chain) of the HTTPS side",
+              [](HostConfig& c, std::string_view v, Base b) { c.sslCertificateFile = resolve(v, b); }},
+    ConfigKey{"sslKeyFilePath", "ssl-key", "PEM private key of that certificate",
+              [](HostConfig& c, std::string_view v, Base b) { c.sslKeyFile = resolve(v, b); }},
     ConfigKey{"providerDirs", "provider-dir", "folders searched for lib<location>.so",
               [](HostConfig& c, std::string_view v, Base b) { c.providerDirs = pathList(v, b); }},
     ConfigKey{"registrationFile", "registration", "provider registration file(s)",
@@ -117,6 +127,11 @@ constexpr std::array kKeys = {
               }},
     ConfigKey{"threads", "threads", "worker threads serving requests (8)",
               [](HostConfig& c, std::string_view v, Base) { c.threads = parseNumber<std::size_t>(v, 1, 256); }},
+    ConfigKey{"maxClientConnections", "max-client-connections",
+              "connections one client address may hold open; more are closed at once (64)",
+              [](HostConfig& c, std::string_view v, Base) {
+                  c.maxConnectionsPerClient = parseNumber<std::size_t>(v, 1, 100000);
+              }},
     ConfigKey{"providerCallLimit", "provider-call-limit",
               "seconds a request may wait for its providers before CIM_ERR_FAILED (60; 0: no limit)",
               [](HostConfig& c, std::string_view v, Base) {

@@ -49,8 +49,14 @@ int serve(const HostConfig& config, const sigset_t& signals) {
         }
         host->stop();
     });
-    logLine(LogLevel::Info, "listening on " + config.listenAddress + ":" + std::to_string(host->port()) +
-                                " (POST /cimom)");
+    if (host->port() >= 0) {
+        logLine(LogLevel::Info, "listening on " + config.listenAddress + ":" + std::to_string(host->port()) +
+                                    " (POST /cimom)");
+    }
+    if (host->httpsPort() >= 0) {
+        logLine(LogLevel::Info, "listening on " + config.listenAddress + ":" + std::to_string(host->httpsPort()) +
+                                    " (HTTPS, POST /cimom)");
+    }
     host->run();
     pthread_kill(signalThread.native_handle(), SIGUSR1);
     signalThread.join();

@@ -2,6 +2,7 @@
 
 #include <openssl/crypto.h>
 #include <openssl/evp.h>
+#include <strings.h>
 
 #include <fstream>
 #include <sstream>
@@ -56,11 +57,25 @@ bool Credentials::check(std::string_view user, std::string_view password) const 
 }
 
 std::optional<std::string> Credentials::authenticate(std::string_view header) const {
-    constexpr std::string_view kScheme = "Basic ";
-    if (header.substr(0, kScheme.size()) != kScheme) {
+    auto claimed = basicAuthorization(header);
+    if (!claimed || !check(claimed->first, claimed->second)) {
         return std::nullopt;
     }
-    std::optional<std::string> decoded = decodeBase64(header.substr(kScheme.size()));
+    return std::move(claimed->first);
+}
+
+std::optional<std::pair<std::string, std::string>> basicAuthorization(std::string_view header) {
+    // The scheme is a token compared without regard to case (RFC 7235 2.1).
+    constexpr std::string_view kScheme = "basic";
+    if (header.size() <= kScheme.size() || strncasecmp(header.data(), kScheme.data(), kScheme.size()) != 0 ||
+        header[kScheme.size()] != ' ') {
+        return std::nullopt;
+    }
+    std::string_view credentials = header.substr(kScheme.size());
+    while (!credentials.empty() && credentials.front() == ' ') {
+        credentials.remove_prefix(1);
+    }
+    std::optional<std::string> decoded = decodeBase64(credentials);
     if (!decoded) {
         return std::nullopt;
     }
@@ -68,11 +83,7 @@ std::optional<std::string> Credentials::authenticate(std::string_view header) co
     if (colon == std::string::npos) {
         return std::nullopt;
     }
-    std::string user = decoded->substr(0, colon);
-    if (!check(user, std::string_view(*decoded).substr(colon + 1))) {
-        return std::nullopt;
-    }
-    return user;
+    return std::make_pair(decoded->substr(0, colon), decoded->substr(colon + 1));
 }
 
 std::optional<std::string> decodeBase64(std::string_view text) {

@@ -1,186 +1,195 @@
 #include "orv/http/http_server.hpp"
 
-#include <httplib.h>
-#include <strings.h>
-#include <sys/socket.h>
+#include <boost/asio/ip/tcp.hpp>
+#include <boost/asio/post.hpp>
+#include <boost/asio/steady_timer.hpp>
+#include <boost/asio/thread_pool.hpp>
 
-#include <cerrno>
-#include <cstring>
+#include <atomic>
 #include <stdexcept>
+#include <vector>
+
+#include "server_context.hpp"
+#include "session.hpp"
+#include "tls_context.hpp"
 
 namespace orv::http {
 
-const std::string* Request::header(std::string_view name) const noexcept {
-    for (const auto& [key, value] : headers) {
-        if (key.size() == name.size() && strncasecmp(key.data(), name.data(), name.size()) == 0) {
-            return &value;
-        }
-    }
-    return nullptr;
-}
-
-bool Request::headerIs(std::string_view name, std::string_view expected) const noexcept {
-    const std::string* value = header(name);
-    if (value == nullptr) {
-        return false;
-    }
-    const std::string_view text = trimBlanks(*value);
-    return text.size() == expected.size() && strncasecmp(text.data(), expected.data(), text.size()) == 0;
-}
-
-std::string_view trimBlanks(std::string_view text) noexcept {
-    while (!text.empty() && (text.front() == ' ' || text.front() == '\t')) {
-        text.remove_prefix(1);
-    }
-    while (!text.empty() && (text.back() == ' ' || text.back() == '\t')) {
-        text.remove_suffix(1);
-    }
-    return text;
-}
-
-struct HttpServer::Impl {
-    ServerOptions options;
-    Handler handler;
-    AccessLog accessLog;
-    httplib::Server server;
-    int boundPort = -1;
-
-    void serve(const httplib::Request& in, httplib::Response& out) const;
-    static void fill(const Response& response, httplib::Response& out);
-    Response unauthorized() const;
-    void configure();
-};
+namespace asio = boost::asio;
+using asio::ip::tcp;
 
 namespace {
 
-Request convert(const httplib::Request& in) {
-    Request request;
-    request.method = in.method;
-    request.path = in.path;
-    request.body = in.body;
-    for (const auto& [key, value] : in.headers) {
-        request.headers.emplace_back(key, value);
-    }
-    return request;
-}
-
-// Only SO_REUSEADDR: a port another process listens on must make bind() fail.
-void listeningSocketOptions(socket_t sock) {
-    int yes = 1;
-    setsockopt(sock, SOL_SOCKET, SO_REUSEADDR, &yes, sizeof yes);
-}
+// One listening socket, plain or TLS.
+struct Listener {
+    explicit Listener(asio::io_context& io, bool isTls) : acceptor(io), retry(io), tls(isTls) {}
+    tcp::acceptor acceptor;
+    asio::steady_timer retry;
+    bool tls;
+    int port = -1;
+};
 
 }  // namespace
 
-void HttpServer::Impl::fill(const Response& response, httplib::Response& out) {
-    out.status = response.status;
-    for (const auto& [key, value] : response.headers) {
-        out.set_header(key, value);
-    }
-    if (!response.contentType.empty() || !response.body.empty()) {
-        out.set_content(response.body, response.contentType.c_str());
-    }
-}
+struct HttpServer::Impl {
+    detail::ServerContext context;
+    Listener plain{context.io, false};
+    Listener secure{context.io, true};
+    std::unique_ptr<asio::ssl::context> tls;
+    std::atomic<bool> running{false};
 
-Response HttpServer::Impl::unauthorized() const {
-    Response response;
-    response.status = 401;
-    response.headers.emplace_back("WWW-Authenticate", "Basic realm=\"" + options.realm + "\"");
-    return response;
-}
+    void listen(Listener& listener, int port);
+    void accept(Listener& listener);
+    void admit(tcp::socket socket, bool isTls);
+    void beginStop();
+};
 
-void HttpServer::Impl::serve(const httplib::Request& in, httplib::Response& out) const {
-    Request request = convert(in);
-    Response response;
-    if (options.credentials) {
-        const std::string* authorization = request.header("Authorization");
-        std::optional<std::string> user =
-            authorization == nullptr ? std::nullopt : options.credentials->authenticate(*authorization);
-        if (!user) {
-            response = unauthorized();
-            fill(response, out);
-            if (accessLog) {
-                accessLog(request, response);
-            }
+void HttpServer::Impl::accept(Listener& listener) {
+    if (!listener.acceptor.is_open()) {
+        return;
+    }
+    listener.acceptor.async_accept([this, &listener](boost::system::error_code ec, tcp::socket socket) {
+        if (context.stopping || ec == asio::error::operation_aborted) {
             return;
         }
-        request.user = *user;
-    }
-    response = handler(request);
-    fill(response, out);
-    if (accessLog) {
-        accessLog(request, response);
-    }
-}
-
-void HttpServer::Impl::configure() {
-    const std::size_t threads = options.threads == 0 ? 1 : options.threads;
-    server.new_task_queue = [threads] { return new httplib::ThreadPool(threads); };
-    server.set_socket_options(listeningSocketOptions);
-    // Responses go out as headers then body; without this Nagle holds the body back.
-    server.set_tcp_nodelay(true);
-    server.set_payload_max_length(options.maxRequestBytes);
-    server.set_read_timeout(options.readTimeout);
-    server.set_write_timeout(options.writeTimeout);
-    server.set_keep_alive_timeout(static_cast<time_t>(options.keepAliveTimeout.count()));
-    server.set_keep_alive_max_count(options.keepAliveMaxRequests);
-    server.Post(options.path, [this](const httplib::Request& in, httplib::Response& out) { serve(in, out); });
-    auto notAllowed = [](const httplib::Request&, httplib::Response& out) {
-        out.status = 405;
-        out.set_header("Allow", "POST");
-    };
-    server.Get(options.path, notAllowed);
-    server.Put(options.path, notAllowed);
-    server.Delete(options.path, notAllowed);
-    server.Patch(options.path, notAllowed);
-    server.Options(options.path, notAllowed);
-    server.set_exception_handler([](const httplib::Request&, httplib::Response& out, std::exception_ptr) {
-        out.status = 500;
+        if (ec) {
+            // Out of descriptors or the like: try again a little later instead of spinning.
+            listener.retry.expires_after(std::chrono::milliseconds(50));
+            listener.retry.async_wait([this, &listener](boost::system::error_code waited) {
+                if (!waited && !context.stopping) {
+                    accept(listener);
+                }
+            });
+            return;
+        }
+        admit(std::move(socket), listener.tls);
+        accept(listener);
     });
 }
 
-HttpServer::HttpServer(ServerOptions options, Handler handler, AccessLog accessLog)
+void HttpServer::Impl::admit(tcp::socket socket, bool isTls) {
+    boost::system::error_code ec;
+    const tcp::endpoint peer = socket.remote_endpoint(ec);
+    if (ec) {
+        return;
+    }
+    std::string address = peer.address().to_string();
+    std::size_t& count = context.connectionsPerAddress[address];
+    if (count >= context.options.maxConnectionsPerClient) {
+        if (count == 0) {
+            context.connectionsPerAddress.erase(address);
+        }
+        socket.close(ec);
+        return;
+    }
+    ++count;
+    // Responses go out as head then body; without this Nagle holds the body back.
+    socket.set_option(tcp::no_delay(true), ec);
+    if (isTls) {
+        std::make_shared<detail::Session<detail::TlsStream>>(std::move(address), context, std::move(socket), *tls)
+            ->start();
+    } else {
+        std::make_shared<detail::Session<detail::PlainStream>>(std::move(address), context, std::move(socket))
+            ->start();
+    }
+}
+
+void HttpServer::Impl::beginStop() {
+    context.stopping = true;
+    boost::system::error_code ignored;
+    for (Listener* listener : {&plain, &secure}) {
+        listener->acceptor.close(ignored);
+        listener->retry.cancel();
+    }
+    const std::vector<detail::SessionBase*> sessions(context.sessions.begin(), context.sessions.end());
+    for (detail::SessionBase* session : sessions) {
+        session->stopServing();
+    }
+}
+
+HttpServer::HttpServer(ServerOptions options, Handler handler, AccessLog accessLog, EventLog eventLog)
     : impl_(std::make_unique<Impl>()) {
-    impl_->options = std::move(options);
-    impl_->handler = std::move(handler);
-    impl_->accessLog = std::move(accessLog);
-    impl_->configure();
+    impl_->context.options = std::move(options);
+    impl_->context.handler = std::move(handler);
+    impl_->context.accessLog = std::move(accessLog);
+    impl_->context.eventLog = std::move(eventLog);
 }
 
 HttpServer::~HttpServer() {
     stop();
 }
 
-void HttpServer::bind() {
-    const ServerOptions& options = impl_->options;
-    errno = 0;
-    if (options.port == 0) {
-        impl_->boundPort = impl_->server.bind_to_any_port(options.address);
-    } else if (impl_->server.bind_to_port(options.address, options.port)) {
-        impl_->boundPort = options.port;
+void HttpServer::Impl::listen(Listener& listener, int port) {
+    const std::string where = context.options.address + ":" + std::to_string(port);
+    boost::system::error_code ec;
+    const asio::ip::address address = asio::ip::make_address(context.options.address, ec);
+    if (ec) {
+        throw std::runtime_error("cannot listen on " + where + ": not an IP address");
     }
-    if (impl_->boundPort < 0) {
-        const int error = errno;
-        throw std::runtime_error("cannot listen on " + options.address + ":" +
-                                 std::to_string(options.port) + ": " +
-                                 (error != 0 ? std::strerror(error) : "address not usable"));
+    const tcp::endpoint endpoint(address, static_cast<unsigned short>(port));
+    tcp::acceptor& acceptor = listener.acceptor;
+    acceptor.open(endpoint.protocol(), ec);
+    if (!ec) {
+        // Only SO_REUSEADDR: a port another process listens on must make bind() fail.
+        acceptor.set_option(tcp::acceptor::reuse_address(true), ec);
+    }
+    if (!ec) {
+        acceptor.bind(endpoint, ec);
+    }
+    if (!ec) {
+        acceptor.listen(asio::socket_base::max_listen_connections, ec);
+    }
+    if (ec) {
+        boost::system::error_code ignored;
+        acceptor.close(ignored);
+        throw std::runtime_error("cannot listen on " + where + ": " + ec.message());
+    }
+    listener.port = acceptor.local_endpoint().port();
+}
+
+void HttpServer::bind() {
+    const ServerOptions& options = impl_->context.options;
+    if (!options.http && !options.https) {
+        throw std::runtime_error("neither HTTP nor HTTPS is enabled");
+    }
+    if (options.https) {
+        impl_->tls = detail::serverTlsContext(options.certificateFile, options.keyFile);
+    }
+    if (options.http) {
+        impl_->listen(impl_->plain, options.port);
+    }
+    if (options.https) {
+        impl_->listen(impl_->secure, options.httpsPort);
     }
 }
 
 int HttpServer::port() const noexcept {
-    return impl_->boundPort;
+    return impl_->plain.port;
+}
+
+int HttpServer::httpsPort() const noexcept {
+    return impl_->secure.port;
 }
 
 void HttpServer::run() {
-    impl_->server.listen_after_bind();
+    const std::size_t threads = impl_->context.options.threads == 0 ? 1 : impl_->context.options.threads;
+    asio::thread_pool workers(threads);
+    impl_->context.workers = &workers;
+    impl_->running.store(true);
+    impl_->accept(impl_->plain);
+    impl_->accept(impl_->secure);
+    impl_->context.io.run();
+    impl_->running.store(false);
+    workers.join();
+    impl_->context.workers = nullptr;
 }
 
 void HttpServer::stop() {
-    impl_->server.stop();
+    asio::post(impl_->context.io, [impl = impl_.get()] { impl->beginStop(); });
 }
 
 bool HttpServer::running() const noexcept {
-    return impl_->server.is_running();
+    return impl_->running.load();
 }
 
 }  // namespace orv::http

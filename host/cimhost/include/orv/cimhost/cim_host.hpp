@@ -19,7 +19,9 @@ public:
     CimHost(const CimHost&) = delete;
     CimHost& operator=(const CimHost&) = delete;
 
+    // The HTTP and HTTPS ports listened on; -1 for a side that is off.
     int port() const noexcept;
+    int httpsPort() const noexcept;
     // Serves until stop(); then lets the requests in flight finish and shuts the
     // providers down (cleanup with terminating = true).
     void run();

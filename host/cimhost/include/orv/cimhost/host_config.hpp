@@ -19,6 +19,11 @@ enum class LogLevel { Error, Warning, Info, Debug };
 struct HostConfig {
     std::string listenAddress = "127.0.0.1";
     int httpPort = 5988;
+    bool enableHttp = true;
+    bool enableHttps = false;
+    int httpsPort = 5989;
+    std::filesystem::path sslCertificateFile;  // PEM, for HTTPS
+    std::filesystem::path sslKeyFile;          // PEM, for HTTPS
     std::vector<std::filesystem::path> providerDirs;
     std::vector<std::filesystem::path> registrationFiles;
     std::vector<std::filesystem::path> mofFiles;  // files, or folders of *.mof files
@@ -33,6 +38,7 @@ struct HostConfig {
     std::chrono::seconds keepAliveTimeout{5};
     std::size_t keepAliveMaxRequests = 100;
     std::size_t threads = 8;
+    std::size_t maxConnectionsPerClient = 64;  // open connections of one client address
     // Longest a request may wait for its providers (0: no limit); see CimDispatcher.
     std::chrono::seconds providerCallLimit{60};
     std::string hostName;  // HOST of instance paths in responses; empty: this machine's name

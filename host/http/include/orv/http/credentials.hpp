@@ -11,6 +11,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 
 namespace orv::http {
 
@@ -29,6 +30,10 @@ public:
 private:
     std::map<std::string, std::string, std::less<>> users_;
 };
+
+// The user and password of an "Authorization: Basic ..." header value (the scheme in any
+// case); nullopt when the header is not well-formed basic authorization.
+std::optional<std::pair<std::string, std::string>> basicAuthorization(std::string_view header);
 
 // Decodes base64 text; nullopt when it is not valid base64.
 std::optional<std::string> decodeBase64(std::string_view text);

@@ -1,5 +1,7 @@
-// The HTTP side of the host: a thread-pooled server with keep-alive, request size and
-// time limits and optional basic authentication, handing each POST to one handler.
+// The HTTP side of the host: an event-driven server (one I/O thread for every connection,
+// a pool of workers for the handler) with keep-alive, pipelining, request size and time
+// limits, per-address connection limits and optional basic authentication, handing each
+// POST to one handler.
 #pragma once
 
 #include <chrono>
@@ -18,11 +20,19 @@ namespace orv::http {
 
 struct ServerOptions {
     std::string address = "127.0.0.1";
+    bool http = true;                 // serve plain HTTP on `port`
     int port = 5988;                  // 0: any free port (see HttpServer::port())
+    bool https = false;               // serve HTTPS (TLS 1.2 and later) on `httpsPort`
+    int httpsPort = 5989;             // 0: any free port (see HttpServer::httpsPort())
+    std::string certificateFile;      // PEM certificate chain of the HTTPS side
+    std::string keyFile;              // PEM private key of that certificate
     std::string path = "/cimom";      // the one path that takes requests
-    std::size_t threads = 8;
-    std::size_t maxRequestBytes = 4U << 20U;  // larger bodies answer 413
-    std::chrono::seconds readTimeout{30};     // a client silent this long is dropped
+    std::size_t threads = 8;                  // workers running the handler
+    std::size_t maxRequestBytes = 4U << 20U;  // larger bodies answer 413, chunked ones too
+    std::size_t maxHeaderBytes = 16U << 10U;  // a larger request head answers 431
+    std::size_t maxHeaderCount = 100;         // more header fields answer 431
+    std::size_t maxConnectionsPerClient = 64; // further connections of one address are closed
+    std::chrono::seconds readTimeout{30};     // deadline of a request head, and of its body
     std::chrono::seconds writeTimeout{30};
     std::chrono::seconds keepAliveTimeout{5};
     std::size_t keepAliveMaxRequests = 100;
@@ -57,23 +67,26 @@ struct Response {
 using Handler = std::function<Response(const Request&)>;
 // One line per request served, when set.
 using AccessLog = std::function<void(const Request&, const Response&)>;
+// Lines worth logging at the default level, such as failed logins (rate-limited).
+using EventLog = std::function<void(const std::string&)>;
 
 class HttpServer {
 public:
-    HttpServer(ServerOptions options, Handler handler, AccessLog accessLog = {});
+    HttpServer(ServerOptions options, Handler handler, AccessLog accessLog = {}, EventLog eventLog = {});
     ~HttpServer();
     HttpServer(const HttpServer&) = delete;
     HttpServer& operator=(const HttpServer&) = delete;
 
-    // Opens the listening socket; throws std::runtime_error
-    // ("cannot listen on 127.0.0.1:5988: Address already in use").
+    // Opens the listening sockets and reads the certificate and key; throws
+    // std::runtime_error ("cannot listen on 127.0.0.1:5988: Address already in use").
     void bind();
-    // The port bound (the chosen one when the options asked for 0).
+    // The ports bound (the chosen ones when the options asked for 0); -1 when not served.
     int port() const noexcept;
+    int httpsPort() const noexcept;
     // Serves until stop(); returns after the requests in flight have been answered.
     void run();
-    // Stops accepting connections; callable from any thread. Has no effect before
-    // run() has started listening (see running()).
+    // Stops accepting connections and closes the idle ones; callable from any thread,
+    // also before run() (which then returns at once).
     void stop();
     // True while run() is listening.
     bool running() const noexcept;

@@ -1,0 +1,40 @@
+// What every connection of the server shares: the options, the handler, the worker pool,
+// the per-address counts and the failed-login throttle. Touched from the I/O thread only,
+// except the handler, which runs on the workers.
+#pragma once
+
+#include <boost/asio/io_context.hpp>
+#include <boost/asio/thread_pool.hpp>
+
+#include <cstddef>
+#include <string>
+#include <unordered_map>
+#include <unordered_set>
+
+#include "login_throttle.hpp"
+#include "orv/http/http_server.hpp"
+
+namespace orv::http::detail {
+
+class SessionBase;
+
+struct ServerContext {
+    ServerOptions options;
+    Handler handler;
+    AccessLog accessLog;
+    EventLog eventLog;
+    boost::asio::io_context io{1};
+    boost::asio::thread_pool* workers = nullptr;  // set while run() serves
+    LoginThrottle logins;
+    std::unordered_map<std::string, std::size_t> connectionsPerAddress;
+    std::unordered_set<SessionBase*> sessions;
+    bool stopping = false;
+
+    void event(const std::string& line) const {
+        if (eventLog) {
+            eventLog(line);
+        }
+    }
+};
+
+}  // namespace orv::http::detail

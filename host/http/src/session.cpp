@@ -1,0 +1,327 @@
+#include "session.hpp"
+
+#include <boost/asio/post.hpp>
+#include <boost/asio/ssl/stream_base.hpp>
+#include <boost/asio/write.hpp>
+#include <boost/beast/http/error.hpp>
+#include <boost/beast/http/read.hpp>
+#include <boost/beast/http/write.hpp>
+#include <strings.h>
+
+#include <utility>
+
+namespace orv::http::detail {
+
+namespace asio = boost::asio;
+namespace beast = boost::beast;
+namespace beasthttp = boost::beast::http;
+
+namespace {
+
+// Bytes of a refused request read and thrown away before the socket closes, so that the
+// client reads the answer instead of a reset.
+constexpr std::size_t kMaxDrainBytes = 1U << 20U;
+constexpr std::chrono::seconds kDrainTime{2};
+constexpr std::string_view kContinue = "HTTP/1.1 100 Continue\r\n\r\n";
+
+bool isParseError(const beast::error_code& ec) {
+    return ec.category() == beasthttp::make_error_code(beasthttp::error::bad_method).category() &&
+           ec != beasthttp::error::end_of_stream && ec != beasthttp::error::partial_message;
+}
+
+bool sameText(std::string_view a, std::string_view b) {
+    return a.size() == b.size() && strncasecmp(a.data(), b.data(), a.size()) == 0;
+}
+
+// The status that answers a head the parser refused.
+int refusalStatus(const beast::error_code& ec, bool tooManyHeaders) {
+    if (ec == beasthttp::error::body_limit) {
+        return 413;
+    }
+    if (ec == beasthttp::error::header_limit || tooManyHeaders) {
+        return 431;
+    }
+    return 400;
+}
+
+Response status(int code) {
+    Response response;
+    response.status = code;
+    return response;
+}
+
+Response callHandler(const Handler& handler, const Request& request) {
+    try {
+        return handler(request);
+    } catch (...) {
+        return status(500);
+    }
+}
+
+}  // namespace
+
+SessionBase::SessionBase(std::string address, ServerContext& context)
+    : address_(std::move(address)), context_(context) {
+    context_.sessions.insert(this);
+}
+
+SessionBase::~SessionBase() {
+    context_.sessions.erase(this);
+    auto count = context_.connectionsPerAddress.find(address_);
+    if (count != context_.connectionsPerAddress.end() && --count->second == 0) {
+        context_.connectionsPerAddress.erase(count);
+    }
+}
+
+template <class Stream>
+void Session<Stream>::start() {
+    if constexpr (kTls) {
+        transport().expires_after(context_.options.readTimeout);
+        stream_.async_handshake(asio::ssl::stream_base::server, [self = shared_from_this()](error_code ec) {
+            if (!ec) {
+                self->awaitRequest();
+            }
+        });
+    } else {
+        awaitRequest();
+    }
+}
+
+template <class Stream>
+void Session<Stream>::stopServing() {
+    if (state_ == State::Handshake || state_ == State::Idle || state_ == State::Head ||
+        state_ == State::Delaying) {
+        delay_.cancel();
+        transport().close();
+    }
+}
+
+template <class Stream>
+bool Session<Stream>::keepAliveAfterThis() const {
+    return parser_ && parser_->is_done() && parser_->keep_alive() && !context_.stopping &&
+           served_ + 1 < context_.options.keepAliveMaxRequests;
+}
+
+template <class Stream>
+void Session<Stream>::awaitRequest() {
+    state_ = State::Idle;
+    request_ = Request{};
+    parser_.emplace(request_, context_.options.maxHeaderBytes, context_.options.maxHeaderCount,
+                    context_.options.maxRequestBytes);
+    if (served_ == 0 || buffer_.size() > 0) {
+        readHead();
+        return;
+    }
+    // Between requests a connection may stay silent for the keep-alive time only.
+    transport().expires_after(context_.options.keepAliveTimeout);
+    stream_.async_read_some(buffer_.prepare(4096), [self = shared_from_this()](error_code ec, std::size_t n) {
+        if (ec) {
+            return;  // closed, timed out or the server stopped
+        }
+        self->buffer_.commit(n);
+        self->readHead();
+    });
+}
+
+template <class Stream>
+void Session<Stream>::readHead() {
+    state_ = State::Head;
+    // One deadline for the whole head, however slowly its bytes arrive.
+    transport().expires_after(context_.options.readTimeout);
+    beasthttp::async_read_header(stream_, buffer_, *parser_,
+                                 [self = shared_from_this()](error_code ec, std::size_t) { self->onHead(ec); });
+}
+
+template <class Stream>
+void Session<Stream>::onHead(error_code ec) {
+    if (ec) {
+        if (isParseError(ec)) {
+            refuse(refusalStatus(ec, parser_->tooManyHeaders()));
+        }
+        return;  // the client left, the deadline passed or the server stopped
+    }
+    if (request_.path != context_.options.path) {
+        refuse(404);
+        return;
+    }
+    if (request_.method != "POST") {
+        Response response = status(405);
+        response.headers.emplace_back("Allow", "POST");
+        reply(std::move(response), keepAliveAfterThis());
+        return;
+    }
+    if (!loginAccepted()) {
+        refuseLogin();
+        return;
+    }
+    const std::string* expect = request_.header("Expect");
+    if (expect != nullptr && sameText(*expect, "100-continue") && !parser_->is_done()) {
+        transport().expires_after(context_.options.writeTimeout);
+        asio::async_write(stream_, asio::buffer(kContinue.data(), kContinue.size()),
+                          [self = shared_from_this()](error_code written, std::size_t) {
+                              if (!written) {
+                                  self->readBody();
+                              }
+                          });
+        return;
+    }
+    readBody();
+}
+
+template <class Stream>
+bool Session<Stream>::loginAccepted() {
+    if (!context_.options.credentials) {
+        return true;
+    }
+    const std::string* authorization = request_.header("Authorization");
+    std::optional<std::string> user =
+        authorization == nullptr ? std::nullopt : context_.options.credentials->authenticate(*authorization);
+    if (!user) {
+        return false;
+    }
+    context_.logins.succeeded(address_);
+    request_.user = std::move(*user);
+    return true;
+}
+
+template <class Stream>
+void Session<Stream>::refuseLogin() {
+    Response response = status(401);
+    response.headers.emplace_back("WWW-Authenticate", "Basic realm=\"" + context_.options.realm + "\"");
+    const std::string* authorization = request_.header("Authorization");
+    if (authorization == nullptr) {
+        // The first step of the challenge, not a failed login.
+        reply(std::move(response), keepAliveAfterThis());
+        return;
+    }
+    auto claimed = basicAuthorization(*authorization);
+    auto verdict = context_.logins.failed(address_, claimed ? claimed->first : std::string(),
+                                          LoginThrottle::Clock::now());
+    if (verdict.logLine) {
+        context_.event(*verdict.logLine);
+    }
+    if (verdict.delay.count() == 0) {
+        reply(std::move(response), keepAliveAfterThis());
+        return;
+    }
+    // The delay holds this connection only; the I/O thread goes on serving the others.
+    state_ = State::Delaying;
+    delay_.expires_after(verdict.delay);
+    delay_.async_wait([self = shared_from_this(), response = std::move(response)](error_code ec) mutable {
+        if (!ec) {
+            const bool keepAlive = self->keepAliveAfterThis();
+            self->reply(std::move(response), keepAlive);
+        }
+    });
+}
+
+template <class Stream>
+void Session<Stream>::readBody() {
+    state_ = State::Body;
+    transport().expires_after(context_.options.readTimeout);
+    beasthttp::async_read(stream_, buffer_, *parser_,
+                          [self = shared_from_this()](error_code ec, std::size_t) { self->onBody(ec); });
+}
+
+template <class Stream>
+void Session<Stream>::onBody(error_code ec) {
+    if (ec) {
+        if (isParseError(ec)) {
+            refuse(refusalStatus(ec, false));
+        }
+        return;
+    }
+    work();
+}
+
+template <class Stream>
+void Session<Stream>::work() {
+    state_ = State::Working;
+    transport().expires_never();
+    // The worker reads request_ while this connection waits; nothing else touches it.
+    asio::post(*context_.workers, [self = shared_from_this(), guard = asio::make_work_guard(context_.io)]() mutable {
+        Response response = callHandler(self->context_.handler, self->request_);
+        asio::io_context& io = self->context_.io;
+        // The session goes back to the I/O thread with the answer; it is never released here.
+        asio::post(io, [self = std::move(self), guard = std::move(guard), response = std::move(response)]() mutable {
+            self->finish(std::move(response));
+        });
+    });
+}
+
+template <class Stream>
+void Session<Stream>::finish(Response response) {
+    reply(std::move(response), keepAliveAfterThis());
+}
+
+template <class Stream>
+void Session<Stream>::refuse(int code) {
+    reply(status(code), false);
+}
+
+template <class Stream>
+void Session<Stream>::reply(Response response, bool keepAlive) {
+    ++served_;
+    if (context_.accessLog) {
+        context_.accessLog(request_, response);
+    }
+    response_ = {};
+    response_.version(parser_ && parser_->version() == 10 ? 10 : 11);
+    response_.result(static_cast<unsigned>(response.status));
+    for (auto& [name, value] : response.headers) {
+        response_.insert(name, value);
+    }
+    if (!response.contentType.empty()) {
+        response_.set(beasthttp::field::content_type, response.contentType);
+    }
+    response_.body() = std::move(response.body);
+    response_.keep_alive(keepAlive);
+    response_.prepare_payload();
+    state_ = State::Writing;
+    transport().expires_after(context_.options.writeTimeout);
+    beasthttp::async_write(stream_, response_, [self = shared_from_this(), keepAlive](error_code ec, std::size_t) {
+        self->onWritten(ec, keepAlive);
+    });
+}
+
+template <class Stream>
+void Session<Stream>::onWritten(error_code ec, bool keepAlive) {
+    if (ec) {
+        return;
+    }
+    if (keepAlive && !context_.stopping) {
+        awaitRequest();
+        return;
+    }
+    closeGracefully();
+}
+
+template <class Stream>
+void Session<Stream>::closeGracefully() {
+    state_ = State::Closing;
+    transport().expires_after(kDrainTime);
+    if constexpr (kTls) {
+        stream_.async_shutdown([self = shared_from_this()](error_code) { self->transport().close(); });
+    } else {
+        error_code ignored;
+        stream_.socket().shutdown(asio::ip::tcp::socket::shutdown_send, ignored);
+        drain();
+    }
+}
+
+template <class Stream>
+void Session<Stream>::drain() {
+    stream_.async_read_some(asio::buffer(scratch_), [self = shared_from_this()](error_code ec, std::size_t n) {
+        self->drained_ += n;
+        if (ec || self->drained_ > kMaxDrainBytes) {
+            self->transport().close();
+            return;
+        }
+        self->drain();
+    });
+}
+
+template class Session<PlainStream>;
+template class Session<TlsStream>;
+
+}  // namespace orv::http::detail

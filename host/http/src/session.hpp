@@ -1,0 +1,98 @@
+// One client connection, plain or TLS: reads requests one after the other (pipelined ones
+// too, answered in order), checks the head and the login before reading the body, hands the
+// request to the worker pool and writes the answer. Every read and write runs under a
+// deadline, so a slow or silent client only costs a socket, never a worker.
+#pragma once
+
+#include <boost/asio/ip/tcp.hpp>
+#include <boost/asio/steady_timer.hpp>
+#include <boost/beast/core/flat_buffer.hpp>
+#include <boost/beast/core/tcp_stream.hpp>
+#include <boost/beast/http/message.hpp>
+#include <boost/beast/http/string_body.hpp>
+#include <boost/beast/ssl/ssl_stream.hpp>
+
+#include <array>
+#include <memory>
+#include <optional>
+#include <string>
+#include <type_traits>
+
+#include "request_parser.hpp"
+#include "server_context.hpp"
+
+namespace orv::http::detail {
+
+// What the server knows of every connection: it is counted for its client address and
+// listed for stop().
+class SessionBase {
+public:
+    SessionBase(std::string address, ServerContext& context);
+    virtual ~SessionBase();
+    SessionBase(const SessionBase&) = delete;
+    SessionBase& operator=(const SessionBase&) = delete;
+
+    // The server stops: a connection waiting for or reading a request head is closed; a
+    // request already read is answered, and the connection closed after it.
+    virtual void stopServing() = 0;
+
+protected:
+    std::string address_;
+    ServerContext& context_;
+};
+
+using PlainStream = boost::beast::tcp_stream;
+using TlsStream = boost::beast::ssl_stream<boost::beast::tcp_stream>;
+
+template <class Stream>
+class Session final : public SessionBase, public std::enable_shared_from_this<Session<Stream>> {
+public:
+    template <class... StreamArgs>
+    Session(std::string address, ServerContext& context, StreamArgs&&... streamArgs)
+        : SessionBase(std::move(address), context),
+          stream_(std::forward<StreamArgs>(streamArgs)...),
+          buffer_(context.options.maxHeaderBytes + 65536),
+          delay_(context.io) {}
+
+    void start();
+    void stopServing() override;
+
+private:
+    using error_code = boost::beast::error_code;
+    using std::enable_shared_from_this<Session<Stream>>::shared_from_this;
+    enum class State { Handshake, Idle, Head, Body, Working, Delaying, Writing, Closing };
+    static constexpr bool kTls = std::is_same_v<Stream, TlsStream>;
+
+    boost::beast::tcp_stream& transport() { return boost::beast::get_lowest_layer(stream_); }
+
+    void awaitRequest();
+    void readHead();
+    void onHead(error_code ec);
+    bool loginAccepted();
+    void refuseLogin();
+    void readBody();
+    void onBody(error_code ec);
+    void work();
+    void finish(Response response);
+    void refuse(int status);
+    void reply(Response response, bool keepAlive);
+    void onWritten(error_code ec, bool keepAlive);
+    void closeGracefully();
+    void drain();
+    bool keepAliveAfterThis() const;
+
+    Stream stream_;
+    boost::beast::flat_buffer buffer_;
+    Request request_;
+    std::optional<RequestParser> parser_;
+    boost::beast::http::response<boost::beast::http::string_body> response_;
+    boost::asio::steady_timer delay_;
+    std::array<char, 4096> scratch_{};
+    std::size_t drained_ = 0;
+    std::size_t served_ = 0;
+    State state_ = State::Handshake;
+};
+
+// session.cpp holds the members and instantiates both kinds of connection.
+
+}  // namespace orv::http::detail
