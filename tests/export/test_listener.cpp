@@ -13,7 +13,7 @@ TestListener::TestListener(std::chrono::seconds keepAlive) {
     http::ServerOptions options;
     options.keepAliveTimeout = keepAlive;
     options.port = 0;
-    options.path = "/.*";
+    options.path.clear();  // any path
     options.threads = 4;
     server_ = std::make_unique<http::HttpServer>(options, [this](const http::Request& request) { return serve(request); });
     server_->bind();

@@ -61,11 +61,15 @@ cimxml::ArrayNullElements arrayNullElements(std::string_view value) {
     throw ConfigError("'" + std::string(value) + "' is not drop or value-null");
 }
 
+// sfcb.cfg writes switches as true/false in any case; yes/no and 1/0 are taken too.
 bool parseSwitch(std::string_view value) {
-    if (value == "true" || value == "yes" || value == "1") {
+    auto is = [value](std::string_view word) {
+        return value.size() == word.size() && strncasecmp(value.data(), word.data(), word.size()) == 0;
+    };
+    if (is("true") || is("yes") || value == "1") {
         return true;
     }
-    if (value == "false" || value == "no" || value == "0") {
+    if (is("false") || is("no") || value == "0") {
         return false;
     }
     throw ConfigError("'" + std::string(value) + "' is not true or false");
@@ -86,9 +90,9 @@ constexpr std::array kKeys = {
     ConfigKey{"httpPort", "port", "HTTP port (5988; 0 picks a free port)",
               [](HostConfig& c, std::string_view v, Base) { c.httpPort = parseNumber<int>(v, 0, 65535); }},
     ConfigKey{"enableHttp", "enable-http", "serve HTTP on httpPort: true or false (true)",
-              [](HostConfig& c, std::string_view v, Base) { c.enableHttp = parseBoolean(v); }},
+              [](HostConfig& c, std::string_view v, Base) { c.enableHttp = parseSwitch(v); }},
     ConfigKey{"enableHttps", "enable-https", "serve HTTPS (TLS 1.2 and later) on httpsPort: true or false (false)",
-              [](HostConfig& c, std::string_view v, Base) { c.enableHttps = parseBoolean(v); }},
+              [](HostConfig& c, std::string_view v, Base) { c.enableHttps = parseSwitch(v); }},
     ConfigKey{"httpsPort", "https-port", "HTTPS port (5989; 0 picks a free port)",
               [](HostConfig& c, std::string_view v, Base) { c.httpsPort = parseNumber<int>(v, 0, 65535); }},
     ConfigKey{"sslCertificateFilePath", "ssl-certificate", "PEM certificate (chain) of the HTTPS side",

@@ -140,7 +140,7 @@ void Session<Stream>::onHead(error_code ec) {
         }
         return;  // the client left, the deadline passed or the server stopped
     }
-    if (request_.path != context_.options.path) {
+    if (!context_.options.path.empty() && request_.path != context_.options.path) {
         refuse(404);
         return;
     }

@@ -76,7 +76,7 @@ int serve(const listener::ListenerOptions& options, const sigset_t& signals) {
     http::ServerOptions serverOptions;
     serverOptions.address = options.address;
     serverOptions.port = options.port;
-    serverOptions.path = "/.*";  // a listener's URL may name any path
+    serverOptions.path.clear();  // a listener's URL may name any path
     serverOptions.threads = 4;
     serverOptions.realm = "orv-cimlistener";
     // Stopping waits for idle kept-alive connections to time out: keep that short.

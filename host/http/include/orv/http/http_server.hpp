@@ -26,7 +26,7 @@ struct ServerOptions {
     int httpsPort = 5989;             // 0: any free port (see HttpServer::httpsPort())
     std::string certificateFile;      // PEM certificate chain of the HTTPS side
     std::string keyFile;              // PEM private key of that certificate
-    std::string path = "/cimom";      // the one path that takes requests
+    std::string path = "/cimom";      // the one path that takes requests; empty: any path
     std::size_t threads = 8;                  // workers running the handler
     std::size_t maxRequestBytes = 4U << 20U;  // larger bodies answer 413, chunked ones too
     std::size_t maxHeaderBytes = 16U << 10U;  // a larger request head answers 431
