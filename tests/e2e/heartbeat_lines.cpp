@@ -1,6 +1,9 @@
 #include "heartbeat_lines.hpp"
 
+#include <gtest/gtest.h>
 #include <unistd.h>
+
+#include <cstdlib>
 
 #include <regex>
 
@@ -42,6 +45,27 @@ std::string machineHostName() {
     char name[256] = {};
     gethostname(name, sizeof name - 1);
     return name;
+}
+
+void expectFirstTwoHeartbeats(const std::vector<std::string>& lines, std::time_t subscribed) {
+    constexpr long kIntervalSeconds = 30;
+    ASSERT_GE(lines.size(), 2U);
+    const auto first = parseHeartbeatLine(lines[0]);
+    const auto second = parseHeartbeatLine(lines[1]);
+    ASSERT_TRUE(first.has_value()) << lines[0];
+    ASSERT_TRUE(second.has_value()) << lines[1];
+    EXPECT_EQ(first->stamp, 0);
+    EXPECT_EQ(second->stamp, 1);
+    EXPECT_EQ(first->hostname, machineHostName());
+    EXPECT_EQ(second->hostname, machineHostName());
+    const auto firstTime = wholeSecondTimestamp(first->indicationTime);
+    const auto secondTime = wholeSecondTimestamp(second->indicationTime);
+    ASSERT_TRUE(firstTime.has_value()) << first->indicationTime;
+    ASSERT_TRUE(secondTime.has_value()) << second->indicationTime;
+    // The first comes at once when the filter is activated.
+    EXPECT_LE(std::labs(*firstTime - subscribed), 5) << first->indicationTime;
+    EXPECT_LE(std::labs(*secondTime - *firstTime - kIntervalSeconds), 2)
+        << first->indicationTime << " " << second->indicationTime;
 }
 
 }  // namespace orv::e2e

@@ -26,4 +26,9 @@ std::optional<std::time_t> wholeSecondTimestamp(const std::string& datetime);
 // This machine's gethostname().
 std::string machineHostName();
 
+// Expects the first two listener lines to be heartbeats of this machine with
+// stamps 0 and 1, the first sent within a few seconds of `subscribed`, the
+// second one interval (30 s) later, both timestamps in whole seconds.
+void expectFirstTwoHeartbeats(const std::vector<std::string>& lines, std::time_t subscribed);
+
 }  // namespace orv::e2e
