@@ -45,8 +45,9 @@ SfcbBroker::SfcbBroker(std::string runDir, bool owned) : runDir_(std::move(runDi
 
 SfcbBroker SfcbBroker::shared() { return SfcbBroker(buildDir() + "/sfcb/shared", false); }
 
-SfcbBroker SfcbBroker::start(const std::string& runDir, const std::string& fixture) {
-    const std::string output = runCommand(sfcbBrokerScript("start") + " '" + runDir + "' " +
+SfcbBroker SfcbBroker::start(const std::string& runDir, const std::string& fixture, const std::string& root) {
+    const std::string output = runCommand((root.empty() ? "" : "ORV_SFCB_ROOT='" + root + "' ") +
+                                          sfcbBrokerScript("start") + " '" + runDir + "' " +
                                           (fixture.empty() ? "" : "'" + fixture + "'"));
     SfcbBroker broker(runDir, true);
     if (!broker.available()) {

@@ -13,8 +13,9 @@ public:
     // BUILD/sfcb/shared; it is stopped by the fixture's clean-up, not by this object.
     static SfcbBroker shared();
     // Starts a private sfcbd in runDir on a free port, serving the simulated
-    // host `fixture` (empty: the shipped example host); stopped by the destructor.
-    static SfcbBroker start(const std::string& runDir, const std::string& fixture = "");
+    // host `fixture` (empty: the shipped example host), with ORV_ROOT=`root` in its
+    // environment (empty: tests/e2e/data/root); stopped by the destructor.
+    static SfcbBroker start(const std::string& runDir, const std::string& fixture = "", const std::string& root = "");
 
     ~SfcbBroker();
     SfcbBroker(SfcbBroker&& other) noexcept;

@@ -142,6 +142,20 @@ TEST_F(SubscriptionManagerTest, MatchingIndicationsReachTheSinkWithTheSelectList
     EXPECT_EQ(m.matchCounts().at("f -> d"), 1U);
 }
 
+TEST_F(SubscriptionManagerTest, IndicationRaisedWhileTheFilterIsActivatedReachesTheNewSubscription) {
+    setenv("RAW_PROVIDER_RAISE_ON_ACTIVATE", "1", 1);
+    SubscriptionManager& m = startManager();
+    ASSERT_TRUE(m.createFilter(filter("f", "SELECT * FROM Raw_SubIndication")).ok());
+    ASSERT_TRUE(m.createDestination(destination("d")).ok());
+    const Status made = m.createSubscription(subscription("f", "d"));
+    unsetenv("RAW_PROVIDER_RAISE_ON_ACTIVATE");
+    ASSERT_TRUE(made.ok()) << made.message;
+    auto items = sink_.items();
+    ASSERT_EQ(items.size(), 1U);
+    EXPECT_EQ(items[0].subscriptionId, "f -> d");
+    EXPECT_THAT(items[0].xml, HasSubstr("<PROPERTY NAME=\"Message\" TYPE=\"string\"><VALUE>activated</VALUE>"));
+}
+
 TEST_F(SubscriptionManagerTest, EachSubscriptionGetsTheIndicationWithItsOwnSelectList) {
     SubscriptionManager& m = startManager();
     ASSERT_TRUE(m.createFilter(filter("all", "SELECT * FROM Raw_Indication")).ok());

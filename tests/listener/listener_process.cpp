@@ -90,8 +90,8 @@ int ListenerProcess::waitListening() {
     return -1;
 }
 
-std::vector<std::string> ListenerProcess::waitLines(std::size_t count) {
-    const auto until = Clock::now() + kWait;
+std::vector<std::string> ListenerProcess::waitLines(std::size_t count, std::chrono::seconds wait) {
+    const auto until = Clock::now() + wait;
     auto lines = [this] {
         std::vector<std::string> out;
         std::istringstream stream(out_);

@@ -3,6 +3,7 @@
 
 #include <sys/types.h>
 
+#include <chrono>
 #include <string>
 #include <vector>
 
@@ -18,8 +19,8 @@ public:
 
     // Waits up to 10 s for the "listening on" line; the port it names, or -1.
     int waitListening();
-    // Waits up to 10 s for `count` lines on standard output.
-    std::vector<std::string> waitLines(std::size_t count);
+    // Waits up to 10 s (or `wait`) for `count` lines on standard output.
+    std::vector<std::string> waitLines(std::size_t count, std::chrono::seconds wait = std::chrono::seconds(10));
     void signal(int number);
     // Waits up to 10 s for the exit; the exit status, or -1 (timeout or killed by a signal).
     int waitExit();

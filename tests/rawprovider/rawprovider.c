@@ -704,10 +704,22 @@ static CMPIStatus indActivate(CMPIIndicationMI* mi, const CMPIContext* ctx, cons
                               const char* cls, const CMPIObjectPath* op, CMPIBoolean first)
 {
     (void)mi;
-    (void)ctx;
     (void)se;
     (void)op;
     logLine("activateFilter %s first=%d", cls, (int)first);
+    /* With RAW_PROVIDER_RAISE_ON_ACTIVATE set, one indication of the filter's class
+       (Message "activated", Sequence 0) is delivered before the activation answers,
+       as a provider does that reports a first state at once. */
+    if (getenv("RAW_PROVIDER_RAISE_ON_ACTIVATE") != NULL) {
+        CMPIObjectPath* path = broker->eft->newObjectPath(broker, kNamespace, cls, NULL);
+        CMPIInstance* ind = broker->eft->newInstance(broker, path, NULL);
+        CMPIUint32 seq = 0;
+        ind->ft->setProperty(ind, "Message", (const CMPIValue*)"activated", CMPI_chars);
+        ind->ft->setProperty(ind, "Sequence", (const CMPIValue*)&seq, CMPI_uint32);
+        (void)broker->bft->deliverIndication(broker, ctx, kNamespace, ind);
+        ind->ft->release(ind);
+        path->ft->release(path);
+    }
     return status(CMPI_RC_OK, NULL);
 }
 

@@ -268,6 +268,24 @@ Status SubscriptionManager::activate(const SubscriptionRecord& subscription, con
     return {};
 }
 
+// Under mutex_: records the subscription and shows it to the deliveries before its
+// filter is activated, so what a provider raises as soon as it is activated (the
+// heartbeat's first indication comes at once, from its own thread) already finds it.
+// A refused activation takes it out again.
+Status SubscriptionManager::enroll(SubscriptionRecord subscription, const std::string& principal) {
+    const std::string id = storeId(subscription);
+    const SubscriptionRecord& kept = subscriptions_.emplace(id, std::move(subscription)).first->second;
+    publishSnapshot();
+    if (kept.state == 2) {
+        if (Status status = activate(kept, principal); !status.ok()) {
+            subscriptions_.erase(id);
+            publishSnapshot();
+            return status;
+        }
+    }
+    return {};
+}
+
 void SubscriptionManager::deactivate(const SubscriptionRecord& subscription) {
     const std::string key = lowerCase(subscription.filterName);
     unsigned& users = filterUse_[key];
@@ -303,20 +321,19 @@ Status SubscriptionManager::createSubscription(SubscriptionRecord subscription, 
         return refused(CMPI_RC_ERR_ALREADY_EXISTS, "subscription " + subscription.id() + " already exists");
     }
     subscription.startTime = cimNow();
-    if (subscription.state == 2) {
-        if (Status status = activate(subscription, principal); !status.ok()) {
-            return status;
-        }
-    }
-    if (Status status = persist(id, storedText(subscription)); !status.ok()) {
-        if (subscription.state == 2) {
-            deactivate(subscription);
-        }
+    if (Status status = enroll(std::move(subscription), principal); !status.ok()) {
         return status;
     }
-    log(Severity::Info, "subscription " + subscription.id() + " created");
-    subscriptions_.emplace(id, std::move(subscription));
-    publishSnapshot();
+    const SubscriptionRecord& made = subscriptions_.at(id);
+    if (Status status = persist(id, storedText(made)); !status.ok()) {
+        if (made.state == 2) {
+            deactivate(made);
+        }
+        subscriptions_.erase(id);
+        publishSnapshot();
+        return status;
+    }
+    log(Severity::Info, "subscription " + made.id() + " created");
     return {};
 }
 
@@ -435,16 +452,13 @@ std::vector<std::string> SubscriptionManager::restore() {
             problems.push_back("stored subscription " + subscription.id() + ": its filter or destination is missing");
             continue;
         }
-        if (subscription.state == 2) {
-            if (Status status = activate(subscription, {}); !status.ok()) {
-                problems.push_back("stored subscription " + subscription.id() + ": " + status.message);
-                continue;
-            }
+        const std::string id = subscription.id();
+        if (Status status = enroll(std::move(subscription), {}); !status.ok()) {
+            problems.push_back("stored subscription " + id + ": " + status.message);
+            continue;
         }
-        log(Severity::Info, "subscription " + subscription.id() + " restored");
-        subscriptions_.emplace(storeId(subscription), std::move(subscription));
+        log(Severity::Info, "subscription " + id + " restored");
     }
-    publishSnapshot();
     return problems;
 }
 

@@ -8,7 +8,9 @@
 #                                                          into it), stage liborvprovider.so with the
 #                                                          library's own MOF files and registration file, and
 #                                                          start sfcbd on a free port (RUN_DIR/port) on the
-#                                                          simulated host FIXTURE (default: the shipped one)
+#                                                          simulated host FIXTURE (default: the shipped one),
+#                                                          with ORV_ROOT=$ORV_SFCB_ROOT when that is set
+#                                                          (default: tests/e2e/data/root)
 #   sfcb_broker.sh stop BUILD_DIR SOURCE_DIR RUN_DIR      stop that sfcbd and everything it started
 # The sfcb sources and scripts are looked up in ORV_SFCB_SOURCE, else next to the repository
 # (../shared/sfcb, ../../shared/sfcb for a worktree). When sfcb is not available, prepare and
@@ -86,7 +88,7 @@ start)
     SFCB_PORT=$port "$scripts/sfcb-run.sh" stage "$run/prefix" "$run/providers" \
         "$src/cim/mof/orvprovider.reg" "${mofs[@]}" > "$run/stage.log" 2>&1 ||
         { cat "$run/stage.log" >&2; exit 1; }
-    ORV_PLATFORM=sim ORV_SIM_FIXTURE=$fixture ORV_ROOT=$src/tests/e2e/data/root SFCB_PORT=$port \
+    ORV_PLATFORM=sim ORV_SIM_FIXTURE=$fixture ORV_ROOT=${ORV_SFCB_ROOT:-$src/tests/e2e/data/root} SFCB_PORT=$port \
         "$scripts/sfcb-run.sh" start "$run/prefix"
     curl -s -o /dev/null "http://127.0.0.1:$port/" || { echo "sfcbd did not answer on port $port" >&2; exit 1; }
     echo "$port" > "$run/port" ;;

@@ -109,6 +109,7 @@ private:
 
     void deliver(std::string_view ns, const CMPIInstance* indication);
     Status activate(const SubscriptionRecord& subscription, const std::string& principal);
+    Status enroll(SubscriptionRecord subscription, const std::string& principal);
     void deactivate(const SubscriptionRecord& subscription);
     void publishSnapshot();
     void log(Severity severity, const std::string& line) const;
