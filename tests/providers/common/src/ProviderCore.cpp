@@ -18,6 +18,7 @@ orv::host::CoreConfig configFor(const ProviderCoreOptions& options) {
     orv::host::CoreConfig config;
     config.providerDirs = {ProviderCore::providerDir()};
     config.mofPaths = {ProviderCore::mofFile()};
+    config.mofPaths.insert(config.mofPaths.end(), options.mofs.begin(), options.mofs.end());
     if (options.projectRegistrations) {
         config.registrationFiles.push_back(ProviderCore::registrationFile());
     }
