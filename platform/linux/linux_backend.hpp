@@ -46,6 +46,8 @@ public:
     bool fqdn(std::string& out) override;
     bool hostName(std::string& out) override;
     int sysInfo(struct sysinfo& out) override;
+    int interfaceAddresses(ifaddrs*& list) override;
+    void freeInterfaceAddresses(ifaddrs* list) override;
 };
 
 void fillVersionRecord(const SystemVersion& version, TmkuserVersion_SystemVersionInfo& info);

@@ -1,6 +1,7 @@
 #include "linux_backend.hpp"
 
 #include <cerrno>
+#include <ifaddrs.h>
 #include <memory>
 #include <netdb.h>
 #include <sys/socket.h>
@@ -34,5 +35,17 @@ bool LinuxHost::fqdn(std::string& out)
 }
 
 int LinuxHost::sysInfo(struct sysinfo& out) { return ::sysinfo(&out) == 0 ? 0 : errno; }
+
+// The kernel's own list, of the calling thread's network namespace.
+int LinuxHost::interfaceAddresses(ifaddrs*& list)
+{
+    list = nullptr;
+    return ::getifaddrs(&list);
+}
+
+void LinuxHost::freeInterfaceAddresses(ifaddrs* list)
+{
+    if (list != nullptr) ::freeifaddrs(list);
+}
 
 }  // namespace orv::linuxhost

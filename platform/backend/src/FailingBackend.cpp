@@ -40,6 +40,13 @@ private:
     bool fqdn(std::string&) override { return false; }
     bool hostName(std::string&) override { return false; }
     int sysInfo(struct sysinfo&) override { return ENOSYS; }
+    int interfaceAddresses(ifaddrs*& list) override
+    {
+        list = nullptr;
+        errno = ENOSYS;
+        return -1;
+    }
+    void freeInterfaceAddresses(ifaddrs*) override {}
 
     std::string reason_;
 };

@@ -23,6 +23,26 @@ void readVersionStatus(JsonObject& object, FaultRule& rule, std::map<TmkuserStat
     }
 }
 
+// A getifaddrs rule with "family" adds an entry for its "nic" (an address of
+// that family, or none for null) instead of failing the call.
+void readInterfaceEntry(JsonObject& object, FaultRule& rule)
+{
+    std::optional<JsonNode> field = object.optional("family");
+    if (!field) {
+        return;
+    }
+    if (rule.call != "getifaddrs") {
+        field->fail("only getifaddrs rules add an entry");
+    }
+    if (!rule.nic) {
+        field->fail("an added entry needs \"nic\", the interface it belongs to");
+    }
+    rule.addsEntry = true;
+    if (!field->isNull()) {
+        rule.entryFamily = static_cast<uint16_t>(field->unsignedInteger(UINT16_MAX));
+    }
+}
+
 FaultRule readRule(const JsonNode& node, std::map<TmkuserStatus_Code, StatusText>& codes)
 {
     JsonObject object = node.object();
@@ -57,6 +77,7 @@ FaultRule readRule(const JsonNode& node, std::map<TmkuserStatus_Code, StatusText
         rule.status = field->integer(INT32_MIN, UINT32_MAX);
         checkStatus(rule, *field);
     }
+    readInterfaceEntry(object, rule);
     readVersionStatus(object, rule, codes);
     if (std::optional<JsonNode> field = object.optional("message")) {
         rule.message = field->text(SIZE_MAX);

@@ -32,7 +32,7 @@ constexpr std::string_view kKnownCalls[] = {
     "GetSegment", "GetBus", "GetSlot", "GetFunction", "GetVendorId", "GetDeviceId",
     // version service, host type and host identity
     "TmkuserVersion_GetSystemVersion", "HostType_OSIsTMK", "OrvHost_GetFqdn", "OrvHost_GetHostName",
-    "OrvHost_Sysinfo",
+    "OrvHost_Sysinfo", "getifaddrs",
 };
 
 bool paramMatches(const FaultRule& rule, const std::vector<std::string>* params)
@@ -45,7 +45,7 @@ bool paramMatches(const FaultRule& rule, const std::vector<std::string>* params)
 
 bool matches(const FaultRule& rule, const CallSite& site)
 {
-    return rule.call == site.call && (!rule.node || *rule.node == site.node) && (!rule.nic || *rule.nic == site.nic) &&
+    return rule.call == site.call && rule.addsEntry == site.entrySite && (!rule.node || *rule.node == site.node) && (!rule.nic || *rule.nic == site.nic) &&
            paramMatches(rule, site.params);
 }
 
@@ -56,20 +56,26 @@ FaultTable::FaultTable(std::vector<FaultRule> rules)
 {
 }
 
-const FaultRule* FaultTable::fire(const CallSite& site) const
+std::vector<const FaultRule*> FaultTable::fireEach(const CallSite& site) const
 {
-    const FaultRule* fired = nullptr;
+    std::vector<const FaultRule*> fired;
     for (size_t i = 0; i < rules_.size(); ++i) {
         const FaultRule& rule = rules_[i];
         if (!matches(rule, site)) {
             continue;
         }
         const uint64_t count = hits_[i].fetch_add(1, std::memory_order_relaxed) + 1;
-        if (fired == nullptr && (!rule.nth || *rule.nth == count)) {
-            fired = &rule;
+        if (!rule.nth || *rule.nth == count) {
+            fired.push_back(&rule);
         }
     }
     return fired;
+}
+
+const FaultRule* FaultTable::fire(const CallSite& site) const
+{
+    const std::vector<const FaultRule*> fired = fireEach(site);
+    return fired.empty() ? nullptr : fired.front();
 }
 
 bool isKnownCall(std::string_view call)

@@ -21,6 +21,11 @@ struct FaultRule {
     std::optional<uint64_t> nth;
     std::optional<int64_t> status;
     std::string message;
+    // getifaddrs only: instead of failing the call, the rule adds an entry for
+    // interface `nic` to the list, with an address of family `entryFamily`, or
+    // without an address when that is unset.
+    bool addsEntry = false;
+    std::optional<uint16_t> entryFamily;
 };
 
 // What an invocation is, for matching against the rules.
@@ -29,6 +34,7 @@ struct CallSite {
     std::string_view node;                   // empty when the call reads no node
     const std::vector<std::string>* params;  // parameters of the invocation, may be null
     std::string_view nic;                    // empty when not a NIC operation
+    bool entrySite = false;                  // asks for the rules that add entries
 };
 
 class FaultTable {
@@ -41,6 +47,8 @@ public:
     // The first rule that fires for this invocation, or null. Every matching
     // rule counts the invocation, fired or not.
     const FaultRule* fire(const CallSite& site) const;
+    // Every rule that fires for this invocation, in rule order.
+    std::vector<const FaultRule*> fireEach(const CallSite& site) const;
 
     const std::vector<FaultRule>& rules() const { return rules_; }
 

@@ -4,6 +4,7 @@
 #include <stdexcept>
 
 #include "FixtureSource.h"
+#include "SimInterfaces.h"
 #include "SimKsi.h"
 #include "SimPnic.h"
 #include "nodemgr/lib/NodeMgrException.h"
@@ -180,6 +181,19 @@ public:
         out.mem_unit = 1;
         return 0;
     }
+
+    int interfaceAddresses(ifaddrs*& list) override
+    {
+        list = nullptr;
+        FixtureResult fixture = source_.current();
+        if (!fixture.host) {
+            errno = EIO;
+            return -1;
+        }
+        return makeInterfaceList(*fixture.host, list);
+    }
+
+    void freeInterfaceAddresses(ifaddrs* list) override { freeInterfaceList(list); }
 
 private:
     template <typename Pick>

@@ -8,6 +8,7 @@
 // service answers a nonzero TmkuserStatus_Code, host calls answer false/errno.
 #pragma once
 
+#include <ifaddrs.h>
 #include <sys/sysinfo.h>
 
 #include <optional>
@@ -80,6 +81,11 @@ public:
     virtual bool hostName(std::string& out) = 0;
     // 0 on success, else an errno value.
     virtual int sysInfo(struct sysinfo& out) = 0;
+    // The interface-address list: 0 with `list` set (null when empty), else
+    // the nonzero value getifaddrs would answer (errno set). The list is
+    // released by freeInterfaceAddresses of the same substitute.
+    virtual int interfaceAddresses(ifaddrs*& list) = 0;
+    virtual void freeInterfaceAddresses(ifaddrs* list) = 0;
 };
 
 class HealthBackend {
