@@ -55,27 +55,31 @@ void returnRollup(const CmpiObjectPath& cop, const char** properties, CmpiResult
 
 using ThreadBody = void* (*)(void*);
 
-// Starts one monitor thread with a context prepared for it; a thread that
-// cannot be created ends the process.
-void startThread(CmpiBroker& broker, const CmpiContext& context, ThreadBody body, pthread_t& handle,
-                 const char* starter, const char* failure) {
+// Starts one monitor thread with a context prepared for it; false when the
+// thread cannot be created.
+bool startThread(CmpiBroker& broker, const CmpiContext& context, ThreadBody body, pthread_t& handle) {
     auto* argument = static_cast<ThreadArgument*>(std::malloc(sizeof(ThreadArgument)));
-    if (argument == nullptr || (argument->broker = broker.getEnc(),
-                                argument->context = broker.prepareAttachThread(context).getEnc(),
-                                pthread_create(&handle, nullptr, body, argument) != 0)) {
-        syslog(LOG_ERR, failure, starter);
+    if (argument == nullptr) {
+        return false;
+    }
+    argument->broker = broker.getEnc();
+    argument->context = broker.prepareAttachThread(context).getEnc();
+    return pthread_create(&handle, nullptr, body, argument) == 0;
+}
+
+// A monitor thread that cannot be created ends the process.
+void StartHealthMonitorThread(CmpiBroker& broker, const CmpiContext& context) {
+    if (!startThread(broker, context, HealthMonitorThread, state().healthThread)) {
+        syslog(LOG_ERR, "%s failed to start health monitoring thread\n", "StartHealthMonitorThread");
         std::abort();
     }
 }
 
-void StartHealthMonitorThread(CmpiBroker& broker, const CmpiContext& context) {
-    startThread(broker, context, HealthMonitorThread, state().healthThread, "StartHealthMonitorThread",
-                "%s failed to start health monitoring thread\n");
-}
-
 void StartKernelIpMonitorThread(CmpiBroker& broker, const CmpiContext& context) {
-    startThread(broker, context, KernelIpMonitorThread, state().kernelIpThread, "StartKernelIpMonitorThread",
-                "%s failed to start Kernel Ip monitoring thread\n");
+    if (!startThread(broker, context, KernelIpMonitorThread, state().kernelIpThread)) {
+        syslog(LOG_ERR, "%s failed to start Kernel Ip monitoring thread\n", "StartKernelIpMonitorThread");
+        std::abort();
+    }
 }
 
 }  // namespace

@@ -121,6 +121,20 @@ std::ostream& operator<<(std::ostream& os, const Latched& latched) {
 FixedTime::FixedTime(long seconds) { g_fixedTime = seconds; }
 FixedTime::~FixedTime() { g_fixedTime = -1; }
 
+// A folder of the test's own holding a fresh copy of the family's test build:
+// a library loaded from a new file starts with fresh process-wide state, as
+// each broker process does, even where an earlier copy stays mapped.
+std::filesystem::path LatchedHealthTest::freshLibraryDir() {
+    static int copies = 0;
+    const std::filesystem::path dir = std::filesystem::temp_directory_path() /
+                                      ("orv-latched-" + std::to_string(::getpid()) + "-" + std::to_string(++copies));
+    std::filesystem::create_directories(dir);
+    const std::string file = std::string("lib") + kUnderTestLocation + ".so";
+    std::filesystem::copy_file(orv::providertest::ProviderCore::providerDir() / file, dir / file,
+                               std::filesystem::copy_options::overwrite_existing);
+    return dir;
+}
+
 std::filesystem::path LatchedHealthTest::registrationsFile() {
     return std::filesystem::temp_directory_path() / ("orv-latched-" + std::to_string(::getpid()) + ".reg");
 }
@@ -131,6 +145,9 @@ LatchedHealthTest::~LatchedHealthTest() {
     stop();
     std::error_code ignored;
     std::filesystem::remove(registrationsFile(), ignored);
+    if (!libraryDir_.empty()) {
+        std::filesystem::remove_all(libraryDir_, ignored);
+    }
 }
 
 void LatchedHealthTest::serve(const std::vector<Json>& elements, const Json& faults) {
@@ -141,19 +158,24 @@ void LatchedHealthTest::serve(const std::vector<Json>& elements, const Json& fau
     host_.write(orv::providertest::SimHost::withHost({{"health", health}, {"faults", faults}}));
 }
 
-void LatchedHealthTest::start() {
+void LatchedHealthTest::start(bool waitForFirstPass) {
     {
         std::ofstream out(registrationsFile(), std::ios::trunc);
         out << familyRegistrations();
     }
     orv::providertest::ProviderCoreOptions options;
     options.projectRegistrations = false;
+    libraryDir_ = freshLibraryDir();
+    options.providerDirs = {libraryDir_};
     options.registrations = {registrationsFile(), testDir() / "elements" / "healthelements.reg"};
     options.mofs = {testDir() / "elements" / "healthelements.mof"};
     provider_ = std::make_unique<orv::providertest::ProviderCore>(options);
     const orv::host::Reply first = provider_->enumerateInstanceNames(kRollupClass);
     ASSERT_EQ(first.rc(), CMPI_RC_OK) << first.message();
     resolveHooks();
+    if (!waitForFirstPass) {
+        return;
+    }
     const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(30);
     while (completedPasses() == 0) {
         ASSERT_LT(std::chrono::steady_clock::now(), deadline) << "the monitor thread's first pass did not end";
@@ -161,9 +183,12 @@ void LatchedHealthTest::start() {
     }
 }
 
+orv::host::Reply LatchedHealthTest::enableIpIndications() {
+    return provider_->core().enableIndications(orv::providertest::kNamespace, "Orvane_KernelIPChangedIndication");
+}
+
 void LatchedHealthTest::resolveHooks() {
-    const std::filesystem::path file =
-        orv::providertest::ProviderCore::providerDir() / (std::string("lib") + kUnderTestLocation + ".so");
+    const std::filesystem::path file = libraryDir_ / (std::string("lib") + kUnderTestLocation + ".so");
     void* library = dlopen(file.c_str(), RTLD_NOW | RTLD_NOLOAD);
     if (library == nullptr) {
         throw std::runtime_error("the family's test build is not loaded");

@@ -65,7 +65,9 @@ protected:
     void serve(const std::vector<Json>& elements, const Json& faults = Json::array());
     // Builds the broker core, loads the providers and waits for the monitor
     // thread's first pass.
-    void start();
+    void start(bool waitForFirstPass = true);
+    // enableIndications for the IP-changed indication (loads its provider).
+    orv::host::Reply enableIpIndications();
     // One more health pass / IP check on a thread of the test, with a context
     // of the broker (or with `context` when given).
     void runPass();
@@ -75,6 +77,11 @@ protected:
     // Passes completed since the family's library was loaded; monitor threads running.
     unsigned long long completedPasses();
     unsigned threadsRunning();
+
+public:
+    unsigned threadsRunningNow() { return threadsRunning(); }
+
+protected:
 
     orv::providertest::ProviderCore& provider() { return *provider_; }
     const CMPIBroker* broker() { return provider_->broker(); }
@@ -92,9 +99,12 @@ protected:
     static std::filesystem::path registrationsFile();
 
 private:
+    static std::filesystem::path freshLibraryDir();
+
     void resolveHooks();
 
     orv::providertest::SimHost host_;  // before the core: it selects the platform
+    std::filesystem::path libraryDir_;
     std::unique_ptr<orv::providertest::ProviderCore> provider_;
     void (*runPass_)(const CMPIBroker*, const CMPIContext*) = nullptr;
     void (*runIpCheck_)(const CMPIBroker*, const CMPIContext*) = nullptr;
