@@ -26,14 +26,6 @@ void logDropped(CMPIUint16 hs, const HealthInfo* info) {
 
 void logKeyAllocationFailure() { syslog(LOG_ERR, "Latched health state failed to allocate memory for object keys\n"); }
 
-void freeKeys(ObjectPathKey* keys, uint32_t count) {
-    for (uint32_t i = 0; i < count; ++i) {
-        std::free(keys[i].name);
-        std::free(keys[i].value);
-    }
-    std::free(keys);
-}
-
 char* copyText(const char* text) {
     const std::size_t length = std::strlen(text);
     char* copy = static_cast<char*>(std::malloc(length + 1));
@@ -88,7 +80,7 @@ bool GetCopKeys(const CmpiObjectPath& cop, HealthInfo* info, ObjectPathKey* keys
             text = value;
         } catch (const CmpiStatus&) {
             syslog(LOG_ERR, "%s has a non string key, this in not supported\n", info->className);
-            freeKeys(keys, j);
+            FreeCopKeys(keys, j);
             return false;
         }
         keys[j].name = copyText(orEmpty(name.charPtr()));

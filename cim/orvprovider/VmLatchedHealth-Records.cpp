@@ -46,6 +46,14 @@ bool SetCopInfo(HealthInfo* info, CmpiObjectPath& path) {
     return true;
 }
 
+void FreeCopKeys(ObjectPathKey* keys, uint32_t count) {
+    for (uint32_t i = 0; i < count; ++i) {
+        std::free(keys[i].name);
+        std::free(keys[i].value);
+    }
+    std::free(keys);
+}
+
 bool GetEventId(const CmpiObjectPath& path, unsigned int* id) {
     *id = 0;
     CmpiData key;

@@ -5,6 +5,8 @@
 // the process ends.
 #include "VmLatchedHealth.h"
 
+#include <cstdlib>
+
 #include <cmpi/CmpiFactory.h>
 
 namespace VmLatchedHealth {
@@ -28,6 +30,13 @@ namespace {
 // Mutex, condition, list and IP-change detector, in that order (members).
 LatchedState g_state;
 }  // namespace
+
+LatchedState::~LatchedState() {
+    for (HealthInfo* record : healthInfo) {
+        FreeCopKeys(record->copKeys, record->copKeyCount);
+        std::free(record);
+    }
+}
 
 LatchedState& state() { return g_state; }
 

@@ -88,6 +88,12 @@ private:
 // healthMutex. One object per process, built by the library's static
 // initialisation and never rebuilt.
 struct LatchedState {
+    LatchedState() = default;
+    // Records live as long as the library: they are freed when it is unloaded.
+    ~LatchedState();
+    LatchedState(const LatchedState&) = delete;
+    LatchedState& operator=(const LatchedState&) = delete;
+
     OMC::Mutex healthMutex;
     OMC::Condition healthCond;
     std::list<HealthInfo*> healthInfo;
@@ -111,6 +117,9 @@ LatchedState& state();
 // name and keys. False when a key cannot be set; aborts on a key entry without
 // a name or value.
 bool SetCopInfo(HealthInfo* info, CmpiObjectPath& path);
+
+// Frees count key entries and the array that holds them.
+void FreeCopKeys(ObjectPathKey* keys, uint32_t count);
 
 // The number in the "EventId" key of path (C library base-10 conversion of
 // its leading digits); false when the key is absent or null.

@@ -88,12 +88,16 @@ TEST_F(HealthPassTest, ClassThatCannotBeEnumeratedLogsOneLinePerPassAndThePassGo
 
 TEST_F(HealthPassTest, ElementWithNonStringKeyLogsTwoLinesEveryPassAndIsNeverLatched) {
     SyslogCapture log;
-    serve({element("Orvane_SASSATAPort", {{"DeviceID", "port0"}, {"PortNumber", 3}}, 15)});
+    Json sensor = element("CIM_Sensor", {{"CreationClassName", "Orvane_NumberedSensor"}, {"DeviceID", "sensor3"},
+                                         {"SensorNumber", 3}, {"SystemCreationClassName", "OMC_UnitaryComputerSystem"},
+                                         {"SystemName", "simhost"}}, 15);
+    sensor["class"] = "Orvane_NumberedSensor";
+    serve({sensor});
     start();
     runPass();
     const std::vector<SyslogLine> onePass{
-        {LOG_ERR, "Orvane_SASSATAPort has a non string key, this in not supported\n"},
-        {LOG_ERR, "Failed to copy object, dropping health state 15 for Orvane_SASSATAPort\n"}};
+        {LOG_ERR, "Orvane_NumberedSensor has a non string key, this in not supported\n"},
+        {LOG_ERR, "Failed to copy object, dropping health state 15 for Orvane_NumberedSensor\n"}};
     std::vector<SyslogLine> twoPasses = onePass;
     twoPasses.insert(twoPasses.end(), onePass.begin(), onePass.end());
     EXPECT_EQ(log.lines(), twoPasses);
@@ -119,7 +123,7 @@ TEST_F(HealthPassTest, EveryWatchedClassIsRead) {
     std::vector<Latched> expected;
     // Listed backwards: the records follow the table's order, not the host's.
     for (auto it = classes.rbegin(); it != classes.rend(); ++it) {
-        elements.push_back(element(*it, {{"InstanceID", *it + ":1"}}, 10));
+        elements.push_back(device(*it, *it + ":1", 10));
     }
     for (std::size_t i = 0; i < classes.size(); ++i) {
         expected.push_back({std::to_string(i), classes[i], "10"});

@@ -21,8 +21,8 @@ TEST_F(LatchedAssociationTest, LatchedStateLeadsToItsElement) {
               (std::vector<NamedValue>{
                   {"Antecedent", CMPI_ref, "root/cimv2:Orvane_LatchedHealthState.EventId=0"},
                   {"Dependent", CMPI_ref,
-                   "root/cimv2:Orvane_Battery.CreationClassName=Orvane_Battery,DeviceID=bat0,"
-                   "SystemCreationClassName=OMC_UnitaryComputerSystem,SystemName=simhost.providers.test"}}));
+                   "root/cimv2:Orvane_Battery.SystemCreationClassName=OMC_UnitaryComputerSystem,"
+                   "SystemName=simhost.providers.test,CreationClassName=Orvane_Battery,DeviceID=bat0"}}));
 }
 
 TEST_F(LatchedAssociationTest, AssociatorNamesReachTheElement) {

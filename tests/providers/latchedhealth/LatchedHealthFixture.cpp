@@ -88,7 +88,32 @@ void onOwnThread(const std::function<void()>& run) {
     thread.join();
 }
 
+// The failing context is a view of a context of the broker: every entry call
+// goes to the broker's context, the release of thread memory fails.
+const CMPIContext* viewed(const CMPIContext* view) { return static_cast<const CMPIContext*>(view->hdl); }
+
 CMPIStatus failingRelease(const CMPIContext*) { return CMPIStatus{CMPI_RC_ERR_FAILED, nullptr}; }
+CMPIStatus keepView(CMPIContext*) { return CMPIStatus{CMPI_RC_OK, nullptr}; }
+CMPIContext* cloneViewed(const CMPIContext* view, CMPIStatus* rc) {
+    return viewed(view)->ft->clone(viewed(view), rc);
+}
+CMPIData viewedEntry(const CMPIContext* view, const char* name, CMPIStatus* rc) {
+    return viewed(view)->ft->getEntry(viewed(view), name, rc);
+}
+CMPIData viewedEntryAt(const CMPIContext* view, CMPICount index, CMPIString** name, CMPIStatus* rc) {
+    return viewed(view)->ft->getEntryAt(viewed(view), index, name, rc);
+}
+CMPICount viewedEntryCount(const CMPIContext* view, CMPIStatus* rc) {
+    return viewed(view)->ft->getEntryCount(viewed(view), rc);
+}
+CMPIStatus addViewedEntry(const CMPIContext* view, const char* name, const CMPIValue* value, CMPIType type) {
+    return viewed(view)->ft->addEntry(viewed(view), name, value, type);
+}
+
+const CMPIContextFTExt kFailingReleaseTable = {
+    {1, keepView, cloneViewed, viewedEntry, viewedEntryAt, viewedEntryCount, addViewedEntry},
+    failingRelease,
+};
 
 }  // namespace
 
@@ -106,6 +131,12 @@ Json nullState(Json element) {
 }
 
 Json device(const std::string& watchedClass, const std::string& deviceId, std::optional<int> healthState) {
+    if (watchedClass == "Orvane_StoragePool") {
+        return element(watchedClass, {{"InstanceID", deviceId}}, healthState);
+    }
+    if (watchedClass == "CIM_PhysicalMemory") {
+        return element(watchedClass, {{"CreationClassName", watchedClass}, {"Tag", deviceId}}, healthState);
+    }
     return element(watchedClass,
                    {{"CreationClassName", watchedClass},
                     {"DeviceID", deviceId},
@@ -258,10 +289,7 @@ void LatchedHealthTest::stop() { provider_.reset(); }
 
 FailingReleaseContext::FailingReleaseContext()
     : original_(orv::host::detail::newContext(orv::host::detail::Owner::Caller)),
-      table_(*reinterpret_cast<const CMPIContextFTExt*>(original_->ft)),
-      view_{original_->hdl, &table_.std} {
-    table_.releaseThreadMemory = failingRelease;
-}
+      view_{original_, const_cast<CMPIContextFT*>(&kFailingReleaseTable.std)} {}
 
 FailingReleaseContext::~FailingReleaseContext() { original_->ft->release(original_); }
 

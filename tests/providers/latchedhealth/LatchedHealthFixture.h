@@ -37,7 +37,8 @@ inline constexpr const char* kAssociationClass = "Orvane_LatchedHealthAssociatio
 // null value).
 Json element(const std::string& watchedClass, const Json& keys, std::optional<int> healthState);
 Json nullState(Json element);
-// A device of a watched class with the usual CIM_LogicalDevice keys.
+// An element of a watched class with the keys its class declares (the
+// CIM_LogicalDevice keys, or those of a storage pool or a memory chip).
 Json device(const std::string& watchedClass, const std::string& deviceId, std::optional<int> healthState);
 
 // What a latched record shows through the provider.
@@ -124,7 +125,6 @@ public:
 
 private:
     CMPIContext* original_;
-    CMPIContextFTExt table_;
     CMPIContext view_;
 };
 
