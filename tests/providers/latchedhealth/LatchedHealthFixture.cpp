@@ -1,15 +1,11 @@
 #include "LatchedHealthFixture.h"
 
-#include <dlfcn.h>
 #include <time.h>
 
 #include <atomic>
 #include <chrono>
 #include <condition_variable>
-#include <fstream>
 #include <mutex>
-#include <regex>
-#include <sstream>
 #include <thread>
 
 #include "context.hpp"
@@ -49,44 +45,6 @@ extern "C" __attribute__((visibility("default"))) void HealthElementsTest_Gate()
 
 namespace latched {
 namespace {
-
-constexpr const char* kUnderTestLocation = "latchedhealthundertest";
-constexpr const char* kLatchedClasses[] = {kLatchedClass, kRollupClass, kAssociationClass,
-                                           "Orvane_KernelIPChangedIndication"};
-
-std::filesystem::path testDir() { return ORV_LATCHED_TEST_DIR; }
-
-// The project's registration blocks of the family, pointed at the test build.
-std::string familyRegistrations() {
-    std::ifstream in(orv::providertest::ProviderCore::registrationFile());
-    std::stringstream text;
-    text << in.rdbuf();
-    std::string out;
-    for (const char* className : kLatchedClasses) {
-        const std::string header = std::string("[") + className + "]";
-        const std::size_t begin = text.str().find(header);
-        if (begin == std::string::npos) {
-            throw std::runtime_error(std::string("no registration of ") + className);
-        }
-        const std::size_t end = text.str().find("\n\n", begin);
-        out += text.str().substr(begin, end == std::string::npos ? std::string::npos : end - begin) + "\n\n";
-    }
-    return std::regex_replace(out, std::regex("location: orvprovider"), std::string("location: ") + kUnderTestLocation);
-}
-
-template <class Function>
-Function hook(void* library, const char* name) {
-    void* symbol = dlsym(library, name);
-    if (symbol == nullptr) {
-        throw std::runtime_error(std::string("test build lacks ") + name);
-    }
-    return reinterpret_cast<Function>(symbol);
-}
-
-void onOwnThread(const std::function<void()>& run) {
-    std::thread thread(run);
-    thread.join();
-}
 
 // The failing context is a view of a context of the broker: every entry call
 // goes to the broker's context, the release of thread memory fails.
@@ -166,17 +124,12 @@ std::filesystem::path LatchedHealthTest::freshLibraryDir() {
     return dir;
 }
 
-std::filesystem::path LatchedHealthTest::registrationsFile() {
-    return std::filesystem::temp_directory_path() / ("orv-latched-" + std::to_string(::getpid()) + ".reg");
-}
-
 LatchedHealthTest::LatchedHealthTest() { serve({}); }
 
 LatchedHealthTest::~LatchedHealthTest() {
     stop();
-    std::error_code ignored;
-    std::filesystem::remove(registrationsFile(), ignored);
     if (!libraryDir_.empty()) {
+        std::error_code ignored;
         std::filesystem::remove_all(libraryDir_, ignored);
     }
 }
@@ -190,74 +143,26 @@ void LatchedHealthTest::serve(const std::vector<Json>& elements, const Json& fau
 }
 
 void LatchedHealthTest::start(bool waitForFirstPass) {
-    {
-        std::ofstream out(registrationsFile(), std::ios::trunc);
-        out << familyRegistrations();
-    }
-    orv::providertest::ProviderCoreOptions options;
-    options.projectRegistrations = false;
     libraryDir_ = freshLibraryDir();
-    options.providerDirs = {libraryDir_};
-    options.registrations = {registrationsFile(), testDir() / "elements" / "healthelements.reg"};
-    options.mofs = {testDir() / "elements" / "healthelements.mof"};
-    provider_ = std::make_unique<orv::providertest::ProviderCore>(options);
-    const orv::host::Reply first = provider_->enumerateInstanceNames(kRollupClass);
-    ASSERT_EQ(first.rc(), CMPI_RC_OK) << first.message();
-    resolveHooks();
-    if (!waitForFirstPass) {
-        return;
-    }
-    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(30);
-    while (completedPasses() == 0) {
-        ASSERT_LT(std::chrono::steady_clock::now(), deadline) << "the monitor thread's first pass did not end";
-        std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    family_ = std::make_unique<FamilyUnderTest>(libraryDir_);
+    ASSERT_TRUE(family_->load()) << "the first request to the family failed";
+    if (waitForFirstPass) {
+        ASSERT_TRUE(family_->waitForFirstPass()) << "the monitor thread's first pass did not end";
     }
 }
 
 orv::host::Reply LatchedHealthTest::enableIpIndications() {
-    return provider_->core().enableIndications(orv::providertest::kNamespace, "Orvane_KernelIPChangedIndication");
+    return provider().core().enableIndications(orv::providertest::kNamespace, "Orvane_KernelIPChangedIndication");
 }
 
-void LatchedHealthTest::resolveHooks() {
-    const std::filesystem::path file = libraryDir_ / (std::string("lib") + kUnderTestLocation + ".so");
-    void* library = dlopen(file.c_str(), RTLD_NOW | RTLD_NOLOAD);
-    if (library == nullptr) {
-        throw std::runtime_error("the family's test build is not loaded");
-    }
-    runPass_ = hook<decltype(runPass_)>(library, "VmLatchedHealthTest_RunPass");
-    runIpCheck_ = hook<decltype(runIpCheck_)>(library, "VmLatchedHealthTest_RunIpCheck");
-    completedPasses_ = hook<decltype(completedPasses_)>(library, "VmLatchedHealthTest_CompletedPasses");
-    threadsRunning_ = hook<decltype(threadsRunning_)>(library, "VmLatchedHealthTest_ThreadsRunning");
-    dlclose(library);  // the core keeps it loaded
-}
-
-void LatchedHealthTest::runPass() { runPassWith(nullptr); }
-
-void LatchedHealthTest::runPassWith(CMPIContext* context) {
-    onOwnThread([&] {
-        CMPIContext* own = context != nullptr ? context : orv::host::detail::newContext(orv::host::detail::Owner::Caller);
-        runPass_(broker(), own);
-        if (context == nullptr) {
-            own->ft->release(own);
-        }
-    });
-}
-
-void LatchedHealthTest::runIpCheck(CMPIContext* context) {
-    onOwnThread([&] {
-        CMPIContext* own = context != nullptr ? context : orv::host::detail::newContext(orv::host::detail::Owner::Caller);
-        runIpCheck_(broker(), own);
-        if (context == nullptr) {
-            own->ft->release(own);
-        }
-    });
-}
-
-unsigned long long LatchedHealthTest::completedPasses() { return completedPasses_(); }
-unsigned LatchedHealthTest::threadsRunning() { return threadsRunning_(); }
+void LatchedHealthTest::runPass() { family_->runPass(); }
+void LatchedHealthTest::runPassWith(CMPIContext* context) { family_->runPass(context); }
+void LatchedHealthTest::runIpCheck(CMPIContext* context) { family_->runIpCheck(context); }
+unsigned long long LatchedHealthTest::completedPasses() { return family_->completedPasses(); }
+unsigned LatchedHealthTest::threadsRunning() { return family_->threadsRunning(); }
 
 std::vector<Latched> LatchedHealthTest::latched() {
-    const orv::host::Reply reply = provider_->enumerateInstances(kLatchedClass);
+    const orv::host::Reply reply = provider().enumerateInstances(kLatchedClass);
     EXPECT_EQ(reply.rc(), CMPI_RC_OK) << reply.message();
     std::vector<Latched> out;
     for (const CMPIInstance* instance : reply.instances()) {
@@ -269,7 +174,7 @@ std::vector<Latched> LatchedHealthTest::latched() {
 }
 
 std::string LatchedHealthTest::rollup() {
-    const orv::host::Reply reply = provider_->enumerateInstances(kRollupClass);
+    const orv::host::Reply reply = provider().enumerateInstances(kRollupClass);
     EXPECT_EQ(reply.rc(), CMPI_RC_OK) << reply.message();
     if (reply.instances().size() != 1) {
         return "<" + std::to_string(reply.instances().size()) + " instances>";
@@ -278,14 +183,14 @@ std::string LatchedHealthTest::rollup() {
 }
 
 CMPIObjectPath* LatchedHealthTest::latchedPath(const std::string& eventId) {
-    return provider_->path(kLatchedClass, {{"EventId", eventId}});
+    return provider().path(kLatchedClass, {{"EventId", eventId}});
 }
 
 orv::host::Reply LatchedHealthTest::references(const CMPIObjectPath* path) {
-    return provider_->core().references(path, nullptr, nullptr);
+    return provider().core().references(path, nullptr, nullptr);
 }
 
-void LatchedHealthTest::stop() { provider_.reset(); }
+void LatchedHealthTest::stop() { family_.reset(); }
 
 FailingReleaseContext::FailingReleaseContext()
     : original_(orv::host::detail::newContext(orv::host::detail::Owner::Caller)),

@@ -22,6 +22,7 @@
 #include "orv/providertest/ProviderCore.h"
 #include "orv/providertest/ReturnedValues.h"
 #include "orv/providertest/SimHost.h"
+#include "harness/FamilyUnderTest.h"
 
 namespace latched {
 
@@ -84,8 +85,8 @@ public:
 
 protected:
 
-    orv::providertest::ProviderCore& provider() { return *provider_; }
-    const CMPIBroker* broker() { return provider_->broker(); }
+    orv::providertest::ProviderCore& provider() { return family_->provider(); }
+    const CMPIBroker* broker() { return provider().broker(); }
 
     // The latched records in list order, from an enumeration of the latched class.
     std::vector<Latched> latched();
@@ -97,20 +98,12 @@ protected:
     // Stops the core (terminating cleanup of the providers) and drops it.
     void stop();
 
-    static std::filesystem::path registrationsFile();
-
 private:
     static std::filesystem::path freshLibraryDir();
 
-    void resolveHooks();
-
     orv::providertest::SimHost host_;  // before the core: it selects the platform
     std::filesystem::path libraryDir_;
-    std::unique_ptr<orv::providertest::ProviderCore> provider_;
-    void (*runPass_)(const CMPIBroker*, const CMPIContext*) = nullptr;
-    void (*runIpCheck_)(const CMPIBroker*, const CMPIContext*) = nullptr;
-    unsigned long long (*completedPasses_)() = nullptr;
-    unsigned (*threadsRunning_)() = nullptr;
+    std::unique_ptr<FamilyUnderTest> family_;
 };
 
 // A context of the broker whose thread-memory release (the entry after
