@@ -3,7 +3,6 @@
 // health lock, so that a check never overlaps a health pass.
 #include <syslog.h>
 
-#include <cstdlib>
 #include <exception>
 
 #include "VmLatchedHealth.h"
@@ -26,24 +25,6 @@ void RunKernelIpCheck(CmpiBroker& broker, const CmpiContext& context) {
     }
 }
 
-void* KernelIpMonitorThread(void* arg) {
-    auto* argument = static_cast<ThreadArgument*>(arg);
-    CmpiBroker broker(argument->broker);
-    const CmpiContext context(argument->context);
-    std::free(argument);
-    try {
-        broker.attachThread(context);
-    } catch (const CmpiStatus&) {
-    }
-    LatchedState& s = state();
-    OMC::MutexLock lock(s.healthMutex);
-    ++s.threadStarted;
-    while (!s.shuttingDown) {
-        RunKernelIpCheck(broker, context);
-        WaitForNextRound(lock, kKernelIpPeriodSeconds);
-    }
-    --s.threadStarted;
-    return nullptr;
-}
+void* KernelIpMonitorThread(void* arg) { return RunMonitorThread(arg, RunKernelIpCheck, kKernelIpPeriodSeconds); }
 
 }  // namespace VmLatchedHealth

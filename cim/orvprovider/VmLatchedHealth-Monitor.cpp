@@ -2,7 +2,6 @@
 // instance of the watched classes through the broker, keeps the worst state of
 // the pass as the host's roll-up, and latches every element whose state is not
 // OK, as a new record or as an escalation of its record.
-#include <sys/time.h>
 #include <syslog.h>
 
 #include <cstdio>
@@ -216,15 +215,6 @@ bool CheckHealthStatus(CmpiBroker& broker, const CmpiContext& context, const cha
 
 void ReleaseThreadMemory(const CmpiContext& context) { context.releaseThreadMemory(); }
 
-void WaitForNextRound(OMC::MutexLock& lock, long seconds) {
-    timeval now{};
-    gettimeofday(&now, nullptr);
-    timespec deadline{};
-    deadline.tv_sec = now.tv_sec + seconds;
-    deadline.tv_nsec = now.tv_usec * 1000;
-    (void)state().healthCond.timedWait(lock, deadline);
-}
-
 void RunHealthPass(CmpiBroker& broker, const CmpiContext& context) {
     LatchedState& s = state();
     s.pendingRollUpHealthState = 0;
@@ -240,24 +230,6 @@ void RunHealthPass(CmpiBroker& broker, const CmpiContext& context) {
     ++s.completedPasses;
 }
 
-void* HealthMonitorThread(void* arg) {
-    auto* argument = static_cast<ThreadArgument*>(arg);
-    CmpiBroker broker(argument->broker);
-    const CmpiContext context(argument->context);
-    std::free(argument);
-    try {
-        broker.attachThread(context);
-    } catch (const CmpiStatus&) {
-    }
-    LatchedState& s = state();
-    OMC::MutexLock lock(s.healthMutex);
-    ++s.threadStarted;
-    while (!s.shuttingDown) {
-        RunHealthPass(broker, context);
-        WaitForNextRound(lock, kHealthPeriodSeconds);
-    }
-    --s.threadStarted;
-    return nullptr;
-}
+void* HealthMonitorThread(void* arg) { return RunMonitorThread(arg, RunHealthPass, kHealthPeriodSeconds); }
 
 }  // namespace VmLatchedHealth

@@ -53,6 +53,20 @@ void returnRollup(const CmpiObjectPath& cop, const char** properties, CmpiResult
     rslt.returnDone();
 }
 
+// Returns something for every record, in list order, under the lock; done is
+// signalled only when there was a record (an empty answer signals nothing).
+template <class ReturnOne>
+void returnEveryRecord(CmpiResult& rslt, ReturnOne returnOne) {
+    LatchedState& s = state();
+    OMC::MutexLock lock(s.healthMutex);
+    for (const HealthInfo* record : s.healthInfo) {
+        returnOne(record);
+    }
+    if (!s.healthInfo.empty()) {
+        rslt.returnDone();
+    }
+}
+
 using ThreadBody = void* (*)(void*);
 
 // Starts one monitor thread with a context prepared for it; false when the
@@ -89,20 +103,13 @@ VmLatchedHealthState::VmLatchedHealthState(const CmpiBroker& mbp, const CmpiCont
 
 CmpiStatus VmLatchedHealthState::enumInstanceNames(const CmpiContext&, CmpiResult& rslt, const CmpiObjectPath& cop) {
     if (isClass(cop, kLatchedClass)) {
-        LatchedState& s = state();
-        OMC::MutexLock lock(s.healthMutex);
         const CmpiString nameSpace = cop.getNameSpace();
         const CmpiString className = cop.getClassName();
-        bool any = false;
-        for (const HealthInfo* record : s.healthInfo) {
+        returnEveryRecord(rslt, [&](const HealthInfo* record) {
             CmpiObjectPath name(nameSpace, className.charPtr());
             name.setKey("EventId", CmpiData(EventIdText(record->eventId).text));
             rslt.returnData(name);
-            any = true;
-        }
-        if (any) {
-            rslt.returnDone();
-        }
+        });
         return CmpiStatus(CMPI_RC_OK);
     }
     if (isClass(cop, kRollupClass)) {
@@ -118,16 +125,9 @@ CmpiStatus VmLatchedHealthState::enumInstanceNames(const CmpiContext&, CmpiResul
 CmpiStatus VmLatchedHealthState::enumInstances(const CmpiContext&, CmpiResult& rslt, const CmpiObjectPath& cop,
                                                const char** properties) {
     if (isClass(cop, kLatchedClass)) {
-        LatchedState& s = state();
-        OMC::MutexLock lock(s.healthMutex);
-        bool any = false;
-        for (const HealthInfo* record : s.healthInfo) {
+        returnEveryRecord(rslt, [&](const HealthInfo* record) {
             MakeLatchedHealthInstance(cop, properties, record, rslt);
-            any = true;
-        }
-        if (any) {
-            rslt.returnDone();
-        }
+        });
         return CmpiStatus(CMPI_RC_OK);
     }
     if (isClass(cop, kRollupClass)) {

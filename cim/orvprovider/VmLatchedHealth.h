@@ -146,8 +146,12 @@ struct ThreadArgument {
     CMPIContext* context;
 };
 
-// Waits on healthCond with healthMutex held until now + seconds or a broadcast.
-void WaitForNextRound(OMC::MutexLock& lock, long seconds);
+// The body of both monitor threads: attach to the broker with the prepared
+// context of arg (freed here), then, holding healthMutex except while waiting,
+// run one round and wait on healthCond until now + seconds or a broadcast,
+// until shuttingDown is set. threadStarted counts the thread while it runs.
+using MonitorRound = void (*)(CmpiBroker& broker, const CmpiContext& context);
+void* RunMonitorThread(void* arg, MonitorRound round, long seconds);
 
 // Frees what the broker allocated for the thread so far, where the broker
 // offers it; a failure is the caller's to report.
