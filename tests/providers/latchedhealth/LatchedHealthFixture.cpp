@@ -126,6 +126,10 @@ std::filesystem::path LatchedHealthTest::freshLibraryDir() {
 
 LatchedHealthTest::LatchedHealthTest() { serve({}); }
 
+std::filesystem::path LatchedHealthTest::libraryFile() const {
+    return libraryDir_ / (std::string("lib") + kUnderTestLocation + ".so");
+}
+
 LatchedHealthTest::~LatchedHealthTest() {
     stop();
     if (!libraryDir_.empty()) {

@@ -95,6 +95,9 @@ protected:
     CMPIObjectPath* latchedPath(const std::string& eventId);
     orv::host::Reply references(const CMPIObjectPath* path);
 
+    // The copy of the family's test build that start() loaded.
+    std::filesystem::path libraryFile() const;
+
     // Stops the core (terminating cleanup of the providers) and drops it.
     void stop();
 
