@@ -39,9 +39,9 @@ struct ProviderCoreOptions {
     // choosing to a provider.
     std::vector<std::filesystem::path> registrations;
     // Folders searched for provider libraries before the build's.
-    std::vector<std::filesystem::path> providerDirs;
+    std::vector<std::filesystem::path> providerDirs{};
     // More MOF files, read after the project's.
-    std::vector<std::filesystem::path> mofs;
+    std::vector<std::filesystem::path> mofs{};
 };
 
 class ProviderCore {
