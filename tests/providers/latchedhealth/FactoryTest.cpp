@@ -1,10 +1,13 @@
 // The family's three factories: their function tables, trace lines and the
 // objects they build.
 #include <dlfcn.h>
+#include <unistd.h>
 
 #include <cstdio>
 #include <fstream>
+#include <functional>
 #include <sstream>
+#include <string>
 
 #include <orv/testsupport/StderrCapture.h>
 
@@ -19,35 +22,71 @@ using orv::testsupport::StderrCapture;
 template <class MI>
 using Factory = MI* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
 
+// What one factory call gave: the function table's name and the handle.
+struct Created {
+    std::string miName;
+    const void* hdl;
+};
+
+// The factories of a copy of the family's test build that the broker core
+// never loaded, called with the core's broker; every use they hand out is
+// given back with a terminating cleanup at the end, which stops the copy's
+// threads.
 class FactoryTest : public LatchedHealthTest {
 protected:
+    FactoryTest() {
+        start();
+        copyDir_ = freshLibraryDir();
+        copy_ = dlopen((copyDir_ / (std::string("lib") + kUnderTestLocation + ".so")).c_str(), RTLD_NOW | RTLD_LOCAL);
+    }
+
+    ~FactoryTest() override {
+        CMPIContext* context = orv::host::detail::newContext(orv::host::detail::Owner::Caller);
+        for (const std::function<void(const CMPIContext*)>& release : releases_) {
+            release(context);
+        }
+        context->ft->release(context);
+        std::error_code ignored;
+        std::filesystem::remove_all(copyDir_, ignored);
+    }
+
     template <class MI>
-    MI* create(const char* name) {
-        void* library = dlopen(libraryFile().c_str(), RTLD_NOW | RTLD_NOLOAD);
-        EXPECT_NE(library, nullptr);
-        auto factory = reinterpret_cast<Factory<MI>>(dlsym(library, name));
+    Created create(const char* name) {
+        EXPECT_NE(copy_, nullptr) << dlerror();
+        auto factory = reinterpret_cast<Factory<MI>>(dlsym(copy_, name));
         EXPECT_NE(factory, nullptr) << name;
         CMPIContext* context = orv::host::detail::newContext(orv::host::detail::Owner::Caller);
         CMPIStatus status{CMPI_RC_OK, nullptr};
         MI* mi = factory(broker(), context, &status);
         context->ft->release(context);
-        dlclose(library);
-        return mi;
+        releases_.push_back([mi](const CMPIContext* ctx) { (void)mi->ft->cleanup(mi, ctx, true); });
+        return Created{mi->ft->miName, mi->hdl};
     }
+
+    unsigned copyThreadsRunning() {
+        auto running = reinterpret_cast<unsigned (*)()>(dlsym(copy_, "VmLatchedHealthTest_ThreadsRunning"));
+        for (int i = 0; i < 5000 && running() < 2; ++i) {
+            usleep(1000);
+        }
+        return running();
+    }
+
+private:
+    std::filesystem::path copyDir_;
+    void* copy_ = nullptr;
+    std::vector<std::function<void(const CMPIContext*)>> releases_;
 };
 
 TEST_F(FactoryTest, FunctionTablesAreNamedAfterTheirProviders) {
-    start();
-    EXPECT_STREQ(create<CMPIInstanceMI>("Orvane_LatchedHealthState_Create_InstanceMI")->ft->miName,
-                 "instanceOrvane_LatchedHealthState");
-    EXPECT_STREQ(create<CMPIAssociationMI>("Orvane_LatchedHealthAssociation_Create_AssociationMI")->ft->miName,
-                 "associationOrvane_LatchedHealthAssociation");
-    EXPECT_STREQ(create<CMPIIndicationMI>("Orvane_KernelIPChangedIndication_Create_IndicationMI")->ft->miName,
-                 "indicationOrvane_KernelIPChangedIndication");
+    EXPECT_EQ(create<CMPIInstanceMI>("Orvane_LatchedHealthState_Create_InstanceMI").miName,
+              "instanceOrvane_LatchedHealthState");
+    EXPECT_EQ(create<CMPIAssociationMI>("Orvane_LatchedHealthAssociation_Create_AssociationMI").miName,
+              "associationOrvane_LatchedHealthAssociation");
+    EXPECT_EQ(create<CMPIIndicationMI>("Orvane_KernelIPChangedIndication_Create_IndicationMI").miName,
+              "indicationOrvane_KernelIPChangedIndication");
 }
 
 TEST_F(FactoryTest, OnlyTheInstanceFactoryWritesItsTraceLine) {
-    start();
     StderrCapture capture;
     (void)create<CMPIInstanceMI>("Orvane_LatchedHealthState_Create_InstanceMI");
     (void)create<CMPIAssociationMI>("Orvane_LatchedHealthAssociation_Create_AssociationMI");
@@ -56,13 +95,14 @@ TEST_F(FactoryTest, OnlyTheInstanceFactoryWritesItsTraceLine) {
 }
 
 TEST_F(FactoryTest, IpChangedIndicationAndLatchedStateEntryPointsBuildTwoObjects) {
-    start();
-    const CMPIInstanceMI* instance = create<CMPIInstanceMI>("Orvane_LatchedHealthState_Create_InstanceMI");
-    const CMPIIndicationMI* indication = create<CMPIIndicationMI>("Orvane_KernelIPChangedIndication_Create_IndicationMI");
-    EXPECT_NE(instance->hdl, indication->hdl);
-    EXPECT_EQ(create<CMPIInstanceMI>("Orvane_LatchedHealthState_Create_InstanceMI")->hdl, instance->hdl);
-    // Built after the threads run: no second pair.
-    EXPECT_EQ(threadsRunning(), 2U);
+    const Created instance = create<CMPIInstanceMI>("Orvane_LatchedHealthState_Create_InstanceMI");
+    ASSERT_EQ(copyThreadsRunning(), 2U);  // before the second object, or both would start a pair
+    const Created indication = create<CMPIIndicationMI>("Orvane_KernelIPChangedIndication_Create_IndicationMI");
+    EXPECT_NE(instance.hdl, indication.hdl);
+    EXPECT_EQ(create<CMPIInstanceMI>("Orvane_LatchedHealthState_Create_InstanceMI").hdl, instance.hdl);
+    // The second object was built after the threads ran: no second pair.
+    usleep(50000);
+    EXPECT_EQ(copyThreadsRunning(), 2U);
 }
 
 TEST_F(FactoryTest, ProductLibraryExportsTheThreeFactories) {

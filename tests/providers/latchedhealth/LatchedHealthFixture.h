@@ -101,8 +101,10 @@ protected:
     // Stops the core (terminating cleanup of the providers) and drops it.
     void stop();
 
-private:
+    // A new folder holding a fresh copy of the family's test build.
     static std::filesystem::path freshLibraryDir();
+
+private:
 
     orv::providertest::SimHost host_;  // before the core: it selects the platform
     std::filesystem::path libraryDir_;
