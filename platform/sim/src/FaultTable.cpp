@@ -11,6 +11,8 @@ constexpr std::string_view kKnownCalls[] = {
     "KSI_CheckSig", "KSI_Get", "KSI_GetInstanceListAlloc", "KSI_ParamListCreate", "KSI_ParamListDestroy",
     "KSI_ParamListUsedCount", "KSI_ParamListAddString", "KSI_ParamListAddInt", "KSI_ParamListRemoveLastParam",
     "KSI_ParamListGetParam", "KSI_ParamListGetInt32", "KSI_ParamGetString",
+    // hardware health elements
+    "OrvHealth_Elements",
     // NIC library entry points
     "GetPnics", "GetPnicByName",
     // pnic operations, base first

@@ -43,6 +43,9 @@ std::shared_ptr<HostModel> readModel(const nlohmann::json& document)
     if (std::optional<JsonNode> version = root.optional("version")) {
         host->version = readVersion(*version, host->statusCodes);
     }
+    if (std::optional<JsonNode> health = root.optional("health")) {
+        host->health = readHealth(*health);
+    }
     if (std::optional<JsonNode> faults = root.optional("faults")) {
         host->faults = readFaults(*faults, host->statusCodes);
     }

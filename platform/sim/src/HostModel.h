@@ -11,6 +11,7 @@
 
 #include "FaultTable.h"
 #include "ksi/KsiRecords.h"
+#include "orv/platform/HealthElements.h"
 #include "nodemgr/network/PnicRecords.h"
 #include "tmkuser/Version.h"
 
@@ -117,6 +118,12 @@ struct VersionModel {
     TmkuserStatus_Code failureCode = 0;
 };
 
+// A hardware element and the watched class it is reported under.
+struct HealthElementModel {
+    std::string watchedClass;
+    HealthElement element;
+};
+
 struct HostModel {
     std::string hostName;
     std::optional<std::string> fqdn;
@@ -126,6 +133,7 @@ struct HostModel {
     std::optional<std::map<std::string, StackModel>> tcpipStacks;
     std::optional<CpuModel> cpu;
     std::optional<VersionModel> version;
+    std::vector<HealthElementModel> health;
     std::map<TmkuserStatus_Code, StatusText> statusCodes;
     FaultTable faults;
 };

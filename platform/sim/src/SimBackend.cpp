@@ -1,6 +1,7 @@
 // The sim substitute: every platform area answered from one fixture file.
 #include <cerrno>
 #include <cstdio>
+#include <stdexcept>
 
 #include "FixtureSource.h"
 #include "SimInterfaces.h"
@@ -212,10 +213,36 @@ private:
     FixtureSource& source_;
 };
 
+class SimHealth final : public HealthBackend {
+public:
+    explicit SimHealth(FixtureSource& source) : source_(source) {}
+
+    std::vector<HealthElement> elements(const std::string& watchedClass) override
+    {
+        FixtureResult fixture = source_.current();
+        if (!fixture.host) {
+            throw std::runtime_error(fixture.error);
+        }
+        if (const FaultRule* rule = fireCall(*fixture.host, "OrvHealth_Elements", &watchedClass)) {
+            throw std::runtime_error(rule->message.empty() ? "health elements unavailable" : rule->message);
+        }
+        std::vector<HealthElement> found;
+        for (const HealthElementModel& model : fixture.host->health) {
+            if (model.watchedClass == watchedClass) {
+                found.push_back(model.element);
+            }
+        }
+        return found;
+    }
+
+private:
+    FixtureSource& source_;
+};
+
 class SimBackend final : public Backend {
 public:
     explicit SimBackend(const std::string& path)
-        : source_(path), network_(source_), ksi_(source_), version_(source_), host_(source_)
+        : source_(path), network_(source_), ksi_(source_), version_(source_), host_(source_), health_(source_)
     {
     }
 
@@ -225,6 +252,7 @@ public:
     KsiBackend& ksi() override { return ksi_; }
     VersionBackend& version() override { return version_; }
     HostBackend& host() override { return host_; }
+    HealthBackend* health() override { return &health_; }
 
 private:
     FixtureSource source_;
@@ -232,6 +260,7 @@ private:
     SimKsi ksi_;
     SimVersion version_;
     SimHost host_;
+    SimHealth health_;
 };
 
 } // namespace

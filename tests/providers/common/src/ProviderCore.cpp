@@ -16,8 +16,10 @@ std::filesystem::path fromEnvironment(const char* name, const char* builtIn) {
 
 orv::host::CoreConfig configFor(const ProviderCoreOptions& options) {
     orv::host::CoreConfig config;
-    config.providerDirs = {ProviderCore::providerDir()};
+    config.providerDirs = options.providerDirs;
+    config.providerDirs.push_back(ProviderCore::providerDir());
     config.mofPaths = {ProviderCore::mofFile()};
+    config.mofPaths.insert(config.mofPaths.end(), options.mofs.begin(), options.mofs.end());
     if (options.projectRegistrations) {
         config.registrationFiles.push_back(ProviderCore::registrationFile());
     }

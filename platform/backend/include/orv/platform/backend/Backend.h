@@ -16,6 +16,7 @@
 #include <vector>
 
 #include "ksi/Ksi.h"
+#include "orv/platform/HealthElements.h"
 #include "nodemgr/network/Pnic.h"
 #include "orv/platform/backend/KsiParam.h"
 #include "tmkuser/Version.h"
@@ -87,6 +88,13 @@ public:
     virtual void freeInterfaceAddresses(ifaddrs* list) = 0;
 };
 
+class HealthBackend {
+public:
+    virtual ~HealthBackend() = default;
+    // Throws std::runtime_error when the elements cannot be read.
+    virtual std::vector<HealthElement> elements(const std::string& watchedClass) = 0;
+};
+
 class Backend {
 public:
     virtual ~Backend() = default;
@@ -100,6 +108,9 @@ public:
     virtual KsiBackend& ksi() = 0;
     virtual VersionBackend& version() = 0;
     virtual HostBackend& host() = 0;
+    // Null for a substitute that reports no hardware health: every watched
+    // class then has no elements.
+    virtual HealthBackend* health() { return nullptr; }
 };
 
 } // namespace orv::platform

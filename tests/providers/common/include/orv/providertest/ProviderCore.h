@@ -38,6 +38,10 @@ struct ProviderCoreOptions {
     // More registration files, for example to route a class of the test's
     // choosing to a provider.
     std::vector<std::filesystem::path> registrations;
+    // Folders searched for provider libraries before the build's.
+    std::vector<std::filesystem::path> providerDirs{};
+    // More MOF files, read after the project's.
+    std::vector<std::filesystem::path> mofs{};
 };
 
 class ProviderCore {
