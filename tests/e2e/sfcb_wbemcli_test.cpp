@@ -72,12 +72,21 @@ ServedClasses servedClasses() {
     return out;
 }
 
+// Classes that have no instance on the shipped simulated host: their instances are
+// latched health records, and neither broker serves the watched hardware classes
+// there, so nothing is ever latched. Both brokers are compared on their (empty)
+// enumerations; the cases that start from an instance have nothing to start from.
+const std::set<std::string> kWithoutInstances = {"Orvane_LatchedHealthState", "Orvane_LatchedHealthAssociation"};
+
 std::vector<SfcbCase> sfcbCases() {
     const ServedClasses classes = servedClasses();
     std::vector<SfcbCase> cases;
     for (const std::string& name : classes.served) {
         cases.push_back({"ein", name});
         cases.push_back({"ei", name});
+        if (kWithoutInstances.count(name) != 0) {
+            continue;
+        }
         cases.push_back({"gi", name, Target::FirstInstance});
         if (classes.associations.count(name) != 0) {
             for (Target end : {Target::FirstAssociationEnd1, Target::FirstAssociationEnd2}) {
