@@ -27,7 +27,7 @@ using ::testing::HasSubstr;
 
 constexpr std::chrono::seconds kInterval{30};
 
-TEST(HeartbeatE2eTest, CimhostDeliversIncreasingStampsOneIntervalApartAndSigtermJoinsTheThreadAtOnce) {
+TEST(HeartbeatE2eTest, OrvCimhostSendsIncreasingStampsOneIntervalApartAndSigtermJoinsTheThreadAtOnce) {
     const fs::path base = fs::temp_directory_path() / ("i14e-heartbeat-" + std::to_string(getpid()));
     fs::remove_all(base);
     fs::create_directories(base / "root/etc/sfcb");

@@ -31,7 +31,7 @@ Json hostOf(unsigned interfaces, unsigned variant) {
     Json vnics = Json::array();
     for (unsigned i = 0; i < interfaces; ++i) {
         const std::string tail = std::to_string(5 + variant);
-        vnics.push_back({{"name", "vmk" + std::to_string(i)},
+        vnics.push_back({{"name", "vif" + std::to_string(i)},
                          {"ipv4",
                           {{"address", "10." + std::to_string(i / 256) + "." + std::to_string(i % 256) + "." + tail},
                            {"netmask", "255.255.255.0"}}},

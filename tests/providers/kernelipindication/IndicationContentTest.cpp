@@ -52,9 +52,9 @@ private:
 using IpChangedIndicationTest = IpIndicationTest;
 
 TEST_F(IpChangedIndicationTest, Ipv4ModelPathNamesTheIpv4ClassTwiceAndTheInterfaceAsName) {
-    serve({Vnic{"vmk1", {{"172.16.0.2", "255.255.0.0"}}, {}}});
+    serve({Vnic{"vif1", {{"172.16.0.2", "255.255.0.0"}}, {}}});
     detector().enableIndication();
-    serve({Vnic{"vmk1", {{"172.16.0.3", "255.255.0.0"}}, {}}});
+    serve({Vnic{"vif1", {{"172.16.0.3", "255.255.0.0"}}, {}}});
     testAndSend();
     const std::vector<Delivered> delivered = recorder().delivered();
     ASSERT_EQ(delivered.size(), 1U);
@@ -62,7 +62,7 @@ TEST_F(IpChangedIndicationTest, Ipv4ModelPathNamesTheIpv4ClassTwiceAndTheInterfa
               (NamedValue{"SourceInstanceModelPath", CMPI_string,
                           "root/cimv2:Orvane_KernelIPv4ProtocolEndpoint.SystemCreationClassName="
                           "\"OMC_UnitaryComputerSystem\",SystemName=\"simhost.providers.test\",CreationClassName="
-                          "\"Orvane_KernelIPv4ProtocolEndpoint\",Name=\"vmk1\""}));
+                          "\"Orvane_KernelIPv4ProtocolEndpoint\",Name=\"vif1\""}));
     EXPECT_EQ(delivered[0].properties[6], (NamedValue{"SourceInstanceHost", CMPI_string, "172.16.0.3"}));
 }
 
