@@ -127,8 +127,27 @@ LoadedMI ProviderLoader::create(ProviderEntry& entry, ProviderLibrary& lib, Prov
     return loaded;
 }
 
+LoadedMI ProviderLoader::createUnlocked(std::unique_lock<std::recursive_mutex>& lock, ProviderEntry& entry,
+                                        ProviderLibrary& lib, ProviderKind kind) {
+    // The factory calls the provider's initialize, which may take the provider's own
+    // locks; a thread of that provider holding them may meanwhile ask the broker for
+    // another provider, which needs this lock. So the factory runs without it, and
+    // other requests for the same MI wait until it has returned.
+    const bool outermost = entry.creating.emplace(kind, std::this_thread::get_id()).second;
+    ++creating_;
+    lock.unlock();
+    LoadedMI loaded = create(entry, lib, kind);
+    lock.lock();
+    --creating_;
+    if (outermost) {
+        entry.creating.erase(kind);
+    }
+    created_.notify_all();
+    return loaded;
+}
+
 void* ProviderLoader::mi(const ProviderRegistration& reg, ProviderKind kind, std::string* error) {
-    std::lock_guard lock(mutex_);
+    std::unique_lock lock(mutex_);
     if (shutDown_) {
         if (error != nullptr) {
             *error = "the broker core has been shut down";
@@ -145,9 +164,17 @@ void* ProviderLoader::mi(const ProviderRegistration& reg, ProviderKind kind, std
     }
     slot->unloadNever = slot->unloadNever || reg.unloadNever;
     auto found = slot->mis.find(kind);
+    // Another thread is running this MI's factory: wait for its result. (The thread
+    // running it may come back here from inside the factory; it does not wait.)
+    for (auto busy = slot->creating.find(kind);
+         found == slot->mis.end() && busy != slot->creating.end() && busy->second != std::this_thread::get_id();
+         busy = slot->creating.find(kind)) {
+        created_.wait(lock);
+        found = slot->mis.find(kind);
+    }
     if (found == slot->mis.end()) {
         ProviderLibrary& lib = library(slot->location);
-        LoadedMI loaded = lib.handle != nullptr ? create(*slot, lib, kind) : LoadedMI{nullptr, lib.error};
+        LoadedMI loaded = lib.handle != nullptr ? createUnlocked(lock, *slot, lib, kind) : LoadedMI{nullptr, lib.error};
         found = slot->mis.emplace(kind, std::move(loaded)).first;
     }
     if (found->second.mi == nullptr && error != nullptr) {
@@ -192,7 +219,7 @@ unsigned ProviderLoader::unloadIdle() {
         for (auto& [name, entry] : providers_) {
             if (entry->location == lib.location) {
                 users.push_back(entry.get());
-                busy = busy || entry->unloadNever || entry->activeFilters > 0;
+                busy = busy || entry->unloadNever || entry->activeFilters > 0 || !entry->creating.empty();
             }
         }
         if (busy) {
@@ -226,16 +253,30 @@ unsigned ProviderLoader::unloadIdle() {
 }
 
 void ProviderLoader::shutdown() {
-    std::lock_guard lock(mutex_);
+    std::unique_lock lock(mutex_);
     if (shutDown_) {
         return;
     }
     shutDown_ = true;
+    // No factory may be running in a library about to be cleaned up and unloaded.
+    created_.wait(lock, [this] { return creating_ == 0; });
+    // From here on mi() refuses, so the MIs can be called without the lock: a
+    // provider's cleanup may wait for its own thread, which may be inside an
+    // up-call that needs this lock.
+    std::vector<std::pair<ProviderKind, void*>> mis;
     for (const std::string& name : order_) {
-        auto& entry = providers_[name];
-        auto found = entry->mis.find(ProviderKind::Indication);
-        if (found != entry->mis.end() && found->second.mi != nullptr) {
-            callDisableIndications(found->second.mi);
+        for (ProviderKind kind : kKinds) {
+            auto& entry = providers_[name];
+            auto found = entry->mis.find(kind);
+            if (found != entry->mis.end() && found->second.mi != nullptr) {
+                mis.emplace_back(kind, found->second.mi);
+            }
+        }
+    }
+    lock.unlock();
+    for (const auto& [kind, mi] : mis) {
+        if (kind == ProviderKind::Indication) {
+            callDisableIndications(mi);
         }
     }
     // Every provider's every MI, as sfcb cleans up a provider in a process of
@@ -244,15 +285,12 @@ void ProviderLoader::shutdown() {
     // the process without unloading anything.) This host unloads the libraries
     // next, so a provider that is not cleaned up could leave a thread running
     // in unloaded code.
+    for (const auto& [kind, mi] : mis) {
+        callCleanup(mi, kind, true);
+    }
+    lock.lock();
     for (const std::string& name : order_) {
-        auto& entry = providers_[name];
-        for (ProviderKind kind : kKinds) {
-            auto found = entry->mis.find(kind);
-            if (found != entry->mis.end() && found->second.mi != nullptr) {
-                callCleanup(found->second.mi, kind, true);
-            }
-        }
-        entry->mis.clear();
+        providers_[name]->mis.clear();
     }
     for (auto& lib : libraries_) {
         if (lib->handle != nullptr) {

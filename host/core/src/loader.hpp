@@ -6,11 +6,13 @@
 #include <cmpidt.h>
 #include <cmpift.h>
 
+#include <condition_variable>
 #include <filesystem>
 #include <map>
 #include <memory>
 #include <mutex>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "orv/repository/registration.hpp"
@@ -41,6 +43,8 @@ struct ProviderEntry {
     std::string parameters;
     bool unloadNever = false;
     std::map<ProviderKind, LoadedMI> mis;
+    // Kinds whose factory is running now, and the thread running it.
+    std::map<ProviderKind, std::thread::id> creating;
     bool indicationsEnabled = false;
     unsigned activeFilters = 0;
     // Active filters per class name (lower case) the MI was activated with.
@@ -75,6 +79,9 @@ public:
 private:
     ProviderLibrary& library(const std::string& location);
     LoadedMI create(ProviderEntry& entry, ProviderLibrary& lib, ProviderKind kind);
+    // Runs the factory of `kind` without holding the lock (see mi()).
+    LoadedMI createUnlocked(std::unique_lock<std::recursive_mutex>& lock, ProviderEntry& entry, ProviderLibrary& lib,
+                            ProviderKind kind);
     std::string findLibrary(const std::string& location) const;
 
     std::vector<std::filesystem::path> dirs_;
@@ -84,6 +91,8 @@ private:
     std::map<std::string, std::unique_ptr<ProviderEntry>> providers_;
     std::vector<std::string> order_;  // provider names in creation order
     bool shutDown_ = false;
+    unsigned creating_ = 0;                 // factories running now
+    std::condition_variable_any created_;  // a factory has returned
 };
 
 // Name of a kind as the factory symbols spell it ("Instance", "Association", ...).
