@@ -16,6 +16,7 @@
 #include <omc/Condition.h>
 #include <omc/Mutex.h>
 
+#include "PreparedContext.h"
 #include "Heartbeat-Config.h"
 #include "Heartbeat-Deadline.h"
 
@@ -97,13 +98,6 @@ void beat(CmpiBroker& broker, const CmpiContext& context, CmpiInstance& heartbea
     threadStarted = false;
 }
 
-void releaseContext(const CmpiContext& context) {
-    CMPIContext* ctx = context.getEnc();
-    if (ctx != nullptr) {
-        (void)ctx->ft->release(ctx);
-    }
-}
-
 [[noreturn]] void failToStart() {
     syslog(LOG_ERR, "%s", kStartFailure);
     throw CmpiStatus(CMPI_RC_ERR_FAILED, kStartFailure);
@@ -118,7 +112,7 @@ void startThread(CmpiBroker& broker, const CmpiContext& ctx) {
     record->broker = broker.getEnc();
     record->context = broker.prepareAttachThread(ctx).getEnc();
     if (pthread_create(&thread, nullptr, heartBeatThread, record) != 0) {
-        releaseContext(CmpiContext(record->context));
+        releasePreparedContext(CmpiContext(record->context));
         std::free(record);
         failToStart();
     }
@@ -138,7 +132,7 @@ void* heartBeatThread(void* arg) {
     } catch (...) {
         // Nothing to report to: the thread ends, as the broker would end it.
     }
-    releaseContext(context);
+    releasePreparedContext(context);
     return nullptr;
 }
 

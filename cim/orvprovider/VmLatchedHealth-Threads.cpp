@@ -5,6 +5,7 @@
 
 #include <cstdlib>
 
+#include "PreparedContext.h"
 #include "VmLatchedHealth.h"
 
 namespace VmLatchedHealth {
@@ -32,13 +33,16 @@ void* RunMonitorThread(void* arg, MonitorRound round, long seconds) {
     } catch (const CmpiStatus&) {
     }
     LatchedState& s = state();
-    OMC::MutexLock lock(s.healthMutex);
-    ++s.threadStarted;
-    while (!s.shuttingDown) {
-        round(broker, context);
-        WaitForNextRound(lock, seconds);
+    {
+        OMC::MutexLock lock(s.healthMutex);
+        ++s.threadStarted;
+        while (!s.shuttingDown) {
+            round(broker, context);
+            WaitForNextRound(lock, seconds);
+        }
+        --s.threadStarted;
     }
-    --s.threadStarted;
+    releasePreparedContext(context);
     return nullptr;
 }
 
