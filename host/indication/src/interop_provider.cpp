@@ -158,22 +158,25 @@ struct InteropProvider::Impl {
     const CMPIBroker* mb() const { return core.broker(); }
     const ManagerOptions& options() const { return manager.options(); }
 
-    Builder systemKeyed(const char* className, const std::string& name) const {
-        Builder b(mb(), className);
-        b.key("SystemCreationClassName", options().systemCreationClassName)
-            .key("SystemName", options().systemName)
+    // An object keyed like every system-scoped interop class: the scoping
+    // system's class and name, its own class and its name.
+    Builder systemScoped(const std::string& className, const std::string& systemClass, const std::string& systemName,
+                         const std::string& name) const {
+        Builder b(mb(), className.c_str());
+        b.key("SystemCreationClassName", systemClass)
+            .key("SystemName", systemName)
             .key("CreationClassName", className)
             .key("Name", name);
         return b;
     }
 
+    Builder systemKeyed(const char* className, const std::string& name) const {
+        return systemScoped(className, options().systemCreationClassName, options().systemName, name);
+    }
+
     Builder filterObject(const FilterRecord& f) const {
-        Builder b(mb(), f.creationClassName.c_str());
-        b.key("SystemCreationClassName", f.systemCreationClassName)
-            .key("SystemName", f.systemName)
-            .key("CreationClassName", f.creationClassName)
-            .key("Name", f.name)
-            .str("Query", f.query)
+        Builder b = systemScoped(f.creationClassName, f.systemCreationClassName, f.systemName, f.name);
+        b.str("Query", f.query)
             .str("QueryLanguage", f.queryLanguage)
             .str("SourceNamespace", f.sourceNamespace)
             .flag("IndividualSubscriptionSupported", true);
@@ -181,12 +184,8 @@ struct InteropProvider::Impl {
     }
 
     Builder destinationObject(const DestinationRecord& d) const {
-        Builder b(mb(), d.creationClassName.c_str());
-        b.key("SystemCreationClassName", d.systemCreationClassName)
-            .key("SystemName", d.systemName)
-            .key("CreationClassName", d.creationClassName)
-            .key("Name", d.name)
-            .str("Destination", d.destination)
+        Builder b = systemScoped(d.creationClassName, d.systemCreationClassName, d.systemName, d.name);
+        b.str("Destination", d.destination)
             .u16("PersistenceType", d.persistenceType)
             .u16("Protocol", d.protocol);
         return b;
