@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <variant>
 #include <vector>
 
 namespace orv::platform {
@@ -19,6 +20,17 @@ struct HealthKey {
     uint32_t number = 0;              // the value of a numeric key
 };
 
+// A descriptive property of an element beside its keys and HealthState (for
+// example ElementName, a sensor's CurrentReading, a drive's OperationalStatus),
+// typed as the element's class declares it.
+using HealthPropertyValue =
+    std::variant<std::string, bool, uint16_t, uint32_t, uint64_t, int32_t, int64_t, std::vector<uint16_t>>;
+
+struct HealthProperty {
+    std::string name;
+    HealthPropertyValue value;
+};
+
 struct HealthElement {
     std::string className;               // class of the element's own path
     std::optional<std::string> hostName; // host name of its path, when it has one
@@ -26,6 +38,9 @@ struct HealthElement {
     // The HealthState property: absent (nullopt) or present; a present value
     // may be null.
     std::optional<std::optional<uint16_t>> healthState;
+    // Other properties the host reports, in its order; none on hosts that give
+    // only keys and health.
+    std::vector<HealthProperty> properties;
 };
 
 // The elements reported under the watched class, in the host's order. Throws
