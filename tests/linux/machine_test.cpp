@@ -194,8 +194,9 @@ TEST(Machine, NicStatisticsBetweenTwoReadingsOfIp)
 {
     auto backend = machine();
     for (const auto& name : pnicNames(*backend)) {
-        auto pnic = pnicNamed(*backend, name);
+        // The pnic is its request's snapshot: its counters are read when it is made.
         auto before = toolJson("ip -s -j link show dev " + name).at(0)["stats64"];
+        auto pnic = pnicNamed(*backend, name);
         NN::PnicStats stats;
         pnic->GetPnicStats(stats);
         auto after = toolJson("ip -s -j link show dev " + name).at(0)["stats64"];

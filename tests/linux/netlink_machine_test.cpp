@@ -3,7 +3,7 @@
 // controller does not know) sends every query to the ioctls.
 #include "ethtool_reader.hpp"
 #include "linux_call_error.hpp"
-#include "sysfs_net.hpp"
+#include "rtnetlink_links.hpp"
 
 #include <cerrno>
 #include <cstring>
@@ -43,7 +43,10 @@ void expectSameStructure(const std::pair<std::optional<Structure>, int>& netlink
 
 std::vector<std::string> nics()
 {
-    auto names = SysfsNet().busDevices();
+    std::vector<std::string> names;
+    for (const auto& link : RouteLinks().all()) {
+        if (link.onBus()) names.push_back(link.name);
+    }
     if (names.empty()) ADD_FAILURE() << "this machine has no NIC on a bus";
     return names;
 }
