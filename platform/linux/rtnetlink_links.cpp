@@ -101,7 +101,9 @@ std::vector<NetlinkMessage> RouteLinks::request(const std::string& ifname)
     std::vector<NetlinkMessage> answers;
     std::lock_guard<std::mutex> lock(mutex_);
     if (!socket_) socket_ = std::make_unique<NetlinkSocket>(NETLINK_ROUTE);
-    if (int error = socket_->transact(buildLinkRequest(buffer.data(), ifname), answers)) {
+    nlmsghdr* message = buildLinkRequest(buffer.data(), ifname);
+    const int error = ifname.empty() ? socket_->transact(message, answers) : socket_->ask(message, answers);
+    if (error) {
         throw LinuxCallError("RTM_GETLINK", ifname.empty() ? "every link" : ifname, error);
     }
     return answers;
