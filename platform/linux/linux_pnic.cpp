@@ -86,13 +86,7 @@ const ethtool_drvinfo& LinuxPnic::driverInfo() const
 
 std::optional<ethtool_wolinfo> LinuxPnic::wakeOnLan() const
 {
-    if (wol_) return *wol_;
-    try {
-        wol_ = ethtool().wakeOnLan();
-    } catch (const LinuxCallError& error) {
-        if (!error.unsupported()) throw;
-        wol_ = std::optional<ethtool_wolinfo>();
-    }
+    if (!wol_) wol_ = ethtool().wakeOnLan();
     return *wol_;
 }
 
@@ -297,13 +291,7 @@ void LinuxPnic::GetPnicInfo(NN::PnicInfo& info) const
         const bool up = linkUp();
         fillLinkPart(info, settings(), up);
         fillWakeOnPart(info, wakeOnLan());
-        std::optional<std::uint32_t> level;
-        try {
-            level = ethtool().messageLevel();
-        } catch (const LinuxCallError& error) {
-            if (!error.unsupported()) throw;
-        }
-        fillMessageLevel(info, level);
+        fillMessageLevel(info, ethtool().messageLevel());
         info.viraddr = addressText(link().address);
     });
 }
