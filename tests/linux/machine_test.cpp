@@ -9,10 +9,12 @@
 #include "tmkctl/util/AutoVector.h"
 
 #include <arpa/inet.h>
+#include <atomic>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 #include <set>
 #include <sys/utsname.h>
+#include <thread>
 
 using namespace orv::linuxhost;
 using orv::linuxtest::fieldAfter;
@@ -372,4 +374,35 @@ TEST(Machine, OffloadsEqualEthtoolFeatures)
         EXPECT_EQ(info.largeReceive, isOn(*features, "large-receive-offload")) << name;
         EXPECT_EQ(info.udpFragmentation, isOn(*features, "udp-fragmentation-offload")) << name;
     }
+}
+
+TEST(Machine, ConcurrentNicRequestsShareTheBackendsSocketsAndAgree)
+{
+    auto backend = machine();
+    const auto expected = pnicNames(*backend);
+    ASSERT_FALSE(expected.empty());
+    std::atomic<unsigned> disagreements{0}, failures{0};
+    std::vector<std::thread> clients;
+    for (int client = 0; client < 4; ++client) {
+        clients.emplace_back([&] {
+            for (int request = 0; request < 50; ++request) {
+                if (pnicNames(*backend) != expected) ++disagreements;
+                for (const auto& name : expected) {
+                    try {
+                        auto pnic = pnicNamed(*backend, name);
+                        NN::PnicInfo info;
+                        NN::PnicStats stats;
+                        pnic->GetPnicInfo(info);
+                        pnic->GetPnicStats(stats);
+                        if (pnic->GetMTU() == 0 || pnic->GetPciDevice() == nullptr) ++disagreements;
+                    } catch (const NodeMgr::Lib::NodeMgrException&) {
+                        ++failures;
+                    }
+                }
+            }
+        });
+    }
+    for (auto& client : clients) client.join();
+    EXPECT_EQ(disagreements.load(), 0u);
+    EXPECT_EQ(failures.load(), 0u);
 }
