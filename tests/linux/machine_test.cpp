@@ -2,6 +2,7 @@
 // ip, ethtool, uname and /proc report.
 #include "linux_backend.hpp"
 #include "stack_params.hpp"
+#include "mac_text.hpp"
 #include "tool_output.hpp"
 
 #include "nodemgr/lib/NodeMgrException.h"
@@ -18,6 +19,7 @@
 
 using namespace orv::linuxhost;
 using orv::linuxtest::fieldAfter;
+using orv::linuxtest::macText;
 using orv::linuxtest::stackParams;
 using orv::linuxtest::toolOutput;
 using json = nlohmann::json;
@@ -52,15 +54,6 @@ std::vector<std::string> pnicNames(orv::platform::Backend& backend)
 std::unique_ptr<NN::Pnic> pnicNamed(orv::platform::Backend& backend, const std::string& name)
 {
     return std::unique_ptr<NN::Pnic>(backend.network().getPnicByName(name));
-}
-
-std::string macText(const NN::MacAddress& mac)
-{
-    unsigned char bytes[6];
-    mac.GetBinaryAddress(bytes);
-    char text[18];
-    std::snprintf(text, sizeof text, "%02x:%02x:%02x:%02x:%02x:%02x", bytes[0], bytes[1], bytes[2], bytes[3], bytes[4], bytes[5]);
-    return text;
 }
 
 // Values of "key : value" lines of /proc/cpuinfo, in order.

@@ -6,6 +6,7 @@
 // inside the namespace, and never this machine's NIC behind the same name.
 #include "linux_backend.hpp"
 #include "linux_pnic.hpp"
+#include "mac_text.hpp"
 #include "tool_output.hpp"
 
 #include "tmkctl/util/AutoVector.h"
@@ -19,18 +20,12 @@
 
 using namespace orv::linuxhost;
 using orv::linuxtest::fieldAfter;
+using orv::linuxtest::macText;
 using orv::linuxtest::runTool;
 using orv::linuxtest::toolOutput;
 namespace NN = NodeMgr::Network;
 
 namespace {
-
-std::string macText(const NN::MacAddress& mac)
-{
-    unsigned char bytes[6];
-    mac.GetBinaryAddress(bytes);
-    return addressText(std::vector<std::uint8_t>(bytes, bytes + 6));
-}
 
 // What a thread joined to the namespace read through the substitute.
 struct Seen {
