@@ -228,3 +228,16 @@ TEST_F(VethNamespace, MtuChangedSeenByTheNextPnic)
     EXPECT_EQ(outerPnic().GetMTU(), 1280u);
     EXPECT_EQ(toolOutput("cat /sys/class/net/" + outer_ + "/mtu").value_or(""), "1280\n");
 }
+
+TEST_F(VethNamespace, PnicWhoseInterfaceVanishesKeepsItsLinkAnswerAndFailsEthtoolCalls)
+{
+    auto route = std::make_shared<RouteLinks>();
+    LinuxPnic pnic(outer_, NicKernel{channel_, nullptr, route}, route->named(outer_));  // as a listing hands it over
+    ASSERT_TRUE(runTool("ip link del " + outer_));
+    EXPECT_EQ(pnic.GetMTU(), 1500u);  // the request's snapshot
+    EXPECT_TRUE(pnic.IsEnabled());
+    NN::PnicDriverInfo driver;
+    EXPECT_THROW(pnic.GetPnicDriverInfo(driver), NodeMgr::Lib::NodeMgrException);
+    pnic.Refresh();  // the next look finds it gone
+    EXPECT_THROW(pnic.GetMTU(), NodeMgr::Lib::NodeMgrException);
+}
