@@ -50,7 +50,10 @@ std::optional<BusDevice> busDeviceFromDriverInfo(std::string_view busInfo)
 
 bool recognizeNic(LinkRecord& link, EthtoolChannel& channel, bool kernelNamesParents)
 {
-    if (link.onBus() || kernelNamesParents || (link.flags & IFF_LOOPBACK)) return link.onBus();
+    if (kernelNamesParents) return link.onBus();
+    link.parentDevice.clear();
+    link.parentBus.clear();
+    if (link.flags & IFF_LOOPBACK) return false;
     auto device = askDriver(link.name, channel);
     if (!device) return false;
     link.parentDevice = std::move(device->device);

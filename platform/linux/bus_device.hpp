@@ -22,11 +22,13 @@ struct BusDevice {
 // address is on "pci", "usb-..." on "usb", any other form on an unnamed bus.
 std::optional<BusDevice> busDeviceFromDriverInfo(std::string_view busInfo);
 
-// True when the link is a NIC. When the kernel does not name parent devices
-// (`kernelNamesParents` false), a link without one that is not a loopback is
-// asked for its driver info through `channel`, and the bus device found there
-// is written into the link. A driver that does not answer the query or a link
-// that vanished is no NIC; any other refusal throws LinuxCallError.
+// True when the link is a NIC. A kernel that names parent devices
+// (`kernelNamesParents`) decides alone: the link names its bus device. On one
+// that does not, every link that is not a loopback is asked for its driver
+// info through `channel` (so all links are judged alike, whatever a backported
+// kernel may send), and the bus device found there is written into the link.
+// A driver that does not answer the query or a link that vanished is no NIC;
+// any other refusal throws LinuxCallError.
 bool recognizeNic(LinkRecord& link, EthtoolChannel& channel, bool kernelNamesParents);
 
 }  // namespace orv::linuxhost

@@ -162,17 +162,31 @@ TEST(RecognizeNic, OlderKernelOtherRefusalFailsNamingTheQuery)
     }
 }
 
-TEST(RecognizeNic, LinkThatNamesItsParentIsANicWithoutAskingTheDriver)
+TEST(RecognizeNic, NewerKernelLinkThatNamesItsParentIsANicWithoutAskingTheDriver)
 {
-    for (bool kernelNamesParents : {true, false}) {
-        DriverInfoChannel channel("0000:00:03.0");
-        auto link = linkNamed("eth0");
-        link.parentDevice = "virtio2";
-        link.parentBus = "virtio";
-        EXPECT_TRUE(recognizeNic(link, channel, kernelNamesParents));
-        EXPECT_EQ(link.parentDevice, "virtio2");
-        EXPECT_EQ(channel.exchanges, 0);
-    }
+    DriverInfoChannel channel("0000:00:03.0");
+    auto link = linkNamed("eth0");
+    link.parentDevice = "virtio2";
+    link.parentBus = "virtio";
+    EXPECT_TRUE(recognizeNic(link, channel, true));
+    EXPECT_EQ(link.parentDevice, "virtio2");
+    EXPECT_EQ(link.parentBus, "virtio");
+    EXPECT_EQ(channel.exchanges, 0);
+}
+
+TEST(RecognizeNic, OlderKernelJudgesALinkThatNamesAParentByItsDriverInfoToo)
+{
+    DriverInfoChannel channel("0000:00:03.0");
+    auto link = linkNamed("eth0");
+    link.parentDevice = "virtio2";
+    link.parentBus = "virtio";
+    EXPECT_TRUE(recognizeNic(link, channel, false));
+    EXPECT_EQ(link.parentDevice, "0000:00:03.0");
+    EXPECT_EQ(link.parentBus, "pci");
+    EXPECT_EQ(channel.exchanges, 1);
+    DriverInfoChannel refusing("", EOPNOTSUPP);
+    EXPECT_FALSE(recognizeNic(link, refusing, false));
+    EXPECT_FALSE(link.onBus());
 }
 
 TEST(RecognizeNic, NewerKernelLinkWithoutParentIsNoNicAndCostsNoQuery)
