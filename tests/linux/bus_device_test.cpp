@@ -46,6 +46,22 @@ LinkRecord linkNamed(const std::string& name, std::uint32_t flags = IFF_UP | IFF
     return link;
 }
 
+// A link whose answer names its bus device as a 5.16 kernel does for a virtio NIC.
+LinkRecord virtioLink()
+{
+    auto link = linkNamed("eth0");
+    link.parentDevice = "virtio2";
+    link.parentBus = "virtio";
+    return link;
+}
+
+void expectOnBusDevice(const LinkRecord& link, const char* device, const char* bus)
+{
+    EXPECT_TRUE(link.onBus());
+    EXPECT_EQ(link.parentDevice, device);
+    EXPECT_EQ(link.parentBus, bus);
+}
+
 }  // namespace
 
 TEST(KernelRelease, KernelsFrom516OnNameParentDevices)
@@ -79,28 +95,16 @@ TEST(KernelRelease, RunningKernelIsDecidedFromUname)
     EXPECT_EQ(kernelNamesParentDevices(), releaseNamesParentDevices(name.release)) << name.release;
 }
 
-TEST(BusDeviceFromDriverInfo, PciAddressIsOnPci)
+TEST(BusDeviceFromDriverInfo, PciAddressIsOnPciUsbPathOnUsbOtherFormsOnAnUnnamedBus)
 {
-    auto device = busDeviceFromDriverInfo("0000:00:03.0");
-    ASSERT_TRUE(device);
-    EXPECT_EQ(device->device, "0000:00:03.0");
-    EXPECT_EQ(device->bus, "pci");
-}
-
-TEST(BusDeviceFromDriverInfo, UsbPathIsOnUsb)
-{
-    auto device = busDeviceFromDriverInfo("usb-0000:00:14.0-1");
-    ASSERT_TRUE(device);
-    EXPECT_EQ(device->device, "usb-0000:00:14.0-1");
-    EXPECT_EQ(device->bus, "usb");
-}
-
-TEST(BusDeviceFromDriverInfo, OtherFormIsADeviceOnAnUnnamedBus)
-{
-    auto device = busDeviceFromDriverInfo("vif-0");
-    ASSERT_TRUE(device);
-    EXPECT_EQ(device->device, "vif-0");
-    EXPECT_EQ(device->bus, "");
+    const std::pair<const char*, const char*> cases[] = {
+        {"0000:00:03.0", "pci"}, {"usb-0000:00:14.0-1", "usb"}, {"vif-0", ""}, {"0000:00:03", ""}};
+    for (const auto& [busInfo, bus] : cases) {
+        auto device = busDeviceFromDriverInfo(busInfo);
+        ASSERT_TRUE(device) << busInfo;
+        EXPECT_EQ(device->device, busInfo);
+        EXPECT_EQ(device->bus, bus) << busInfo;
+    }
 }
 
 TEST(BusDeviceFromDriverInfo, EmptyOrVirtualPlaceholderIsNoDevice)
@@ -115,9 +119,7 @@ TEST(RecognizeNic, OlderKernelTakesTheBusDeviceFromTheDriverInfo)
     DriverInfoChannel channel("0000:00:03.0");
     auto link = linkNamed("eth0");
     EXPECT_TRUE(recognizeNic(link, channel, false));
-    EXPECT_EQ(link.parentDevice, "0000:00:03.0");
-    EXPECT_EQ(link.parentBus, "pci");
-    EXPECT_TRUE(link.onBus());
+    expectOnBusDevice(link, "0000:00:03.0", "pci");
     EXPECT_EQ(channel.exchanges, 1);
 }
 
@@ -165,24 +167,18 @@ TEST(RecognizeNic, OlderKernelOtherRefusalFailsNamingTheQuery)
 TEST(RecognizeNic, NewerKernelLinkThatNamesItsParentIsANicWithoutAskingTheDriver)
 {
     DriverInfoChannel channel("0000:00:03.0");
-    auto link = linkNamed("eth0");
-    link.parentDevice = "virtio2";
-    link.parentBus = "virtio";
+    auto link = virtioLink();
     EXPECT_TRUE(recognizeNic(link, channel, true));
-    EXPECT_EQ(link.parentDevice, "virtio2");
-    EXPECT_EQ(link.parentBus, "virtio");
+    expectOnBusDevice(link, "virtio2", "virtio");
     EXPECT_EQ(channel.exchanges, 0);
 }
 
 TEST(RecognizeNic, OlderKernelJudgesALinkThatNamesAParentByItsDriverInfoToo)
 {
     DriverInfoChannel channel("0000:00:03.0");
-    auto link = linkNamed("eth0");
-    link.parentDevice = "virtio2";
-    link.parentBus = "virtio";
+    auto link = virtioLink();
     EXPECT_TRUE(recognizeNic(link, channel, false));
-    EXPECT_EQ(link.parentDevice, "0000:00:03.0");
-    EXPECT_EQ(link.parentBus, "pci");
+    expectOnBusDevice(link, "0000:00:03.0", "pci");
     EXPECT_EQ(channel.exchanges, 1);
     DriverInfoChannel refusing("", EOPNOTSUPP);
     EXPECT_FALSE(recognizeNic(link, refusing, false));

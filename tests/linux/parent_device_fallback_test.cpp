@@ -6,19 +6,19 @@
 // kernel names them, the listing is the links that rtnetlink puts on a bus.
 #include "bus_device.hpp"
 #include "linux_backend.hpp"
+#include "join_namespace.hpp"
 #include "tool_output.hpp"
 
 #include "tmkctl/util/AutoVector.h"
 
-#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <memory>
-#include <sched.h>
 #include <thread>
 #include <unistd.h>
 
 using namespace orv::linuxhost;
 using orv::linuxtest::fieldAfter;
+using orv::linuxtest::joinNamedNamespace;
 using orv::linuxtest::runTool;
 using orv::linuxtest::toolOutput;
 namespace NN = NodeMgr::Network;
@@ -132,10 +132,7 @@ protected:
     {
         bool joined = false;
         std::thread thread([&] {
-            const int fd = ::open(("/var/run/netns/" + ns_).c_str(), O_RDONLY | O_CLOEXEC);
-            if (fd < 0) return;
-            joined = ::setns(fd, CLONE_NEWNET) == 0;
-            ::close(fd);
+            joined = joinNamedNamespace(ns_);
             if (joined) body();
         });
         thread.join();
