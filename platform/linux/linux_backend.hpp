@@ -4,6 +4,7 @@
 #include "canonical_name.hpp"
 #include "ethtool_channel.hpp"
 #include "ethtool_netlink_channel.hpp"
+#include "kernel_release.hpp"
 #include "linux_ksi.hpp"
 #include "linux_pnic.hpp"
 #include "os_version.hpp"
@@ -14,20 +15,26 @@
 
 namespace orv::linuxhost {
 
-// The physical NICs: the links of the backend's network namespace that
-// rtnetlink shows on a bus device, in interface-index order. A listing is one
+// The physical NICs: the links of the backend's network namespace that sit on
+// a bus device (recognizeNic), in interface-index order. A listing is one
 // RTM_GETLINK dump whose answers the pnics keep; a pnic by name is one
 // RTM_GETLINK for that name.
 class LinuxNetwork final : public orv::platform::NetworkBackend {
 public:
     // Without a netlink channel every ethtool query goes through the ioctls.
+    // `kernelNamesParents` false: the kernel's link answers name no parent
+    // device, so the bus device is asked of each link's driver.
     LinuxNetwork(std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
-                 std::shared_ptr<EthtoolNetlinkChannel> netlink = nullptr);
+                 std::shared_ptr<EthtoolNetlinkChannel> netlink = nullptr,
+                 bool kernelNamesParents = kernelNamesParentDevices());
     std::vector<NodeMgr::Network::Pnic*> getPnics() override;
     NodeMgr::Network::Pnic* getPnicByName(const std::string& name) override;
 
 private:
+    bool isNic(LinkRecord& link) const;
+
     NicKernel kernel_;
+    bool kernelNamesParents_;
 };
 
 // Version record from os-release and uname; host type from configuration.

@@ -1,3 +1,4 @@
+#include "bus_device.hpp"
 #include "linux_backend.hpp"
 #include "linux_call_error.hpp"
 #include "linux_pnic.hpp"
@@ -7,9 +8,15 @@
 namespace orv::linuxhost {
 
 LinuxNetwork::LinuxNetwork(std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
-                           std::shared_ptr<EthtoolNetlinkChannel> netlink)
-    : kernel_(std::move(channel), std::move(netlink), std::make_shared<RouteLinks>(), std::move(sysRoot))
+                           std::shared_ptr<EthtoolNetlinkChannel> netlink, bool kernelNamesParents)
+    : kernel_(std::move(channel), std::move(netlink), std::make_shared<RouteLinks>(), std::move(sysRoot)),
+      kernelNamesParents_(kernelNamesParents)
 {
+}
+
+bool LinuxNetwork::isNic(LinkRecord& link) const
+{
+    return recognizeNic(link, *kernel_.ethtool, kernelNamesParents_);
 }
 
 std::vector<NodeMgr::Network::Pnic*> LinuxNetwork::getPnics()
@@ -18,7 +25,7 @@ std::vector<NodeMgr::Network::Pnic*> LinuxNetwork::getPnics()
     try {
         auto pci = std::make_shared<PciIdentities>(kernel_.sysRoot);
         for (auto& link : kernel_.route->all()) {
-            if (!link.onBus()) continue;
+            if (!isNic(link)) continue;
             std::string name = link.name;
             pnics.push_back(new LinuxPnic(std::move(name), kernel_, std::move(link), pci));
         }
@@ -37,11 +44,11 @@ NodeMgr::Network::Pnic* LinuxNetwork::getPnicByName(const std::string& name)
     std::optional<LinkRecord> link;
     try {
         link = kernel_.route->named(name);
+        if (!isNic(*link)) return nullptr;
     } catch (const LinuxCallError& error) {
         if (error.vanished()) return nullptr;  // no such interface
         throw NodeMgr::Lib::NodeMgrException("GetPnicByName failed for " + name + ": " + error.what());
     }
-    if (!link->onBus()) return nullptr;
     return new LinuxPnic(name, kernel_, std::move(link));
 }
 

@@ -7,14 +7,13 @@
 #include "linux_backend.hpp"
 #include "linux_pnic.hpp"
 #include "mac_text.hpp"
+#include "join_namespace.hpp"
 #include "tool_output.hpp"
 
 #include "tmkctl/util/AutoVector.h"
 
-#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
-#include <sched.h>
 #include <thread>
 #include <unistd.h>
 
@@ -75,10 +74,7 @@ protected:
     {
         Seen seen;
         std::thread reader([&] {
-            int fd = ::open(("/var/run/netns/" + ns_).c_str(), O_RDONLY | O_CLOEXEC);
-            if (fd < 0) return;
-            seen.joined = ::setns(fd, CLONE_NEWNET) == 0;
-            ::close(fd);
+            seen.joined = orv::linuxtest::joinNamedNamespace(ns_);
             if (!seen.joined) return;
             auto channel = std::make_shared<IoctlEthtoolChannel>();
             LinuxNetwork network("/sys", channel);
