@@ -30,6 +30,8 @@ const Case kCases[] = {
     {"ai_invalid_class_from_provider_is_invalid_parameter", "ai_element", "invalidclass"},
     {"ai_unknown_class_is_invalid_parameter", "ai_unknown_class", "user"},
     {"cm_unknown_class_is_not_found", "cm_unknown_class", "user"},
+    // Key values carry their CIM type.
+    {"ein_keyvalues_carry_type", "ein_element", "user"},
 };
 
 class DispatcherGoldenTest : public ::testing::TestWithParam<Case> {
