@@ -32,7 +32,7 @@ const Case kCases[] = {
     {"cm_unknown_class_is_not_found", "cm_unknown_class", "user"},
     // ExecQuery of a provider that refuses it: answered from its enumeration, with paths.
     {"eq_where_filters_the_enumeration", "eq_where", "noquery"},
-    {"eq_select_list_keeps_its_properties_and_keys", "eq_select_list", "noquery"},
+    {"eq_select_list_gives_its_properties_and_keys_in_the_path", "eq_select_list", "noquery"},
     {"eq_cql_of_the_wql_subset", "eq_cql", "noquery"},
     {"eq_unknown_language_is_not_supported", "eq_unknown_language", "noquery"},
     {"eq_malformed_query_is_invalid", "eq_malformed", "noquery"},
