@@ -519,7 +519,7 @@ static CMPIUint32 raiseIndications(const CMPIContext* ctx, const CMPIArgs* in)
     return accepted;
 }
 
-/* JoinNames: the Name keys of the Elements references, joined with ',' */
+/* JoinNames: the Name keys of the Elements references, joined with ',' (NULL for a null element) */
 static CMPIStatus joinNames(const CMPIResult* rslt, const CMPIArgs* in)
 {
     CMPIData refs = in->ft->getArg(in, "Elements", NULL);
@@ -531,11 +531,15 @@ static CMPIStatus joinNames(const CMPIResult* rslt, const CMPIArgs* in)
     n = refs.value.array->ft->getSize(refs.value.array, NULL);
     for (i = 0; i < n; ++i) {
         CMPIData ref = refs.value.array->ft->getElementAt(refs.value.array, i, NULL);
-        CMPIData name = ref.value.ref->ft->getKey(ref.value.ref, "Name", NULL);
+        const char* text = "NULL";
+        if ((ref.state & CMPI_nullValue) == 0 && ref.value.ref != NULL) {
+            CMPIData name = ref.value.ref->ft->getKey(ref.value.ref, "Name", NULL);
+            text = name.type == CMPI_string ? (const char*)name.value.string->hdl : "?";
+        }
         if (i > 0) {
             strncat(joined, ",", sizeof joined - strlen(joined) - 1);
         }
-        strncat(joined, (const char*)name.value.string->hdl, sizeof joined - strlen(joined) - 1);
+        strncat(joined, text, sizeof joined - strlen(joined) - 1);
     }
     rslt->ft->returnData(rslt, (const CMPIValue*)joined, CMPI_chars);
     rslt->ft->returnDone(rslt);

@@ -285,6 +285,20 @@ struct ArgTarget {
     throw CimError(CimStatus::InvalidParameter, "parameter " + name + " must be " + std::string(expected));
 }
 
+// An array of references from a VALUE.REFARRAY (VALUE.NULL elements stay null).
+CMPIArray* buildRefArray(const ArgTarget& target, const cimxml::RefArrayParam& refs) {
+    CMPIArray* array =
+        target.broker->eft->newArray(target.broker, static_cast<CMPICount>(refs.items.size()), CMPI_ref, nullptr);
+    for (std::size_t i = 0; i < refs.items.size(); ++i) {
+        if (refs.items[i]) {
+            CMPIValue element{};
+            element.ref = buildObjectPath(target.broker, target.classes, target.nameSpace, *refs.items[i]);
+            array->ft->setElementAt(array, static_cast<CMPICount>(i), &element, CMPI_ref);
+        }
+    }
+    return array;
+}
+
 // One argument converted from its PARAMVALUE to the declared type.
 void addArgument(CMPIArgs* args, const ArgTarget& target, const std::string& name, const cimxml::ParamValue& value) {
     const CMPIType type = cmpiType(target.decl.type.type);
@@ -295,9 +309,16 @@ void addArgument(CMPIArgs* args, const ArgTarget& target, const std::string& nam
     }
     Converted converted;
     converted.type = type;
-    if (target.decl.type.isArray) {
+    if (target.decl.type.isArray && type == CMPI_ref) {
+        const auto* refs = std::get_if<cimxml::RefArrayParam>(&value);
+        if (refs == nullptr) {
+            wrongKind(name, "an array of references (VALUE.REFARRAY)");
+        }
+        converted.value.array = buildRefArray(target, *refs);
+        converted.type = CMPI_refA;
+    } else if (target.decl.type.isArray) {
         const auto* items = std::get_if<std::vector<std::optional<std::string>>>(&value);
-        if (items == nullptr || type == CMPI_ref) {
+        if (items == nullptr) {
             wrongKind(name, "an array of values");
         }
         converted.value.array = buildArray(target.broker, name, *items, type);
