@@ -47,6 +47,16 @@ const Case kCases[] = {
     {"cc_class_with_an_instance_inside_is_not_valid", "cc_class_with_instance_inside", "user", false},
     {"cm_reference_array_reaches_the_provider", "cm_reference_array", "user"},
     {"cm_reference_array_sent_as_values_is_invalid_parameter", "cm_reference_array_as_values", "user"},
+    // Request paths: keys are checked against the class; those that pass reach the provider.
+    {"gi_undeclared_key_is_invalid_parameter", "gi_undeclared_key", "user"},
+    {"gi_non_key_property_as_key_is_invalid_parameter", "gi_non_key_property", "user"},
+    {"gi_duplicate_key_is_invalid_parameter", "gi_duplicate_key", "user"},
+    {"gi_numeric_valuetype_holding_text_is_invalid_parameter", "gi_numeric_valuetype_text", "user"},
+    {"gi_type_attribute_of_another_type_is_invalid_parameter", "gi_wrong_type_attribute", "user"},
+    {"gi_unnamed_key_value_of_a_single_key_class", "gi_unnamed_key_value", "user"},
+    {"gi_keys_reach_the_provider_as_sent", "gi_element", "user"},
+    {"ai_instance_name_without_keys_is_invalid_parameter", "ai_instance_without_keys", "user"},
+    {"ain_class_name_is_answered_for_the_class", "ain_class_name", "user"},
     // Key values carry their CIM type.
     {"ein_keyvalues_carry_type", "ein_element", "user"},
 };

@@ -1,5 +1,7 @@
 #include "cmpi_builder.hpp"
 
+#include "key_check.hpp"
+
 #include <strings.h>
 
 #include <charconv>
@@ -189,12 +191,14 @@ CMPIType typeFromXmlName(std::string_view name) {
 
 void addKey(const CMPIBroker* broker, const repository::ClassRepository& classes, std::string_view nameSpace,
             CMPIObjectPath* path, const cimxml::ObjectPathModel& model, const cimxml::KeyBindingModel& key) {
-    const repository::PropertyDecl* declared = declaredProperty(classes, nameSpace, model.className, key.name);
+    // A bare KEYVALUE (no KEYBINDING) is the value of the class's only key.
+    const std::string name = key.name.empty() ? soleKeyName(classes, nameSpace, model.className) : key.name;
+    const repository::PropertyDecl* declared = declaredProperty(classes, nameSpace, model.className, name);
     Converted converted;
     converted.type = declared != nullptr ? cmpiType(declared->type.type) : guessedKeyType(key);
     if (converted.type == CMPI_ref || key.kind == cimxml::KeyBindingModel::Kind::Reference) {
         if (!key.reference) {
-            badValue(key.name, key.value, "reference");
+            badValue(name, key.value, "reference");
         }
         converted.type = CMPI_ref;
         // As sfcb does, a reference key reaches the provider without the host the
@@ -204,9 +208,9 @@ void addKey(const CMPIBroker* broker, const repository::ClassRepository& classes
         local.host.clear();
         converted.value.ref = buildObjectPath(broker, classes, nameSpace, local);
     } else {
-        convertText(broker, converted, key.name, key.value);
+        convertText(broker, converted, name, key.value);
     }
-    path->ft->addKey(path, key.name.c_str(), converted.pointer(), converted.type);
+    path->ft->addKey(path, name.c_str(), converted.pointer(), converted.type);
 }
 
 CMPIType propertyType(const repository::PropertyDecl* declared, const cimxml::PropertyModel& property) {
@@ -358,6 +362,7 @@ CMPIArgs* buildArgs(const CMPIBroker* broker, const repository::ClassRepository&
 
 CMPIObjectPath* buildObjectPath(const CMPIBroker* broker, const repository::ClassRepository& classes,
                                 std::string_view nameSpace, const cimxml::ObjectPathModel& model) {
+    checkInstanceName(classes, nameSpace, model);
     const std::string ns = model.nameSpace.empty() ? std::string(nameSpace) : model.nameSpace;
     CMPIStatus rc{CMPI_RC_OK, nullptr};
     CMPIObjectPath* path = broker->eft->newObjectPath(broker, ns.c_str(), model.className.c_str(), &rc);

@@ -30,6 +30,7 @@ struct ObjectPathModel {
     std::string nameSpace;  // "root/cimv2"; empty when the path had none
     std::string className;
     std::vector<KeyBindingModel> keys;  // empty for a class path
+    bool instance = false;              // read from an INSTANCENAME (even one without keys)
 };
 
 // One property of an instance sent by the client.
