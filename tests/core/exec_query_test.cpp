@@ -1,6 +1,10 @@
 // ExecQuery of a provider that refuses execQuery: the host answers from the
 // provider's enumeration, filtered by the query's WHERE clause and cut to its
 // SELECT list.
+#include <atomic>
+#include <thread>
+#include <vector>
+
 #include "core_fixture.hpp"
 
 namespace orv::host::test {
@@ -99,6 +103,30 @@ TEST_F(ExecQueryTest, UnknownClassOrSelectedPropertyIsAnInvalidQuery) {
     Reply unknownProperty = query("SELECT Colour FROM Raw_Element");
     EXPECT_EQ(unknownProperty.rc(), CMPI_RC_ERR_INVALID_QUERY);
     EXPECT_EQ(unknownProperty.message(), "class Raw_Element has no property Colour");
+}
+
+TEST_F(ExecQueryTest, ConcurrentQueriesEachKeepTheirOwnSelection) {
+    std::atomic<int> wrong{0};
+    std::vector<std::thread> threads;
+    for (int t = 0; t < 4; ++t) {
+        threads.emplace_back([this, t, &wrong] {
+            ObjectScope scope;
+            const std::string text = "SELECT Counter FROM Raw_Element WHERE Counter = " + std::to_string(t % 2);
+            for (int i = 0; i < 25; ++i) {
+                Reply reply = query(text.c_str());
+                const auto instances = reply.instances();
+                if (reply.rc() != CMPI_RC_OK || instances.size() != 2 ||
+                    instances.front()->ft->getProperty(instances.front(), "Counter", nullptr).value.uint32 !=
+                        static_cast<CMPIUint32>(t % 2)) {
+                    ++wrong;
+                }
+            }
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+    EXPECT_EQ(wrong.load(), 0);
 }
 
 }  // namespace

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "orv/cimxml/xml_tree.hpp"
+#include "orv/cimxml/xml_writer.hpp"
 #include "raw_connection.hpp"
 
 namespace orv::e2e {
@@ -14,20 +15,6 @@ namespace orv::e2e {
 namespace {
 
 using cimxml::XmlElement;
-
-std::string escaped(const std::string& text) {
-    std::string out;
-    for (char c : text) {
-        switch (c) {
-        case '<': out += "&lt;"; break;
-        case '>': out += "&gt;"; break;
-        case '&': out += "&amp;"; break;
-        case '\'': out += "&apos;"; break;
-        default: out += c;
-        }
-    }
-    return out;
-}
 
 // The value text of a PROPERTY, PROPERTY.ARRAY or KEYVALUE; "NULL" without one.
 std::string valueText(const XmlElement& element) {
@@ -91,8 +78,8 @@ std::string execQueryBody(const std::string& language, const std::string& query)
     return "<?xml version=\"1.0\" encoding=\"utf-8\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
            "<MESSAGE ID=\"7\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><IMETHODCALL NAME=\"ExecQuery\">"
            "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/></LOCALNAMESPACEPATH>"
-           "<IPARAMVALUE NAME=\"QueryLanguage\"><VALUE>" + escaped(language) + "</VALUE></IPARAMVALUE>"
-           "<IPARAMVALUE NAME=\"Query\"><VALUE>" + escaped(query) + "</VALUE></IPARAMVALUE>"
+           "<IPARAMVALUE NAME=\"QueryLanguage\"><VALUE>" + cimxml::escapeXml(language) + "</VALUE></IPARAMVALUE>"
+           "<IPARAMVALUE NAME=\"Query\"><VALUE>" + cimxml::escapeXml(query) + "</VALUE></IPARAMVALUE>"
            "</IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
 }
 
