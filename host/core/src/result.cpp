@@ -3,6 +3,7 @@
 #include "error.hpp"
 #include "instance.hpp"
 #include "object_path.hpp"
+#include "query_fallback.hpp"
 #include "value.hpp"
 
 namespace orv::host::detail {
@@ -25,6 +26,11 @@ CMPIStatus release(CMPIResult* result) { return releaseAny(result, &kResultFT); 
 CMPIResult* clone(const CMPIResult* /*result*/, CMPIStatus* rc) {
     setRc(rc, CMPI_RC_ERR_NOT_SUPPORTED);  // a result belongs to one MI call
     return nullptr;
+}
+
+// Whether an instance returned to the sink is kept (see ResultSink::query).
+bool admitted(const ResultSink& sink, CMPIInstance* instance) {
+    return sink.query == nullptr || admitForQuery(*sink.query, instance);
 }
 
 void append(ResultSink& sink, ReturnedItem::Kind kind, CMPIType type, void* object) {
@@ -67,7 +73,9 @@ CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance
     if (copy == nullptr) {
         return status(CMPI_RC_ERR_INVALID_HANDLE, "returnInstance with an object that is not a live instance");
     }
-    append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy);
+    if (admitted(*sink, copy)) {
+        append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy);
+    }
     return okStatus();
 }
 
@@ -85,7 +93,9 @@ CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path
         if (instance == nullptr) {
             return status(CMPI_RC_ERR_INVALID_HANDLE, "returnObjectPath with an object that is not a live object path");
         }
-        append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, instance);
+        if (admitted(*sink, instance)) {
+            append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, instance);
+        }
         ++sink->pathsTurnedIntoInstances;
         return okStatus();
     }
