@@ -10,7 +10,8 @@ namespace orv::linuxhost {
 LinuxBackend::LinuxBackend(LinuxRoots roots, std::string fileRoot, bool hypervisorKernel)
     : network_(roots.sys, std::make_shared<IoctlEthtoolChannel>(), std::make_shared<GenlEthtoolChannel>()),
       ksi_(roots),
-      version_(std::move(fileRoot), hypervisorKernel)
+      version_(std::move(fileRoot), hypervisorKernel),
+      health_(roots.sys, roots.dev)
 {
 }
 

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "canonical_name.hpp"
+#include "health/linux_health.hpp"
 #include "ethtool_channel.hpp"
 #include "ethtool_netlink_channel.hpp"
 #include "link_statistics.hpp"
@@ -71,12 +72,14 @@ public:
     orv::platform::KsiBackend& ksi() override { return ksi_; }
     orv::platform::VersionBackend& version() override { return version_; }
     orv::platform::HostBackend& host() override { return host_; }
+    orv::platform::HealthBackend* health() override { return &health_; }
 
 private:
     LinuxNetwork network_;
     LinuxKsi ksi_;
     LinuxVersion version_;
     LinuxHost host_;
+    LinuxHealth health_;
 };
 
 }  // namespace orv::linuxhost

@@ -1,0 +1,18 @@
+#include "linux_health.hpp"
+
+#include "sensor_elements.hpp"
+
+namespace orv::linuxhost {
+
+LinuxHealth::LinuxHealth(std::string sysRoot, std::string devRoot)
+    : sysRoot_(std::move(sysRoot)), devRoot_(std::move(devRoot))
+{
+}
+
+std::vector<orv::platform::HealthElement> LinuxHealth::elements(const std::string& watchedClass)
+{
+    if (watchedClass == "CIM_Sensor") return health::sensorElements(sysRoot_);
+    return {};
+}
+
+}  // namespace orv::linuxhost
