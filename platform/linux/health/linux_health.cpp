@@ -1,5 +1,6 @@
 #include "linux_health.hpp"
 
+#include "memory_elements.hpp"
 #include "sensor_elements.hpp"
 
 namespace orv::linuxhost {
@@ -12,6 +13,7 @@ LinuxHealth::LinuxHealth(std::string sysRoot, std::string devRoot)
 std::vector<orv::platform::HealthElement> LinuxHealth::elements(const std::string& watchedClass)
 {
     if (watchedClass == "CIM_Sensor") return health::sensorElements(sysRoot_);
+    if (watchedClass == "CIM_PhysicalMemory") return health::memoryElements(sysRoot_);
     return {};
 }
 
