@@ -1,6 +1,7 @@
 #include "linux_health.hpp"
 
 #include "memory_elements.hpp"
+#include "power_elements.hpp"
 #include "sensor_elements.hpp"
 
 namespace orv::linuxhost {
@@ -14,6 +15,8 @@ std::vector<orv::platform::HealthElement> LinuxHealth::elements(const std::strin
 {
     if (watchedClass == "CIM_Sensor") return health::sensorElements(sysRoot_);
     if (watchedClass == "CIM_PhysicalMemory") return health::memoryElements(sysRoot_);
+    if (watchedClass == "CIM_PowerSupply") return health::powerSupplyElements(sysRoot_);
+    if (watchedClass == "Orvane_Battery") return health::batteryElements(sysRoot_);
     return {};
 }
 
