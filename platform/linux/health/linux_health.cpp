@@ -1,5 +1,6 @@
 #include "linux_health.hpp"
 
+#include "controller_elements.hpp"
 #include "memory_elements.hpp"
 #include "power_elements.hpp"
 #include "sensor_elements.hpp"
@@ -17,6 +18,8 @@ std::vector<orv::platform::HealthElement> LinuxHealth::elements(const std::strin
     if (watchedClass == "CIM_PhysicalMemory") return health::memoryElements(sysRoot_);
     if (watchedClass == "CIM_PowerSupply") return health::powerSupplyElements(sysRoot_);
     if (watchedClass == "Orvane_Battery") return health::batteryElements(sysRoot_);
+    if (watchedClass == "Orvane_Controller") return health::storageControllerElements(sysRoot_);
+    if (watchedClass == "Orvane_PortController") return health::networkControllerElements(sysRoot_);
     return {};
 }
 
