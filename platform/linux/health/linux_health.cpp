@@ -2,6 +2,7 @@
 
 #include "controller_elements.hpp"
 #include "memory_elements.hpp"
+#include "port_elements.hpp"
 #include "power_elements.hpp"
 #include "sensor_elements.hpp"
 
@@ -20,6 +21,7 @@ std::vector<orv::platform::HealthElement> LinuxHealth::elements(const std::strin
     if (watchedClass == "Orvane_Battery") return health::batteryElements(sysRoot_);
     if (watchedClass == "Orvane_Controller") return health::storageControllerElements(sysRoot_);
     if (watchedClass == "Orvane_PortController") return health::networkControllerElements(sysRoot_);
+    if (watchedClass == "Orvane_SASSATAPort") return health::storagePortElements(sysRoot_);
     return {};
 }
 
