@@ -1,6 +1,7 @@
 #include "linux_health.hpp"
 
 #include "controller_elements.hpp"
+#include "md_elements.hpp"
 #include "memory_elements.hpp"
 #include "port_elements.hpp"
 #include "power_elements.hpp"
@@ -22,6 +23,9 @@ std::vector<orv::platform::HealthElement> LinuxHealth::elements(const std::strin
     if (watchedClass == "Orvane_Controller") return health::storageControllerElements(sysRoot_);
     if (watchedClass == "Orvane_PortController") return health::networkControllerElements(sysRoot_);
     if (watchedClass == "Orvane_SASSATAPort") return health::storagePortElements(sysRoot_);
+    if (watchedClass == "Orvane_StorageVolume") return health::volumeElements(sysRoot_);
+    if (watchedClass == "Orvane_StorageExtent") return health::extentElements(sysRoot_);
+    if (watchedClass == "Orvane_StoragePool") return health::poolElements(sysRoot_);
     return {};
 }
 
