@@ -1,6 +1,7 @@
 #include "linux_health.hpp"
 
 #include "controller_elements.hpp"
+#include "disk_elements.hpp"
 #include "md_elements.hpp"
 #include "memory_elements.hpp"
 #include "port_elements.hpp"
@@ -26,6 +27,10 @@ std::vector<orv::platform::HealthElement> LinuxHealth::elements(const std::strin
     if (watchedClass == "Orvane_StorageVolume") return health::volumeElements(sysRoot_);
     if (watchedClass == "Orvane_StorageExtent") return health::extentElements(sysRoot_);
     if (watchedClass == "Orvane_StoragePool") return health::poolElements(sysRoot_);
+    if (watchedClass == "Orvane_DiskDrive") {
+        health::DeviceSmartProbe probe(devRoot_);
+        return health::diskElements(sysRoot_, probe);
+    }
     return {};
 }
 
