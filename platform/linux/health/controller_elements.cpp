@@ -11,11 +11,8 @@ namespace {
 std::vector<orv::platform::HealthElement> elementsOf(const char* className, const std::string& sysRoot,
                                                      std::uint8_t baseClass)
 {
-    std::vector<orv::platform::HealthElement> elements;
-    for (const PciFunctionHealth& function : readPciFunctions(sysRoot, baseClass)) {
-        elements.push_back(controllerElement(className, function));
-    }
-    return elements;
+    return elementsFrom(readPciFunctions(sysRoot, baseClass),
+                        [className](const PciFunctionHealth& function) { return controllerElement(className, function); });
 }
 
 }  // namespace

@@ -37,9 +37,8 @@ orv::platform::HealthElement diskElement(const BlockDisk& disk, std::optional<st
 
 std::vector<orv::platform::HealthElement> diskElements(const std::string& sysRoot, SmartProbe& probe)
 {
-    std::vector<orv::platform::HealthElement> elements;
-    for (const BlockDisk& disk : readBlockDisks(sysRoot)) elements.push_back(diskElement(disk, diskHealth(disk, probe)));
-    return elements;
+    return elementsFrom(readBlockDisks(sysRoot),
+                        [&probe](const BlockDisk& disk) { return diskElement(disk, diskHealth(disk, probe)); });
 }
 
 }  // namespace orv::linuxhost::health

@@ -8,6 +8,7 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <vector>
 
 namespace orv::linuxhost::health {
 
@@ -28,6 +29,16 @@ template <typename T>
 void addIfKnown(orv::platform::HealthElement& element, const char* name, const std::optional<T>& value)
 {
     if (value) addProperty(element, name, *value);
+}
+
+// One element per item, in the items' order.
+template <typename Items, typename Make>
+std::vector<orv::platform::HealthElement> elementsFrom(const Items& items, Make make)
+{
+    std::vector<orv::platform::HealthElement> elements;
+    elements.reserve(items.size());
+    for (const auto& item : items) elements.push_back(make(item));
+    return elements;
 }
 
 }  // namespace orv::linuxhost::health

@@ -42,9 +42,7 @@ orv::platform::HealthElement memoryElement(const MemoryModule& module)
 
 std::vector<orv::platform::HealthElement> memoryElements(const std::string& sysRoot)
 {
-    std::vector<orv::platform::HealthElement> elements;
-    for (const MemoryModule& module : readMemoryModules(sysRoot)) elements.push_back(memoryElement(module));
-    return elements;
+    return elementsFrom(readMemoryModules(sysRoot), memoryElement);
 }
 
 }  // namespace orv::linuxhost::health

@@ -15,9 +15,8 @@ orv::platform::HealthElement storagePortElement(const StoragePort& port)
 
 std::vector<orv::platform::HealthElement> storagePortElements(const std::string& sysRoot)
 {
-    std::vector<orv::platform::HealthElement> elements;
-    for (const StoragePort& port : readSasPhys(sysRoot)) elements.push_back(storagePortElement(port));
-    for (const StoragePort& port : readAtaLinks(sysRoot)) elements.push_back(storagePortElement(port));
+    std::vector<orv::platform::HealthElement> elements = elementsFrom(readSasPhys(sysRoot), storagePortElement);
+    for (auto& element : elementsFrom(readAtaLinks(sysRoot), storagePortElement)) elements.push_back(std::move(element));
     return elements;
 }
 

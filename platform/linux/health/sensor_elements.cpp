@@ -76,9 +76,7 @@ orv::platform::HealthElement sensorElement(const HwmonSensor& sensor)
 
 std::vector<orv::platform::HealthElement> sensorElements(const std::string& sysRoot)
 {
-    std::vector<orv::platform::HealthElement> elements;
-    for (const HwmonSensor& sensor : readHwmonSensors(sysRoot)) elements.push_back(sensorElement(sensor));
-    return elements;
+    return elementsFrom(readHwmonSensors(sysRoot), sensorElement);
 }
 
 }  // namespace orv::linuxhost::health
