@@ -8,6 +8,8 @@
 
 #include <gtest/gtest.h>
 
+#include <thread>
+
 using namespace orv::linuxtest;
 using orv::linuxhost::LinuxHealth;
 
@@ -86,6 +88,29 @@ TEST(LinuxHealthBackend, EmptyMachineAnswersEveryClassWithNothing)
                                 "Orvane_StorageExtent", "Orvane_DiskDrive", "Orvane_SASSATAPort", "Orvane_StoragePool"}) {
         EXPECT_TRUE(health.elements(watched).empty()) << watched;
     }
+}
+
+TEST(LinuxHealthBackend, ConcurrentRequestsGetTheSameAnswers)
+{
+    SysfsTree tree;
+    buildServer(tree);
+    LinuxHealth health(tree.root(), tree.path("dev"));
+    const char* classes[] = {"CIM_Sensor", "Orvane_StorageExtent", "Orvane_DiskDrive", "Orvane_Battery"};
+    std::vector<std::size_t> expected;
+    for (const char* watched : classes) expected.push_back(health.elements(watched).size());
+    std::vector<std::thread> threads;
+    std::vector<int> mismatches(4, 0);
+    for (int t = 0; t < 4; ++t) {
+        threads.emplace_back([&, t] {
+            for (int round = 0; round < 20; ++round) {
+                for (std::size_t c = 0; c < 4; ++c) {
+                    if (health.elements(classes[c]).size() != expected[c]) ++mismatches[t];
+                }
+            }
+        });
+    }
+    for (auto& thread : threads) thread.join();
+    EXPECT_EQ(mismatches, std::vector<int>(4, 0));
 }
 
 TEST(DeviceSmartProbe, MissingNodeAndNodesThatAreNotDrivesGiveNoAnswers)
