@@ -12,6 +12,7 @@ namespace {
 
 constexpr std::uint8_t kAtaPassThrough16 = 0x85;
 constexpr std::uint8_t kAtaSmart = 0xB0;
+constexpr std::uint8_t kAtaCheckPowerMode = 0xE5;
 constexpr std::uint8_t kSmartLbaMid = 0x4F;
 constexpr std::uint8_t kSmartLbaHigh = 0xC2;
 constexpr std::uint8_t kFailingLbaMid = 0xF4;
@@ -19,6 +20,30 @@ constexpr std::uint8_t kFailingLbaHigh = 0x2C;
 constexpr std::uint8_t kAtaReturnDescriptor = 0x09;
 constexpr std::size_t kEntries = 30;
 constexpr std::size_t kEntrySize = 12;
+
+// The registers an ATA command returned in the sense data: from the ATA
+// Status Return descriptor (descriptor format) or the information and
+// command-specific fields (fixed format).
+struct AtaRegisters {
+    std::uint8_t count, lbaMid, lbaHigh;
+};
+
+std::optional<AtaRegisters> ataRegisters(const std::uint8_t* sense, std::size_t size)
+{
+    if (sense == nullptr || size < 12) return std::nullopt;
+    const std::uint8_t response = sense[0] & 0x7f;
+    if (response == 0x70 || response == 0x71) return AtaRegisters{sense[6], sense[10], sense[11]};
+    if (response != 0x72 && response != 0x73) return std::nullopt;
+    const std::size_t end = std::min<std::size_t>(size, 8 + static_cast<std::size_t>(sense[7]));
+    for (std::size_t at = 8; at + 2 <= end;) {
+        const std::size_t length = 2 + static_cast<std::size_t>(sense[at + 1]);
+        if (sense[at] == kAtaReturnDescriptor && length >= 14 && at + 14 <= end) {
+            return AtaRegisters{sense[at + 5], sense[at + 9], sense[at + 11]};
+        }
+        at += length;
+    }
+    return std::nullopt;
+}
 
 bool checksumOk(const std::vector<std::uint8_t>& sector)
 {
@@ -65,21 +90,28 @@ std::array<std::uint8_t, 16> ataSmartCommandBlock(SmartCommand command)
     return cdb;
 }
 
+std::array<std::uint8_t, 16> ataCheckPowerModeBlock()
+{
+    std::array<std::uint8_t, 16> cdb{};
+    cdb[0] = kAtaPassThrough16;
+    cdb[1] = 3 << 1;  // non-data
+    cdb[2] = 0x20;    // CK_COND
+    cdb[14] = kAtaCheckPowerMode;
+    return cdb;
+}
+
+std::optional<std::uint8_t> ataCountRegister(const std::uint8_t* sense, std::size_t size)
+{
+    std::optional<AtaRegisters> registers = ataRegisters(sense, size);
+    if (!registers) return std::nullopt;
+    return registers->count;
+}
+
 std::optional<bool> smartThresholdExceeded(const std::uint8_t* sense, std::size_t size)
 {
-    if (sense == nullptr || size < 12) return std::nullopt;
-    const std::uint8_t response = sense[0] & 0x7f;
-    if (response == 0x70 || response == 0x71) return verdict(sense[10], sense[11]);
-    if (response != 0x72 && response != 0x73) return std::nullopt;
-    const std::size_t end = std::min<std::size_t>(size, 8 + static_cast<std::size_t>(sense[7]));
-    for (std::size_t at = 8; at + 2 <= end;) {
-        const std::size_t length = 2 + static_cast<std::size_t>(sense[at + 1]);
-        if (sense[at] == kAtaReturnDescriptor && length >= 14 && at + 14 <= end) {
-            return verdict(sense[at + 9], sense[at + 11]);
-        }
-        at += length;
-    }
-    return std::nullopt;
+    std::optional<AtaRegisters> registers = ataRegisters(sense, size);
+    if (!registers) return std::nullopt;
+    return verdict(registers->lbaMid, registers->lbaHigh);
 }
 
 std::optional<std::vector<AtaAttribute>> parseSmartAttributes(const std::vector<std::uint8_t>& data,

@@ -20,6 +20,15 @@ enum class SmartCommand : std::uint8_t { ReadData = 0xD0, ReadThresholds = 0xD1,
 // ReturnStatus transfers nothing and asks for the registers back (CK_COND).
 std::array<std::uint8_t, 16> ataSmartCommandBlock(SmartCommand command);
 
+// CHECK POWER MODE as ATA PASS-THROUGH (16), non-data, registers returned: a
+// drive in standby answers it without spinning up.
+std::array<std::uint8_t, 16> ataCheckPowerModeBlock();
+// The COUNT register (7:0) in the sense data of a command that returned its
+// registers; for CHECK POWER MODE 00h means standby. Nothing when the sense
+// data carries no ATA registers.
+std::optional<std::uint8_t> ataCountRegister(const std::uint8_t* sense, std::size_t size);
+inline constexpr std::uint8_t kAtaPowerModeStandby = 0x00;
+
 // From the sense data of SMART RETURN STATUS: true when the drive reports a
 // threshold exceeded (LBA mid/high F4h/2Ch), false for 4Fh/C2h, nothing when
 // the sense data carries no ATA registers or other values.

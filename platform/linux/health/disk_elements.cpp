@@ -18,7 +18,7 @@ std::optional<std::uint16_t> diskHealth(const BlockDisk& disk, SmartProbe& probe
     }
     if (disk.bus == DiskBus::Ata) {
         std::optional<AtaSmartAnswers> answers = probe.ataSmart(disk.smartNode);
-        if (!answers) return std::nullopt;
+        if (!answers || answers->standby) return std::nullopt;
         return ataSmartHealth(smartThresholdExceeded(answers->statusSense.data(), answers->statusSense.size()),
                               parseSmartAttributes(answers->data, answers->thresholds));
     }

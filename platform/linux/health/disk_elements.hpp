@@ -13,7 +13,8 @@ namespace orv::linuxhost::health {
 inline constexpr const char* kDiskDriveClass = "Orvane_DiskDrive";
 
 // The disk's SMART health: NVMe from the health log, ATA from the status and
-// attributes; nothing for other buses or when the drive does not answer.
+// attributes; nothing for other buses, for an ATA drive in standby (not woken
+// for it), or when the drive does not answer.
 std::optional<std::uint16_t> diskHealth(const BlockDisk& disk, SmartProbe& probe);
 
 // DeviceID is the disk's identity; ElementName its model (else its name);

@@ -34,12 +34,11 @@ private:
     int fd_;
 };
 
-// One ATA PASS-THROUGH (16) SMART command; the data read (one sector for the
-// READ commands) and the sense data. False when the kernel refuses the call.
-bool passThrough(int fd, SmartCommand command, std::vector<std::uint8_t>& data, std::vector<std::uint8_t>& sense)
+// One ATA PASS-THROUGH (16) command; the data read (one sector when `reads`)
+// and the sense data. False when the kernel refuses the call.
+bool passThrough(int fd, std::array<std::uint8_t, 16> cdb, bool reads, std::vector<std::uint8_t>& data,
+                 std::vector<std::uint8_t>& sense)
 {
-    std::array<std::uint8_t, 16> cdb = ataSmartCommandBlock(command);
-    const bool reads = command != SmartCommand::ReturnStatus;
     data.assign(reads ? kAtaSectorSize : 0, 0);
     sense.assign(64, 0);
     sg_io_hdr_t io{};
@@ -91,11 +90,20 @@ std::optional<AtaSmartAnswers> DeviceSmartProbe::ataSmart(const std::string& nod
     if (device.get() < 0) return std::nullopt;
     AtaSmartAnswers answers;
     std::vector<std::uint8_t> none, sense;
-    if (!passThrough(device.get(), SmartCommand::ReturnStatus, none, answers.statusSense)) answers.statusSense.clear();
-    if (!passThrough(device.get(), SmartCommand::ReadData, answers.data, sense)) answers.data.clear();
-    if (!answers.data.empty() && !passThrough(device.get(), SmartCommand::ReadThresholds, answers.thresholds, sense)) {
-        answers.thresholds.clear();
+    if (passThrough(device.get(), ataCheckPowerModeBlock(), false, none, sense) &&
+        ataCountRegister(sense.data(), sense.size()) == kAtaPowerModeStandby) {
+        answers.standby = true;
+        return answers;
     }
+    auto ask = [&](SmartCommand command, std::vector<std::uint8_t>& data, std::vector<std::uint8_t>& senseOut) {
+        if (!passThrough(device.get(), ataSmartCommandBlock(command), command != SmartCommand::ReturnStatus, data, senseOut)) {
+            data.clear();
+            senseOut.clear();
+        }
+    };
+    ask(SmartCommand::ReturnStatus, none, answers.statusSense);
+    ask(SmartCommand::ReadData, answers.data, sense);
+    if (!answers.data.empty()) ask(SmartCommand::ReadThresholds, answers.thresholds, sense);
     return answers;
 }
 

@@ -11,6 +11,8 @@
 namespace orv::linuxhost::health {
 
 struct AtaSmartAnswers {
+    // The drive was in standby: it was not asked for SMART, so as not to spin it up.
+    bool standby = false;
     std::vector<std::uint8_t> statusSense;  // sense data of SMART RETURN STATUS; empty when refused
     std::vector<std::uint8_t> data, thresholds;  // the sectors; empty when refused
 };
@@ -21,8 +23,8 @@ public:
     // The SMART / Health log of the NVMe controller at <dev>/<node>; nothing
     // when the controller cannot be asked.
     virtual std::optional<std::vector<std::uint8_t>> nvmeHealthLog(const std::string& node) = 0;
-    // The SMART answers of the ATA disk at <dev>/<node>; nothing when it
-    // cannot be opened.
+    // The SMART answers of the ATA disk at <dev>/<node> (none asked of a
+    // drive in standby); nothing when it cannot be opened.
     virtual std::optional<AtaSmartAnswers> ataSmart(const std::string& node) = 0;
 };
 

@@ -135,7 +135,7 @@ TEST(BlockDisks, HealthyDrivesAreOk)
     buildMachine(tree);
     ScriptedProbe probe;
     probe.nvme["nvme0"] = nvmeLog(0);
-    probe.ata["sda"] = AtaSmartAnswers{statusSense(0x4F, 0xC2), {}, {}};
+    probe.ata["sda"] = AtaSmartAnswers{false, statusSense(0x4F, 0xC2), {}, {}};
     auto elements = diskElements(tree.root(), probe);
     EXPECT_EQ(healthOf(elements[0]), 5);
     EXPECT_EQ(healthOf(elements[1]), 5);
@@ -148,7 +148,7 @@ TEST(BlockDisks, FailingSmartStatusAndNvmeCriticalWarnings)
     buildMachine(tree);
     ScriptedProbe probe;
     probe.nvme["nvme0"] = nvmeLog(kNvmeReadOnly);
-    probe.ata["sda"] = AtaSmartAnswers{statusSense(0xF4, 0x2C), {}, {}};
+    probe.ata["sda"] = AtaSmartAnswers{false, statusSense(0xF4, 0x2C), {}, {}};
     auto elements = diskElements(tree.root(), probe);
     EXPECT_EQ(healthOf(elements[0]), 25);
     EXPECT_EQ(healthOf(elements[1]), 20);
@@ -165,6 +165,18 @@ TEST(BlockDisks, RefusedOrUnparsableAnswersLeaveTheHealthOut)
     auto elements = diskElements(tree.root(), probe);
     EXPECT_FALSE(elements[0].healthState);
     EXPECT_FALSE(elements[1].healthState);
+}
+
+TEST(BlockDisks, AtaDriveInStandbyIsNotJudged)
+{
+    SysfsTree tree;
+    buildMachine(tree);
+    ScriptedProbe probe;
+    AtaSmartAnswers standby;
+    standby.standby = true;
+    standby.statusSense = statusSense(0xF4, 0x2C);
+    probe.ata["sda"] = standby;
+    EXPECT_FALSE(diskElements(tree.root(), probe).at(1).healthState);
 }
 
 TEST(BlockDisks, NvmeNamespaceWithoutWwidIsKeyedByControllerSerialAndNamespace)

@@ -139,6 +139,25 @@ TEST(AtaReturnStatus, FixedFormatSense)
     EXPECT_EQ(smartThresholdExceeded(sense.data(), sense.size()), false);
 }
 
+TEST(AtaPowerMode, CheckPowerModeBlockAndCountRegister)
+{
+    auto cdb = ataCheckPowerModeBlock();
+    EXPECT_EQ(cdb[0], 0x85);
+    EXPECT_EQ(cdb[1], 0x06);
+    EXPECT_EQ(cdb[2], 0x20);
+    EXPECT_EQ(cdb[14], 0xE5);
+    auto sense = descriptorSense(0, 0);
+    sense[13] = 0xFF;  // COUNT (7:0): active or idle
+    EXPECT_EQ(ataCountRegister(sense.data(), sense.size()), 0xFF);
+    sense[13] = 0x00;
+    EXPECT_EQ(ataCountRegister(sense.data(), sense.size()), kAtaPowerModeStandby);
+    std::vector<std::uint8_t> fixed(18, 0);
+    fixed[0] = 0x70;
+    fixed[6] = 0x80;
+    EXPECT_EQ(ataCountRegister(fixed.data(), fixed.size()), 0x80);
+    EXPECT_EQ(ataCountRegister(nullptr, 0), std::nullopt);
+}
+
 TEST(AtaReturnStatus, NoRegistersNoVerdict)
 {
     std::vector<std::uint8_t> sense = {0x72, 0x05, 0x24, 0x00, 0, 0, 0, 0, 0, 0, 0, 0};
