@@ -9,9 +9,9 @@ namespace orv::linuxhost {
 
 LinuxBackend::LinuxBackend(LinuxRoots roots, std::string fileRoot, bool hypervisorKernel)
     : network_(roots.sys, std::make_shared<IoctlEthtoolChannel>(), std::make_shared<GenlEthtoolChannel>()),
+      health_(roots.sys, roots.dev),
       ksi_(roots),
-      version_(std::move(fileRoot), hypervisorKernel),
-      health_(roots.sys, roots.dev)
+      version_(std::move(fileRoot), hypervisorKernel)
 {
 }
 

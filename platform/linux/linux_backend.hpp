@@ -76,10 +76,10 @@ public:
 
 private:
     LinuxNetwork network_;
+    LinuxHealth health_;
     LinuxKsi ksi_;
     LinuxVersion version_;
     LinuxHost host_;
-    LinuxHealth health_;
 };
 
 }  // namespace orv::linuxhost
