@@ -70,27 +70,42 @@ std::optional<std::string> chipPath(const std::string& sysRoot, const std::strin
     return std::nullopt;
 }
 
-HwmonSensor readChannel(const std::string& dir, SensorKind kind, const std::string& channel)
+// The files of a chip's folder, so that only attributes the chip has are opened.
+using FileSet = std::set<std::string>;
+
+HwmonSensor readChannel(const std::string& dir, const FileSet& files, SensorKind kind, const std::string& channel)
 {
-    auto at = [&](const char* suffix) { return dir + "/" + channel + "_" + suffix; };
+    // The path of an attribute the chip has, else empty (reading "" fails at once).
+    auto at = [&](const char* suffix) {
+        const std::string name = channel + "_" + suffix;
+        return files.count(name) ? dir + "/" + name : std::string();
+    };
+    auto number = [&](const char* suffix) {
+        std::string path = at(suffix);
+        return path.empty() ? std::nullopt : readSignedNumber(path);
+    };
+    auto flag = [&](const char* suffix) {
+        std::string path = at(suffix);
+        return path.empty() ? std::nullopt : readFlag(path);
+    };
     HwmonSensor sensor;
     sensor.kind = kind;
     sensor.channel = channel;
-    sensor.label = readLine(at("label"));
-    sensor.input = readSignedNumber(at("input"));
-    if (!sensor.input && kind == SensorKind::Power) sensor.input = readSignedNumber(at("average"));
-    sensor.min = readSignedNumber(at("min"));
-    sensor.max = readSignedNumber(at("max"));
-    sensor.lcrit = readSignedNumber(at("lcrit"));
-    sensor.crit = readSignedNumber(at("crit"));
-    sensor.emergency = readSignedNumber(at("emergency"));
-    sensor.alarm = readFlag(at("alarm"));
-    sensor.minAlarm = readFlag(at("min_alarm"));
-    sensor.maxAlarm = readFlag(at("max_alarm"));
-    sensor.lcritAlarm = readFlag(at("lcrit_alarm"));
-    sensor.critAlarm = readFlag(at("crit_alarm"));
-    sensor.emergencyAlarm = readFlag(at("emergency_alarm"));
-    sensor.fault = readFlag(at("fault"));
+    if (std::string path = at("label"); !path.empty()) sensor.label = readLine(path);
+    sensor.input = number("input");
+    if (!sensor.input && kind == SensorKind::Power) sensor.input = number("average");
+    sensor.min = number("min");
+    sensor.max = number("max");
+    sensor.lcrit = number("lcrit");
+    sensor.crit = number("crit");
+    sensor.emergency = number("emergency");
+    sensor.alarm = flag("alarm");
+    sensor.minAlarm = flag("min_alarm");
+    sensor.maxAlarm = flag("max_alarm");
+    sensor.lcritAlarm = flag("lcrit_alarm");
+    sensor.critAlarm = flag("crit_alarm");
+    sensor.emergencyAlarm = flag("emergency_alarm");
+    sensor.fault = flag("fault");
     return sensor;
 }
 
@@ -98,15 +113,17 @@ void readChip(const std::string& dir, const std::string& chip, const std::string
               std::vector<HwmonSensor>& out)
 {
     std::map<SensorKind, std::set<std::string, bool (*)(const std::string&, const std::string&)>> channels;
+    FileSet files;
     for (const std::string& file : directoryEntries(dir)) {
         auto found = channelOf(file);
         if (!found) continue;
+        files.insert(file);
         channels.try_emplace(found->first, naturalLess).first->second.insert(found->second);
     }
     for (const auto& [kind, names] : channels) {
         for (const std::string& channel : names) {
-            if (readNumber(dir + "/" + channel + "_enable") == std::uint64_t{0}) continue;
-            HwmonSensor sensor = readChannel(dir, kind, channel);
+            if (files.count(channel + "_enable") && readNumber(dir + "/" + channel + "_enable") == std::uint64_t{0}) continue;
+            HwmonSensor sensor = readChannel(dir, files, kind, channel);
             sensor.chip = chip;
             sensor.chipName = chipName;
             out.push_back(std::move(sensor));
