@@ -10,6 +10,7 @@ namespace orv::linuxhost {
 LinuxBackend::LinuxBackend(LinuxRoots roots, std::string fileRoot, bool hypervisorKernel, bool ethtoolNetlink)
     : network_(roots.sys, std::make_shared<IoctlEthtoolChannel>(),
                ethtoolNetlink ? std::make_shared<GenlEthtoolChannel>() : nullptr),
+      health_(roots.sys, roots.dev),
       ksi_(roots),
       version_(std::move(fileRoot), hypervisorKernel)
 {

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "canonical_name.hpp"
+#include "health/linux_health.hpp"
 #include "ethtool_channel.hpp"
 #include "ethtool_netlink_channel.hpp"
 #include "kernel_release.hpp"
@@ -80,9 +81,11 @@ public:
     orv::platform::KsiBackend& ksi() override { return ksi_; }
     orv::platform::VersionBackend& version() override { return version_; }
     orv::platform::HostBackend& host() override { return host_; }
+    orv::platform::HealthBackend* health() override { return &health_; }
 
 private:
     LinuxNetwork network_;
+    LinuxHealth health_;
     LinuxKsi ksi_;
     LinuxVersion version_;
     LinuxHost host_;
