@@ -10,8 +10,9 @@ namespace orv::linuxhost {
 LinuxBackend::LinuxBackend(LinuxRoots roots, std::string fileRoot, bool hypervisorKernel)
     : network_(roots.sys, std::make_shared<IoctlEthtoolChannel>(), std::make_shared<GenlEthtoolChannel>()),
       ksi_(roots),
-      version_(std::move(fileRoot), hypervisorKernel)
+      version_(fileRoot, hypervisorKernel)
 {
+    host_.setFileRoot(std::move(fileRoot));
 }
 
 namespace {
