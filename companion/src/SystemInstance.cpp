@@ -81,7 +81,7 @@ std::string descriptionOf(const orv::platform::SystemIdentity& identity) {
 CmpiData stringArray(const std::vector<std::string>& items) {
     CmpiArray array(static_cast<CMPICount>(items.size()), CMPI_string);
     for (std::size_t i = 0; i < items.size(); ++i) {
-        array[static_cast<int>(i)] = CmpiData(items[i].c_str());
+        array[static_cast<int>(i)] = CmpiData(CmpiString(items[i].c_str()));
     }
     return CmpiData(array);
 }
