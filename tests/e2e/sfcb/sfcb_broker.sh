@@ -5,8 +5,9 @@
 #                                                          built there once with the sfcb build script
 #   sfcb_broker.sh start BUILD_DIR SOURCE_DIR RUN_DIR [FIXTURE]
 #                                                          copy the prefix to RUN_DIR/prefix (staging writes
-#                                                          into it), stage liborvprovider.so with the
-#                                                          library's own MOF files and registration file, and
+#                                                          into it), stage liborvprovider.so and the companion
+#                                                          library liborvhwhealth.so with their own MOF files
+#                                                          and registration files, and
 #                                                          start sfcbd on a free port (RUN_DIR/port) on the
 #                                                          simulated host FIXTURE (default: the shipped one),
 #                                                          with ORV_ROOT=$ORV_SFCB_ROOT when that is set
@@ -56,11 +57,12 @@ pristine_prefix() {
     echo "$base/prefix"
 }
 
-# The library's own class files: what orvprovider.mof includes, less the CIM parents (sfcb
-# brings the DMTF schema itself).
+# The libraries' own class files: what orvprovider.mof includes, less the CIM parents (sfcb
+# brings the DMTF schema itself), then the companion's classes.
 library_mof_files() {
     sed -n 's/^#pragma include *( *"\([^"]*\)" *).*/\1/p' "$src/cim/mof/orvprovider.mof" |
         grep -v '^cim/' | sed "s|^|$src/cim/mof/|"
+    echo "$src/companion/mof/orvhwhealth.mof"
 }
 
 free_port() {
@@ -82,11 +84,12 @@ start)
     [ -f "$run/prefix/log/sfcbd.pid" ] && "$scripts/sfcb-run.sh" stop "$run/prefix"
     rm -rf "$run"; mkdir -p "$run/providers"
     cp -a "$prefix" "$run/prefix"
-    cp "$build/lib/liborvprovider.so" "$run/providers/"
+    cp "$build/lib/liborvprovider.so" "$build/lib/liborvhwhealth.so" "$run/providers/"
+    cat "$src/cim/mof/orvprovider.reg" "$src/companion/mof/orvhwhealth.reg" > "$run/providers.reg"
     mapfile -t mofs < <(library_mof_files)
     port=$(free_port)
     SFCB_PORT=$port "$scripts/sfcb-run.sh" stage "$run/prefix" "$run/providers" \
-        "$src/cim/mof/orvprovider.reg" "${mofs[@]}" > "$run/stage.log" 2>&1 ||
+        "$run/providers.reg" "${mofs[@]}" > "$run/stage.log" 2>&1 ||
         { cat "$run/stage.log" >&2; exit 1; }
     ORV_PLATFORM=sim ORV_SIM_FIXTURE=$fixture ORV_ROOT=${ORV_SFCB_ROOT:-$src/tests/e2e/data/root} SFCB_PORT=$port \
         "$scripts/sfcb-run.sh" start "$run/prefix"
