@@ -4,20 +4,13 @@
 
 #include <stdexcept>
 
-#include "FixtureReader.h"
+#include "FixtureRejection.h"
 #include "SimHost.h"
 #include "orv/platform/HealthElements.h"
 #include "orv/platform/SystemIdentity.h"
 
 namespace orv::platform::test {
 namespace {
-
-std::string rejection(const Json& fixture)
-{
-    sim::FixtureResult result = sim::parseFixture(fixture.dump(), "host.json");
-    EXPECT_EQ(result.host, nullptr);
-    return result.error;
-}
 
 TEST(SimSystemIdentity, SectionGivesEveryValue)
 {
