@@ -5,6 +5,7 @@
 #include <algorithm>
 
 #include <cmpi/CmpiArray.h>
+#include <cmpi/CmpiStatus.h>
 
 namespace hwhealth {
 
@@ -53,6 +54,21 @@ struct ValueOf {
     CmpiData operator()(const std::vector<uint16_t>& v) const { return arrayOf(v); }
 };
 
+// A null HealthState is set as a NULL of the property's type: sfcb fails to
+// send an instance holding a value of type CMPI_null.
+void setHealthState(CmpiInstance& instance, std::optional<uint16_t> state) {
+    constexpr const char* kName = "HealthState";
+    if (state) {
+        instance.setProperty(kName, CmpiData(CMPIUint16(*state)));
+        return;
+    }
+    CMPIInstance* enc = instance.getEnc();
+    const CMPIStatus status = enc->ft->setProperty(enc, kName, nullptr, CMPI_uint16);
+    if (status.rc != CMPI_RC_OK) {
+        throw CmpiStatus(status);
+    }
+}
+
 }  // namespace
 
 CmpiData valueOf(const orv::platform::HealthPropertyValue& value) { return std::visit(ValueOf{}, value); }
@@ -90,7 +106,7 @@ CmpiInstance instanceOf(const CmpiObjectPath& path, const HealthElement& element
         instance.setProperty(key.name.c_str(), keyValue(key));
     }
     if (element.healthState) {
-        instance.setProperty("HealthState", *element.healthState ? CmpiData(CMPIUint16(**element.healthState)) : CmpiData());
+        setHealthState(instance, *element.healthState);
     }
     for (const orv::platform::HealthProperty& property : element.properties) {
         instance.setProperty(property.name.c_str(), valueOf(property.value));

@@ -121,6 +121,8 @@ TEST_F(HardwareElementsTest, HealthStateIsAbsentWhenTheHostGivesNoneAndNullWhenI
     const std::optional<NamedValue> state = propertyOf(reply.instances()[1], "HealthState");
     ASSERT_TRUE(state.has_value());
     EXPECT_EQ(state->text, "<null>");
+    // A NULL of the property's type: sfcb fails to send a value of type CMPI_null.
+    EXPECT_EQ(state->type, CMPI_uint16);
 }
 
 TEST_F(HardwareElementsTest, PropertyListKeepsTheKeysAndTheListedProperties) {
