@@ -24,19 +24,7 @@ using Json = nlohmann::ordered_json;
 
 std::string companionFile(const char* name) { return sourceDir() + "/companion/mof/" + name; }
 
-// The classes the companion's registration file names, in its order.
-std::vector<std::string> companionClasses() {
-    std::ifstream reg(companionFile("orvhwhealth.reg"));
-    const std::regex kSection("^\\[([A-Za-z0-9_]+)\\]");
-    std::vector<std::string> classes;
-    for (std::string line; std::getline(reg, line);) {
-        std::smatch match;
-        if (std::regex_search(line, match, kSection)) {
-            classes.push_back(match[1]);
-        }
-    }
-    return classes;
-}
+std::vector<std::string> companionClasses() { return registeredClasses(companionFile("orvhwhealth.reg")); }
 
 // Both libraries with their registrations and classes, and `more` arguments.
 std::vector<std::string> hostArgs(std::vector<std::string> more) {

@@ -12,7 +12,6 @@
 #include <algorithm>
 #include <filesystem>
 #include <fstream>
-#include <regex>
 
 #include "broker_answers.hpp"
 #include "two_broker_fixture.hpp"
@@ -54,21 +53,16 @@ Json healthSection() {
 
 // The companion's registered classes with their subclasses, as both brokers know them.
 std::vector<std::string> companionClasses(const orv::repository::ClassRepository& classes) {
-    std::ifstream reg(sourceDir() + "/companion/mof/orvhwhealth.reg");
-    const std::regex kSection("^\\[([A-Za-z0-9_]+)\\]");
     std::vector<std::string> out;
     auto add = [&out](const std::string& name) {
         if (std::find(out.begin(), out.end(), name) == out.end()) {
             out.push_back(name);
         }
     };
-    for (std::string line; std::getline(reg, line);) {
-        std::smatch match;
-        if (std::regex_search(line, match, kSection)) {
-            add(match[1]);
-            for (const std::string& sub : classes.subclasses("root/cimv2", match[1].str(), true)) {
-                add(sub);
-            }
+    for (const std::string& registered : registeredClasses(sourceDir() + "/companion/mof/orvhwhealth.reg")) {
+        add(registered);
+        for (const std::string& sub : classes.subclasses("root/cimv2", registered, true)) {
+            add(sub);
         }
     }
     return out;

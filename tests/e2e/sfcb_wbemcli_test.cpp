@@ -11,8 +11,6 @@
 // (the companion library's own tests cover them with elements).
 #include <gtest/gtest.h>
 
-#include <fstream>
-#include <regex>
 #include <set>
 
 #include "broker_answers.hpp"
@@ -41,7 +39,6 @@ ServedClasses servedClasses() {
     ServedClasses out;
     orv::repository::ClassRepository classes;
     loadServedClasses(classes);
-    const std::regex kSection("^\\[([A-Za-z0-9_]+)\\]");
     std::set<std::string> seen;
     auto add = [&](const std::string& name) {
         if (classes.getClass("root/cimv2", name) == nullptr || classes.isIndication("root/cimv2", name) ||
@@ -54,14 +51,10 @@ ServedClasses servedClasses() {
         }
     };
     for (const std::string& file : servedRegistrationFiles()) {
-        std::ifstream reg(file);
-        for (std::string line; std::getline(reg, line);) {
-            std::smatch match;
-            if (std::regex_search(line, match, kSection)) {
-                add(match[1]);
-                for (const std::string& sub : classes.subclasses("root/cimv2", match[1].str(), true)) {
-                    add(sub);
-                }
+        for (const std::string& registered : registeredClasses(file)) {
+            add(registered);
+            for (const std::string& sub : classes.subclasses("root/cimv2", registered, true)) {
+                add(sub);
             }
         }
     }
