@@ -39,6 +39,19 @@ function(orv_project_target target)
   endif()
 endfunction()
 
+# A provider library a broker loads: built into the provider folder, with no
+# undefined symbol left, and only its <Provider>_Create_<Kind>MI factories
+# global (a broker finds the providers by those names alone); every other
+# symbol is local, whatever the static libraries linked in would export.
+function(orv_provider_library target)
+  set(exports ${CMAKE_CURRENT_BINARY_DIR}/${target}.map)
+  file(WRITE ${exports} "{\n  global:\n    *_Create_*MI;\n  local:\n    *;\n};\n")
+  target_link_options(${target} PRIVATE -Wl,-z,defs -Wl,--version-script=${exports})
+  set_target_properties(${target} PROPERTIES
+    LINK_DEPENDS ${exports}
+    LIBRARY_OUTPUT_DIRECTORY ${ORV_PROVIDER_DIR})
+endfunction()
+
 # A GoogleTest suite registered with ctest. Usage:
 #   orv_add_gtest(name SOURCES a.cpp b.cpp LIBS lib1 lib2 [PROPERTIES LABELS x ...])
 # PROPERTIES are set on every discovered test.

@@ -143,6 +143,7 @@ public:
     bool fqdn(std::string& out) override { return inner_.fqdn(out); }
     bool hostName(std::string& out) override { return inner_.hostName(out); }
     int sysInfo(struct sysinfo& out) override { return inner_.sysInfo(out); }
+    orv::platform::SystemIdentity systemIdentity() override { return inner_.systemIdentity(); }
 
     int interfaceAddresses(ifaddrs*& list) override {
         ScriptedList& answer = (*lists_)[next_++ % lists_->size()];

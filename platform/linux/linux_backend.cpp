@@ -12,8 +12,9 @@ LinuxBackend::LinuxBackend(LinuxRoots roots, std::string fileRoot, bool hypervis
                ethtoolNetlink ? std::make_shared<GenlEthtoolChannel>() : nullptr),
       health_(roots.sys, roots.dev),
       ksi_(roots),
-      version_(std::move(fileRoot), hypervisorKernel)
+      version_(fileRoot, hypervisorKernel)
 {
+    host_.setFileRoot(std::move(fileRoot));
 }
 
 namespace {

@@ -56,14 +56,19 @@ class LinuxHost final : public orv::platform::HostBackend {
 public:
     explicit LinuxHost(CanonicalNameCache::Resolver resolver = resolveCanonicalName,
                        CanonicalNameCache::Timing timing = CanonicalNameCache::Timing{});
+    // The folder that stands for "/" when the firmware identity is read
+    // (empty: the machine's own).
+    void setFileRoot(std::string root) { fileRoot_ = std::move(root); }
     bool fqdn(std::string& out) override;
     bool hostName(std::string& out) override;
     int sysInfo(struct sysinfo& out) override;
     int interfaceAddresses(ifaddrs*& list) override;
     void freeInterfaceAddresses(ifaddrs* list) override;
+    orv::platform::SystemIdentity systemIdentity() override;
 
 private:
     CanonicalNameCache canonical_;
+    std::string fileRoot_;
 };
 
 void fillVersionRecord(const SystemVersion& version, TmkuserVersion_SystemVersionInfo& info);

@@ -1,5 +1,7 @@
 #include "linux_backend.hpp"
 
+#include "dmi_identity.hpp"
+
 #include <cerrno>
 #include <ifaddrs.h>
 #include <unistd.h>
@@ -42,5 +44,7 @@ void LinuxHost::freeInterfaceAddresses(ifaddrs* list)
 {
     if (list != nullptr) ::freeifaddrs(list);
 }
+
+orv::platform::SystemIdentity LinuxHost::systemIdentity() { return readDmiIdentity(fileRoot_); }
 
 }  // namespace orv::linuxhost

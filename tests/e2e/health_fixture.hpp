@@ -1,6 +1,6 @@
 // The simulated host of the end-to-end latched health tests: the shipped
 // example host with a "health" section of two elements of each of the twelve
-// watched classes, served by the health elements test provider, and with
+// watched classes, served by the companion library, and with
 // vif0's IPv4 address chosen by the test. Every write replaces the file in one
 // rename, so a running broker sees either the old host or the new one.
 #pragma once

@@ -1,5 +1,6 @@
 #include "host_process.hpp"
 
+
 #include <poll.h>
 #include <signal.h>
 #include <sys/wait.h>
@@ -9,6 +10,7 @@
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
+#include <fstream>
 #include <regex>
 #include <sstream>
 #include <thread>
@@ -149,6 +151,19 @@ std::string runCommand(const std::string& command) {
     }
     pclose(pipe);
     return output;
+}
+
+std::vector<std::string> registeredClasses(const std::string& registrationFile) {
+    std::ifstream reg(registrationFile);
+    const std::regex kSection("^\\[([A-Za-z0-9_]+)\\]");
+    std::vector<std::string> classes;
+    for (std::string line; std::getline(reg, line);) {
+        std::smatch match;
+        if (std::regex_search(line, match, kSection)) {
+            classes.push_back(match[1]);
+        }
+    }
+    return classes;
 }
 
 }  // namespace orv::e2e

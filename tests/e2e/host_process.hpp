@@ -41,6 +41,9 @@ private:
     std::string output_;
 };
 
+// The classes a provider registration file names (its "[Class]" sections), in its order.
+std::vector<std::string> registeredClasses(const std::string& registrationFile);
+
 // Runs a shell command; its standard output and error, in that order.
 std::string runCommand(const std::string& command);
 

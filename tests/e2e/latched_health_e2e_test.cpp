@@ -1,11 +1,10 @@
 // The latched health family end to end under orv-cimhost --preload: the
-// project's library and the health elements test provider on a simulated host
+// project's library and the companion library on a simulated host
 // whose fixture the test rewrites. Label slow: the latching waits two real
 // 120 s monitor periods, the IP change up to one 30 s check.
 #include <gtest/gtest.h>
 #include <signal.h>
 
-#include "health_elements_provider.hpp"
 #include "health_fixture.hpp"
 #include "ip_change_lines.hpp"
 #include "latched_health_scenario.hpp"
@@ -20,9 +19,7 @@ using listener::test::ListenerProcess;
 // With --preload the latched health provider, and with it both monitor threads,
 // starts with the host: the first pass runs before the first request.
 std::unique_ptr<HostProcess> startHost(const HealthFixture& fixture) {
-    std::vector<std::string> args = healthElementsHostArgs();
-    args.insert(args.end(), {"--preload", "--state-dir", fixture.folder() + "/state"});
-    return startOrvCimhost(fixture.path(), args);
+    return startOrvCimhost(fixture.path(), {"--preload", "--state-dir", fixture.folder() + "/state"});
 }
 
 TEST(LatchedHealthE2eTest, OrvCimhostLatchesEscalatesAndKeepsTheWorstStateOfEveryWatchedClassOverThreePasses) {

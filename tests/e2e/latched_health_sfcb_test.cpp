@@ -1,5 +1,5 @@
 // The latched health family end to end under the stock sfcb: a private sfcbd
-// serving the project's library and the health elements test provider (each
+// serving the project's library and the companion library (each
 // library in a provider process of its own) on a simulated host whose fixture
 // the test rewrites. sfcb loads the latched health provider, and so starts its
 // monitor threads, with the first request for one of its classes. Label slow:
@@ -7,7 +7,7 @@
 // 30 s check.
 #include <gtest/gtest.h>
 
-#include "health_elements_provider.hpp"
+#include "watched_classes_staging.hpp"
 #include "health_fixture.hpp"
 #include "ip_change_lines.hpp"
 #include "latched_health_scenario.hpp"
@@ -22,7 +22,7 @@ namespace {
 using listener::test::ListenerProcess;
 
 SfcbBroker startSfcb(const HealthFixture& fixture) {
-    return SfcbBroker::start(fixture.folder() + "/sfcb", fixture.path(), "", healthElementsStaging());
+    return SfcbBroker::start(fixture.folder() + "/sfcb", fixture.path(), "", watchedClassesStaging());
 }
 
 TEST(LatchedHealthSfcbTest, SfcbLatchesEscalatesAndKeepsTheWorstStateOfEveryWatchedClassOverThreePasses) {

@@ -1,16 +1,16 @@
 // The end-to-end wbemcli operations in both brokers: every class the provider
-// library serves (ein, ei, gi), every association from both ends (ai, ain, ri,
+// library and the companion library serve (ein, ei, gi), every association from both ends (ai, ain, ri,
 // rin) and the parent classes (ein, ei), on orv-cimhost and on the stock sfcb
 // serving the same simulated host. The answers must be the same after
 // normalising the documented broker conventions (broker_answers.hpp).
 //
 // The classes come from the registration file and the class repository, and
 // the objects from orv-cimhost's own enumerations, so a new provider's classes
-// join the suite without a change here.
+// join the suite without a change here. The shipped simulated host has no
+// hardware health elements: the watched hardware classes answer empty in both
+// (the companion library's own tests cover them with elements).
 #include <gtest/gtest.h>
 
-#include <fstream>
-#include <regex>
 #include <set>
 
 #include "broker_answers.hpp"
@@ -38,11 +38,8 @@ struct ServedClasses {
 ServedClasses servedClasses() {
     ServedClasses out;
     orv::repository::ClassRepository classes;
-    classes.loadFile(sourceDir() + "/cim/mof/orvprovider.mof");
-    std::ifstream reg(sourceDir() + "/cim/mof/orvprovider.reg");
-    const std::regex kSection("^\\[([A-Za-z0-9_]+)\\]");
+    loadServedClasses(classes);
     std::set<std::string> seen;
-    std::string line;
     auto add = [&](const std::string& name) {
         if (classes.getClass("root/cimv2", name) == nullptr || classes.isIndication("root/cimv2", name) ||
             !seen.insert(name).second) {
@@ -53,11 +50,10 @@ ServedClasses servedClasses() {
             out.associations.insert(name);
         }
     };
-    while (std::getline(reg, line)) {
-        std::smatch match;
-        if (std::regex_search(line, match, kSection)) {
-            add(match[1]);
-            for (const std::string& sub : classes.subclasses("root/cimv2", match[1].str(), true)) {
+    for (const std::string& file : servedRegistrationFiles()) {
+        for (const std::string& registered : registeredClasses(file)) {
+            add(registered);
+            for (const std::string& sub : classes.subclasses("root/cimv2", registered, true)) {
                 add(sub);
             }
         }
@@ -72,11 +68,22 @@ ServedClasses servedClasses() {
     return out;
 }
 
-// Classes that have no instance on the shipped simulated host: their instances are
-// latched health records, and neither broker serves the watched hardware classes
-// there, so nothing is ever latched. Both brokers are compared on their (empty)
-// enumerations; the cases that start from an instance have nothing to start from.
-const std::set<std::string> kWithoutInstances = {"Orvane_LatchedHealthState", "Orvane_LatchedHealthAssociation"};
+// Classes that have no instance on the shipped simulated host, which has no
+// "health" section: the watched hardware classes of the companion library, and
+// the latched health records, since nothing is ever latched there. Both
+// brokers are compared on their (empty) enumerations; the cases that start
+// from an instance have nothing to start from. (CIM_Processor has instances:
+// the project's processors.)
+const std::set<std::string> kWithoutInstances = {
+    "Orvane_LatchedHealthState", "Orvane_LatchedHealthAssociation",
+    "CIM_Sensor",                "CIM_NumericSensor",
+    "Orvane_NumericSensor",
+    "CIM_PhysicalMemory",        "Orvane_PhysicalMemory",
+    "CIM_PowerSupply",           "Orvane_PowerSupply",
+    "Orvane_PortController",     "Orvane_Controller",
+    "Orvane_Battery",            "Orvane_StorageVolume",
+    "Orvane_StorageExtent",      "Orvane_DiskDrive",
+    "Orvane_SASSATAPort",        "Orvane_StoragePool"};
 
 std::vector<SfcbCase> sfcbCases() {
     const ServedClasses classes = servedClasses();
@@ -160,6 +167,25 @@ TEST_P(SfcbWbemcliTest, SameAnswerInBothBrokers) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Sfcb, SfcbWbemcliTest, ::testing::ValuesIn(sfcbCases()), caseName);
+
+// The installed-software association leads from the hypervisor image to the
+// computer system, which the companion library serves, in both brokers.
+class SfcbComputerSystemTest : public TwoBrokerTest {};
+
+TEST_F(SfcbComputerSystemTest, AssociatorsFromTheHypervisorIdentityReturnTheComputerSystemInBothBrokers) {
+    const std::string identities = wbemcli(orvPort(), "ein", "Orvane_HypervisorSoftwareIdentity");
+    const std::size_t at = identities.find("root/cimv2:");
+    ASSERT_NE(at, std::string::npos) << identities;
+    const std::string identity = identities.substr(at + 11, identities.find('\n', at) - at - 11);
+    for (int port : {orvPort(), sfcbPort()}) {
+        const std::string answer = wbemcli(port, "ai -nl -ac Orvane_InstalledSoftwareIdentity", identity);
+        const std::vector<WbemcliObject> objects = parseWbemcliAnswer(answer);
+        ASSERT_EQ(objects.size(), 1U) << "port " << port << ":\n" << answer;
+        EXPECT_NE(objects[0].path.find("OMC_UnitaryComputerSystem"), std::string::npos) << answer;
+        EXPECT_NE(answer.find("-ElementName="), std::string::npos) << answer;
+    }
+    expectSameAnswer("ai -ac Orvane_InstalledSoftwareIdentity", identity);
+}
 
 }  // namespace
 }  // namespace orv::e2e

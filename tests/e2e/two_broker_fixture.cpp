@@ -21,14 +21,34 @@ std::string wbemcli(int port, const std::string& command, const std::string& obj
     return std::regex_replace(output, std::regex(where), "localhost:PORT");
 }
 
+std::vector<std::string> servedRegistrationFiles() {
+    return {sourceDir() + "/cim/mof/orvprovider.reg", sourceDir() + "/companion/mof/orvhwhealth.reg"};
+}
+
+std::vector<std::string> servedMofFiles() {
+    return {sourceDir() + "/cim/mof/orvprovider.mof", sourceDir() + "/companion/mof/orvhwhealth.mof"};
+}
+
+void loadServedClasses(orv::repository::ClassRepository& classes) {
+    for (const std::string& file : servedMofFiles()) {
+        classes.loadFile(file);
+    }
+}
+
 std::unique_ptr<HostProcess> startOrvCimhost(const std::string& fixture, const std::vector<std::string>& extraArgs) {
     char host[256] = {};
     gethostname(host, sizeof host - 1);
     setenv("ORV_ROOT", (sourceDir() + "/tests/e2e/data/root").c_str(), 1);
-    std::vector<std::string> args{
-        "--provider-dir", buildDir() + "/lib", "--registration", sourceDir() + "/cim/mof/orvprovider.reg", "--mof",
-        sourceDir() + "/cim/mof/orvprovider.mof", "--platform", "sim", "--fixture",
-        fixture.empty() ? sourceDir() + "/platform/sim/examples/host.json" : fixture, "--host-name", host};
+    std::vector<std::string> args{"--provider-dir", buildDir() + "/lib"};
+    for (const std::string& file : servedRegistrationFiles()) {
+        args.insert(args.end(), {"--registration", file});
+    }
+    for (const std::string& file : servedMofFiles()) {
+        args.insert(args.end(), {"--mof", file});
+    }
+    args.insert(args.end(), {"--platform", "sim", "--fixture",
+                             fixture.empty() ? sourceDir() + "/platform/sim/examples/host.json" : fixture,
+                             "--host-name", host});
     args.insert(args.end(), extraArgs.begin(), extraArgs.end());
     auto process = std::make_unique<HostProcess>(args);
     unsetenv("ORV_ROOT");
@@ -49,7 +69,7 @@ bool sfcbMissing(const SfcbBroker& sfcb) {
 void TwoBrokerTest::SetUpTestSuite() {
     sfcb_ = std::make_unique<SfcbBroker>(SfcbBroker::shared());
     classes_ = std::make_unique<orv::repository::ClassRepository>();
-    classes_->loadFile(sourceDir() + "/cim/mof/orvprovider.mof");
+    loadServedClasses(*classes_);
     orv_ = startOrvCimhost();
     ASSERT_TRUE(orv_->waitReady()) << orv_->output();
 }

@@ -28,7 +28,14 @@ namespace orv::e2e {
 std::string wbemcli(int port, const std::string& command, const std::string& object,
                     const std::string& nameSpace = "root/cimv2");
 
-// orv-cimhost serving the project's library as the shared sfcb does: the
+// The registration and MOF files of the libraries both brokers serve: the
+// project's library and the companion library (liborvhwhealth.so).
+std::vector<std::string> servedRegistrationFiles();
+std::vector<std::string> servedMofFiles();
+// Loads servedMofFiles() into `classes`.
+void loadServedClasses(orv::repository::ClassRepository& classes);
+
+// orv-cimhost serving the project's libraries as the shared sfcb does: the
 // shipped simulated host, the test alternate boot bank and this machine's
 // host name (sfcb names it in the paths of association answers); `extraArgs`
 // follow (more providers, --preload).

@@ -2,7 +2,7 @@
 // problem, and the platform calls then fail as the real libraries fail.
 #include <gtest/gtest.h>
 
-#include "FixtureReader.h"
+#include "FixtureRejection.h"
 #include "KsiHelpers.h"
 #include "SimHost.h"
 #include "tmkctl/network/NetworkInfoImpl.h"
@@ -10,13 +10,6 @@
 
 namespace orv::platform::test {
 namespace {
-
-std::string rejection(const Json& fixture)
-{
-    sim::FixtureResult result = sim::parseFixture(fixture.dump(), "host.json");
-    EXPECT_EQ(result.host, nullptr);
-    return result.error;
-}
 
 TEST(FixtureErrors, NotJsonNamesTheFile)
 {

@@ -1,6 +1,7 @@
 #include "FailingBackend.h"
 
 #include <cerrno>
+#include <stdexcept>
 
 #include "nodemgr/lib/NodeMgrException.h"
 
@@ -47,6 +48,7 @@ private:
         return -1;
     }
     void freeInterfaceAddresses(ifaddrs*) override {}
+    SystemIdentity systemIdentity() override { throw std::runtime_error(reason_); }
 
     std::string reason_;
 };

@@ -13,6 +13,8 @@ constexpr std::string_view kKnownCalls[] = {
     "KSI_ParamListGetParam", "KSI_ParamListGetInt32", "KSI_ParamGetString",
     // hardware health elements
     "OrvHealth_Elements",
+    // the machine's firmware identity
+    "OrvHost_GetSystemIdentity",
     // NIC library entry points
     "GetPnics", "GetPnicByName",
     // pnic operations, base first

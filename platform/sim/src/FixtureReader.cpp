@@ -46,6 +46,9 @@ std::shared_ptr<HostModel> readModel(const nlohmann::json& document)
     if (std::optional<JsonNode> health = root.optional("health")) {
         host->health = readHealth(*health);
     }
+    if (std::optional<JsonNode> system = root.optional("system")) {
+        host->system = readSystemIdentity(*system);
+    }
     if (std::optional<JsonNode> faults = root.optional("faults")) {
         host->faults = readFaults(*faults, host->statusCodes);
     }

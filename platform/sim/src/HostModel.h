@@ -12,6 +12,7 @@
 #include "FaultTable.h"
 #include "ksi/KsiRecords.h"
 #include "orv/platform/HealthElements.h"
+#include "orv/platform/SystemIdentity.h"
 #include "nodemgr/network/PnicRecords.h"
 #include "tmkuser/Version.h"
 
@@ -134,6 +135,7 @@ struct HostModel {
     std::optional<CpuModel> cpu;
     std::optional<VersionModel> version;
     std::vector<HealthElementModel> health;
+    std::optional<SystemIdentity> system;  // nullopt: the host tells no identity
     std::map<TmkuserStatus_Code, StatusText> statusCodes;
     FaultTable faults;
 };

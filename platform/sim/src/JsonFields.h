@@ -38,6 +38,7 @@ public:
     const std::string& path() const { return path_; }
     bool isNull() const { return value_->is_null(); }
     bool isString() const { return value_->is_string(); }
+    bool isBoolean() const { return value_->is_boolean(); }
     [[noreturn]] void fail(const std::string& problem) const;
 
     bool boolean() const;

@@ -18,6 +18,7 @@ VersionModel readVersion(const JsonNode& node, std::map<TmkuserStatus_Code, Stat
 // The "errno" and "message" of a version-service failure code.
 StatusText readStatusText(JsonObject& object);
 std::vector<HealthElementModel> readHealth(const JsonNode& node);
+SystemIdentity readSystemIdentity(const JsonNode& node);
 FaultTable readFaults(const JsonNode& node, std::map<TmkuserStatus_Code, StatusText>& codes);
 
 // Copies text into a fixed field, NUL-padded (the caller checked the length).

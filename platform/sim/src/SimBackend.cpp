@@ -195,6 +195,19 @@ public:
 
     void freeInterfaceAddresses(ifaddrs* list) override { freeInterfaceList(list); }
 
+    // An absent "system" section tells no value.
+    SystemIdentity systemIdentity() override
+    {
+        FixtureResult fixture = source_.current();
+        if (!fixture.host) {
+            throw std::runtime_error(fixture.error);
+        }
+        if (const FaultRule* rule = fireCall(*fixture.host, "OrvHost_GetSystemIdentity")) {
+            throw std::runtime_error(rule->message.empty() ? "system identity unavailable" : rule->message);
+        }
+        return fixture.host->system.value_or(SystemIdentity{});
+    }
+
 private:
     template <typename Pick>
     bool answer(std::string_view call, Pick pick, std::string& out)

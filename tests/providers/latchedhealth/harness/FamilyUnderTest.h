@@ -1,6 +1,6 @@
 // The latched health family's test build in a broker core, for tests and
 // benchmarks: the project's registrations of the family pointed at the test
-// build, the health elements test provider for the twelve watched classes, and
+// build, the companion library (liborvhwhealth.so) for the twelve watched classes, and
 // the test build's entry points (one pass or one IP check on a thread of the
 // caller's, the passes completed, the monitor threads running).
 #pragma once

@@ -17,6 +17,7 @@
 
 #include "ksi/Ksi.h"
 #include "orv/platform/HealthElements.h"
+#include "orv/platform/SystemIdentity.h"
 #include "nodemgr/network/Pnic.h"
 #include "orv/platform/backend/KsiParam.h"
 #include "tmkuser/Version.h"
@@ -86,6 +87,9 @@ public:
     // released by freeInterfaceAddresses of the same substitute.
     virtual int interfaceAddresses(ifaddrs*& list) = 0;
     virtual void freeInterfaceAddresses(ifaddrs* list) = 0;
+    // The firmware's identity of the machine; throws std::runtime_error when
+    // the host cannot be asked.
+    virtual SystemIdentity systemIdentity() = 0;
 };
 
 class HealthBackend {
