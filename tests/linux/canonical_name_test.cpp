@@ -21,6 +21,7 @@ public:
         return [this](const std::string& name) -> std::optional<std::string> {
             std::unique_lock<std::mutex> lock(mutex_);
             ++calls_;
+            called_.notify_all();
             released_.wait(lock, [&] { return open_; });
             if (unknown_) return std::nullopt;
             return name + ".example.org";
@@ -38,10 +39,17 @@ public:
         std::lock_guard<std::mutex> lock(mutex_);
         return calls_;
     }
+    // Waits (at most 10 s) until a lookup has reached the resolver.
+    bool waitForCall()
+    {
+        std::unique_lock<std::mutex> lock(mutex_);
+        return called_.wait_for(lock, std::chrono::seconds(10), [&] { return calls_ > 0; });
+    }
 
 private:
     std::mutex mutex_;
     std::condition_variable released_;
+    std::condition_variable called_;
     bool open_ = false;
     bool unknown_ = false;
     int calls_ = 0;
@@ -117,6 +125,10 @@ TEST(CanonicalName, StopsWhileALookupIsInFlight)
     {
         CanonicalNameCache cache(resolver.function(), {1ms, 300s});
         EXPECT_EQ(cache.nameFor("node5"), "node5");
+        // The cache is destroyed only once its lookup is in flight.
+        const bool inFlight = resolver.waitForCall();
+        if (!inFlight) resolver.release();  // so that the cache can end
+        ASSERT_TRUE(inFlight) << "no lookup reached the resolver";
         releaser = std::thread([&] {
             std::this_thread::sleep_for(20ms);
             resolver.release();
