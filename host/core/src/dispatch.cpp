@@ -126,6 +126,7 @@ Outcome CoreServices::callTargets(const std::vector<Target>& targets, ProviderKi
         CMPIStatus status{CMPI_RC_OK, nullptr};
         if (kind == ProviderKind::Instance) {
             sink.pathsAsInstances = request.op == Op::EnumerateInstances || request.op == Op::GetInstance;
+            sink.onInstance = sink.pathsAsInstances ? request.onInstance : nullptr;
             const unsigned turnedBefore = sink.pathsTurnedIntoInstances;
             status = callInstanceMI(mi, request, frame.ctx(), rslt, pathFor(request, target));
             if (sink.pathsTurnedIntoInstances != turnedBefore) {

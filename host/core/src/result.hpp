@@ -23,6 +23,9 @@ struct ResultSink {
     bool pathsAsInstances = false;
     // How many paths were turned into instances so.
     unsigned pathsTurnedIntoInstances = 0;
+    // Instance requests of a caller that takes each instance as it arrives: returned
+    // instances go here instead of into `items`.
+    const InstanceListener* onInstance = nullptr;
 };
 
 // A caller-owned result feeding `sink`; free it with disposeObject.
