@@ -132,6 +132,13 @@ std::string XmlWriter::take() {
     return result;
 }
 
+std::string XmlWriter::drain() {
+    std::string text;
+    text.swap(out_);
+    out_.reserve(text.capacity());
+    return text;
+}
+
 void XmlWriter::popName() {
     openNames_.resize(openStarts_.back());
     openStarts_.pop_back();

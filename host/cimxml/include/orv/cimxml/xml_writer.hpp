@@ -30,6 +30,9 @@ public:
     std::size_t depth() const noexcept { return openStarts_.size(); }
     const std::string& str() const noexcept { return out_; }
     std::string take();
+    // The text written so far, leaving the writer inside the same open elements: what
+    // follows continues the document (a response sent in pieces).
+    std::string drain();
 
 private:
     void finishStartTag();
