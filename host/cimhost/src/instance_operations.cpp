@@ -5,6 +5,7 @@
 #include "orv/cimxml/cim_status.hpp"
 #include "orv/cimxml/request_params.hpp"
 #include "result_writers.hpp"
+#include "streamed_response.hpp"
 
 namespace orv::cimhost::detail {
 
@@ -65,6 +66,22 @@ std::string requiredString(const cimxml::CimRequest& request, const char* name) 
     return *value;
 }
 
+// Each instance is written as the provider returns it and the document sent on in pieces;
+// the instance's own broker objects (property names read by the encoder) go with it.
+host::InstanceListener streamInstances(OperationContext& context, const cimxml::InstanceEncoding& encoding,
+                                       std::exception_ptr& failure) {
+    return [&context, &encoding, &failure](const CMPIInstance* instance) {
+        try {
+            host::ObjectScope scope;
+            writeNamedInstance(context, instance, encoding);
+            return context.streamed->sendIfLarge(context.out);
+        } catch (...) {
+            failure = std::current_exception();
+            return false;
+        }
+    };
+}
+
 }  // namespace
 
 void getInstance(OperationContext& context) {
@@ -93,13 +110,20 @@ void enumerateInstances(OperationContext& context) {
     const bool deep = cimxml::boolParam(request, "DeepInheritance", true);
     const std::string className = cimxml::classNameParam(request, "ClassName").value_or("");
     const repository::ClassDecl& cls = requireClass(context, className);
-    host::Reply reply = context.core.enumerateInstances(
-        classPath(context, cls.name),
-        callOptions(context, deep, flags.includeQualifiers, flags.includeClassOrigin,
-                    flags.propertyList));
-    throwIfFailed(reply);
     auto kept = deep ? flags.propertyList : shallowPropertyList(cls, flags.propertyList);
-    writeNamedInstances(context, reply, instanceEncoding(context, flags.includeClassOrigin, std::move(kept)));
+    const cimxml::InstanceEncoding encoding = instanceEncoding(context, flags.includeClassOrigin, std::move(kept));
+    host::CallOptions options =
+        callOptions(context, deep, flags.includeQualifiers, flags.includeClassOrigin, flags.propertyList);
+    std::exception_ptr failure;
+    if (context.streamed != nullptr) {
+        options.onInstance = streamInstances(context, encoding, failure);
+    }
+    host::Reply reply = context.core.enumerateInstances(classPath(context, cls.name), options);
+    if (failure) {
+        std::rethrow_exception(failure);
+    }
+    throwIfFailed(reply);
+    writeNamedInstances(context, reply, encoding);
 }
 
 void enumerateInstanceNames(OperationContext& context) {
