@@ -90,16 +90,37 @@ void getInstance(OperationContext& context) {
                                           "PropertyList"});
     const ReadFlags flags = readFlags(request);
     CMPIObjectPath* path = instancePath(context, cimxml::instanceNameParam(request, "InstanceName"));
-    host::Reply reply = context.core.getInstance(
-        path, callOptions(context, false, flags.includeQualifiers, flags.includeClassOrigin,
-                          flags.propertyList));
+    const cimxml::InstanceEncoding encoding = instanceEncoding(context, flags.includeClassOrigin, flags.propertyList);
+    host::CallOptions options =
+        callOptions(context, false, flags.includeQualifiers, flags.includeClassOrigin, flags.propertyList);
+    // The first instance the provider returns is the answer: encoded as it arrives (no
+    // copy kept), and used only once the provider has answered OK.
+    std::optional<std::string> answer;
+    std::exception_ptr failure;
+    options.onInstance = [&answer, &encoding, &failure](const CMPIInstance* instance) {
+        if (answer) {
+            return true;
+        }
+        try {
+            host::ObjectScope scope;
+            cimxml::XmlWriter text;
+            cimxml::writeInstance(text, instance, encoding);
+            answer = text.take();
+            return true;
+        } catch (...) {
+            failure = std::current_exception();
+            return false;
+        }
+    };
+    host::Reply reply = context.core.getInstance(path, options);
+    if (failure) {
+        std::rethrow_exception(failure);
+    }
     throwIfFailed(reply);
-    const auto instances = reply.instances();
-    if (instances.empty()) {
+    if (!answer) {
         throw CimError(CimStatus::NotFound, "no such instance");
     }
-    cimxml::writeInstance(context.out, instances.front(),
-                          instanceEncoding(context, flags.includeClassOrigin, flags.propertyList));
+    context.out.raw(*answer);
 }
 
 void enumerateInstances(OperationContext& context) {
