@@ -16,6 +16,13 @@ TEST(XmlWriter, EscapesMarkupAndControlCharacters) {
     EXPECT_EQ(out.take(), "<V A=\"&lt;&quot;&amp;&apos;&gt;\">a&#9;b</V>");
 }
 
+TEST(XmlWriter, KeepsPlainRunsAroundEscapedCharacters) {
+    XmlWriter out;
+    out.open("OUTER").open("V").attr("A", "x\ny\rz").text("plain <mid> end\x1f").close().leaf("L", "a&b").close();
+    EXPECT_EQ(out.take(), "<OUTER><V A=\"x&#10;y&#13;z\">plain &lt;mid&gt; end</V><L>a&amp;b</L></OUTER>");
+    EXPECT_EQ(out.depth(), 0U);
+}
+
 TEST(ResponseWriter, ErrorResponseCarriesCodeAndDescription) {
     const std::string doc = errorResponse("9", "GetInstance", true, 7, "not here");
     EXPECT_NE(doc.find("<IMETHODRESPONSE NAME=\"GetInstance\"><ERROR CODE=\"7\" DESCRIPTION=\"not here\"></ERROR>"),

@@ -13,6 +13,7 @@
 
 #include "golden_file.hpp"
 #include "host_process.hpp"
+#include "raw_connection.hpp"
 
 namespace orv::e2e {
 namespace {
@@ -122,6 +123,36 @@ TEST(CimHostLifecycle, RequestOverrunningTheProviderCallLimitAnswersCimErrFailed
     EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
     EXPECT_GT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(2900))
         << "the stop waited for the provider call still running";
+}
+
+TEST(CimHostLifecycle, OverrunAfterTheAnswerBeganClosesTheConnectionWithoutTheLastChunk) {
+    setenv("SLOW_PROVIDER_MS", "3000", 1);
+    setenv("SLOW_PROVIDER_INSTANCES", "100", 1);  // about 50 KB of answer before the provider waits
+    HostProcess host({"--provider-dir", buildDir() + "/lib", "--registration",
+                      sourceDir() + "/tests/e2e/data/slowhost.reg", "--mof",
+                      sourceDir() + "/tests/rawprovider/rawprovider.mof", "--provider-call-limit", "1"});
+    unsetenv("SLOW_PROVIDER_MS");
+    unsetenv("SLOW_PROVIDER_INSTANCES");
+    ASSERT_TRUE(host.waitReady()) << host.output();
+    const std::string enumerate =
+        "<?xml version=\"1.0\" encoding=\"utf-8\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
+        "<MESSAGE ID=\"4\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><IMETHODCALL NAME=\"EnumerateInstances\">"
+        "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/></LOCALNAMESPACEPATH>"
+        "<IPARAMVALUE NAME=\"ClassName\"><CLASSNAME NAME=\"Raw_Element\"/></IPARAMVALUE>"
+        "</IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
+    const auto start = std::chrono::steady_clock::now();
+    RawConnection connection(host.port());
+    ASSERT_TRUE(connection.send(cimPost(enumerate, "EnumerateInstances")));
+    // The head and the first pieces went out; the rest can never come: no complete answer,
+    // and the connection is closed when the limit runs out, not when the provider returns.
+    EXPECT_FALSE(connection.readResponse(std::chrono::milliseconds(2500)));
+    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(2500));
+    RawConnection next(host.port());
+    ASSERT_TRUE(next.send(cimPost(enumerateClassNamesBody(2), "EnumerateClassNames")));
+    auto answer = next.readResponse(std::chrono::seconds(10));
+    ASSERT_TRUE(answer);
+    EXPECT_EQ(answer->status, 200);
+    EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
 }
 
 TEST(CimHostLifecycle, BadMofFailsWithOneLine) {

@@ -47,6 +47,32 @@ std::string base64(const std::string& text) {
 }
 
 // Parses one complete response off the front of `data`; nullopt while it is incomplete.
+// A chunked body starting at `start`: the chunks joined, once the last chunk and the end of
+// the (empty) trailer have arrived; nullopt while some are missing.
+std::optional<RawResponse> takeChunkedBody(std::string& data, std::size_t start, RawResponse response) {
+    std::size_t at = start;
+    while (true) {
+        const std::size_t lineEnd = data.find("\r\n", at);
+        if (lineEnd == std::string::npos) {
+            return std::nullopt;
+        }
+        const std::size_t size = std::stoul(data.substr(at, lineEnd - at), nullptr, 16);
+        if (size == 0) {
+            if (data.compare(lineEnd + 2, 2, "\r\n") != 0) {
+                return std::nullopt;
+            }
+            response.chunked = true;
+            data.erase(0, lineEnd + 4);
+            return response;
+        }
+        if (data.size() < lineEnd + 2 + size + 2) {
+            return std::nullopt;
+        }
+        response.body.append(data, lineEnd + 2, size);
+        at = lineEnd + 2 + size + 2;
+    }
+}
+
 std::optional<RawResponse> takeResponse(std::string& data) {
     const std::size_t headEnd = data.find("\r\n\r\n");
     if (headEnd == std::string::npos || data.compare(0, 5, "HTTP/") != 0) {
@@ -66,6 +92,10 @@ std::optional<RawResponse> takeResponse(std::string& data) {
             response.headers[lowerCase(data.substr(line, colon - line))] = data.substr(value, end - value);
         }
         line = end + 2;
+    }
+    const auto coding = response.headers.find("transfer-encoding");
+    if (coding != response.headers.end() && coding->second == "chunked") {
+        return takeChunkedBody(data, headEnd + 4, std::move(response));
     }
     const auto length = response.headers.find("content-length");
     const std::size_t bodyLength = length == response.headers.end() ? 0 : std::stoul(length->second);

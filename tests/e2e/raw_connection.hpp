@@ -14,7 +14,8 @@ namespace orv::e2e {
 struct RawResponse {
     int status = 0;
     std::map<std::string, std::string> headers;  // names in lower case
-    std::string body;
+    std::string body;      // a chunked body joined
+    bool chunked = false;  // the body came with the chunked transfer coding
 };
 
 class RawConnection {

@@ -8,6 +8,7 @@
 #include "call_limiter.hpp"
 #include "operation_context.hpp"
 #include "operation_errors.hpp"
+#include "streamed_response.hpp"
 #include "orv/cimxml/cim_status.hpp"
 #include "orv/cimxml/response_writer.hpp"
 
@@ -66,10 +67,23 @@ CimDispatcher::~CimDispatcher() = default;
 void CimDispatcher::drain() { limiter_->drain(); }
 
 std::string CimDispatcher::respond(const cimxml::CimRequest& request, const std::string& principal) const {
-    std::optional<std::string> answer =
-        limiter_->run([this, request, principal] { return respondNow(request, principal); });
+    return respondWithin(request, principal, nullptr);
+}
+
+std::string CimDispatcher::respond(const cimxml::CimRequest& request, const std::string& principal,
+                                   http::ResponseStream& stream, const http::Response& head) const {
+    return respondWithin(request, principal, std::make_shared<detail::StreamedResponse>(stream, head));
+}
+
+std::string CimDispatcher::respondWithin(const cimxml::CimRequest& request, const std::string& principal,
+                                         const std::shared_ptr<detail::StreamedResponse>& streamed) const {
+    std::optional<std::string> answer = limiter_->run(
+        [this, request, principal, streamed] { return respondNow(request, principal, streamed.get()); });
     if (answer) {
         return std::move(*answer);
+    }
+    if (streamed && streamed->abandon()) {
+        return {};  // part of the answer went out: the connection closes without the rest
     }
     const auto limit = std::chrono::duration_cast<std::chrono::seconds>(limiter_->limit());
     return cimxml::errorResponse(request.messageId, request.methodName, request.intrinsic,
@@ -79,7 +93,8 @@ std::string CimDispatcher::respond(const cimxml::CimRequest& request, const std:
                                      " s; the provider call goes on in the background and its result is dropped");
 }
 
-std::string CimDispatcher::respondNow(const cimxml::CimRequest& request, const std::string& principal) const {
+std::string CimDispatcher::respondNow(const cimxml::CimRequest& request, const std::string& principal,
+                                      detail::StreamedResponse* streamed) const {
     const auto fail = [&request](int code, std::string_view description) {
         return cimxml::errorResponse(request.messageId, request.methodName, request.intrinsic, code, description);
     };
@@ -105,13 +120,28 @@ std::string CimDispatcher::respondNow(const cimxml::CimRequest& request, const s
     }
     try {
         host::ObjectScope scope;
-        detail::OperationContext context{core_, classes_, request, principal,
-                                         cimxml::PathDefaults{hostName_, request.nameSpace}, out, arrayNulls_};
+        detail::OperationContext context{core_,    classes_,    request, principal,
+                                         cimxml::PathDefaults{hostName_, request.nameSpace},
+                                         out,      arrayNulls_, streamed};
         handler(context);
     } catch (const CimError& error) {
+        if (streamed != nullptr && streamed->begun()) {
+            streamed->fail();  // too late for an ERROR element
+            return {};
+        }
         return fail(detail::answeredCode(operationName, error.code()), error.description());
+    } catch (...) {
+        if (streamed != nullptr) {
+            streamed->fail();
+        }
+        throw;
     }
-    return cimxml::finishResponse(out);
+    std::string rest = cimxml::finishResponse(out);
+    if (streamed != nullptr && streamed->begun()) {
+        streamed->sendRest(std::move(rest));
+        return {};
+    }
+    return rest;
 }
 
 }  // namespace orv::cimhost

@@ -59,6 +59,15 @@ http::Response success(std::string body) {
     return response;
 }
 
+// The answer, sent in pieces on the request's stream when the operation makes a large one
+// (the connection ignores what is returned then).
+std::string answer(const http::Request& request, const cimxml::CimRequest& cim, const CimDispatcher& dispatcher) {
+    if (request.stream == nullptr) {
+        return dispatcher.respond(cim, request.user);
+    }
+    return dispatcher.respond(cim, request.user, *request.stream, success({}));
+}
+
 }  // namespace
 
 std::string percentDecode(std::string_view text) {
@@ -98,7 +107,7 @@ http::Response handleCimRequest(const http::Request& request, const CimDispatche
     if (!request.headerIs("CIMMethod", cim.methodName) || !objectHeaderMatches(request, cim)) {
         return cimFailure(400, "header-mismatch");
     }
-    return success(dispatcher.respond(cim, request.user));
+    return success(answer(request, cim, dispatcher));
 }
 
 }  // namespace orv::cimhost

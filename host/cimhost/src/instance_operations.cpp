@@ -6,6 +6,7 @@
 #include "orv/cimxml/request_params.hpp"
 #include "orv/host/wql.hpp"
 #include "result_writers.hpp"
+#include "streamed_response.hpp"
 
 namespace orv::cimhost::detail {
 
@@ -80,6 +81,22 @@ std::string requiredString(const cimxml::CimRequest& request, const char* name) 
     return *value;
 }
 
+// Each instance is written as the provider returns it and the document sent on in pieces;
+// the instance's own broker objects (property names read by the encoder) go with it.
+host::InstanceListener streamInstances(OperationContext& context, const cimxml::InstanceEncoding& encoding,
+                                       std::exception_ptr& failure) {
+    return [&context, &encoding, &failure](const CMPIInstance* instance) {
+        try {
+            host::ObjectScope scope;
+            writeNamedInstance(context, instance, encoding);
+            return context.streamed->sendIfLarge(context.out);
+        } catch (...) {
+            failure = std::current_exception();
+            return false;
+        }
+    };
+}
+
 }  // namespace
 
 void getInstance(OperationContext& context) {
@@ -88,16 +105,37 @@ void getInstance(OperationContext& context) {
                                           "PropertyList"});
     const ReadFlags flags = readFlags(request);
     CMPIObjectPath* path = instancePath(context, cimxml::instanceNameParam(request, "InstanceName"));
-    host::Reply reply = context.core.getInstance(
-        path, callOptions(context, false, flags.includeQualifiers, flags.includeClassOrigin,
-                          flags.propertyList));
+    const cimxml::InstanceEncoding encoding = instanceEncoding(context, flags.includeClassOrigin, flags.propertyList);
+    host::CallOptions options =
+        callOptions(context, false, flags.includeQualifiers, flags.includeClassOrigin, flags.propertyList);
+    // The first instance the provider returns is the answer: encoded as it arrives (no
+    // copy kept), and used only once the provider has answered OK.
+    std::optional<std::string> answer;
+    std::exception_ptr failure;
+    options.onInstance = [&answer, &encoding, &failure](const CMPIInstance* instance) {
+        if (answer) {
+            return true;
+        }
+        try {
+            host::ObjectScope scope;
+            cimxml::XmlWriter text;
+            cimxml::writeInstance(text, instance, encoding);
+            answer = text.take();
+            return true;
+        } catch (...) {
+            failure = std::current_exception();
+            return false;
+        }
+    };
+    host::Reply reply = context.core.getInstance(path, options);
+    if (failure) {
+        std::rethrow_exception(failure);
+    }
     throwIfFailed(reply);
-    const auto instances = reply.instances();
-    if (instances.empty()) {
+    if (!answer) {
         throw CimError(CimStatus::NotFound, "no such instance");
     }
-    cimxml::writeInstance(context.out, instances.front(),
-                          instanceEncoding(context, flags.includeClassOrigin, flags.propertyList));
+    context.out.raw(*answer);
 }
 
 void enumerateInstances(OperationContext& context) {
@@ -108,13 +146,20 @@ void enumerateInstances(OperationContext& context) {
     const bool deep = cimxml::boolParam(request, "DeepInheritance", true);
     const std::string className = cimxml::classNameParam(request, "ClassName").value_or("");
     const repository::ClassDecl& cls = requireClass(context, className);
-    host::Reply reply = context.core.enumerateInstances(
-        classPath(context, cls.name),
-        callOptions(context, deep, flags.includeQualifiers, flags.includeClassOrigin,
-                    flags.propertyList));
-    throwIfFailed(reply);
     auto kept = deep ? flags.propertyList : shallowPropertyList(cls, flags.propertyList);
-    writeNamedInstances(context, reply, instanceEncoding(context, flags.includeClassOrigin, std::move(kept)));
+    const cimxml::InstanceEncoding encoding = instanceEncoding(context, flags.includeClassOrigin, std::move(kept));
+    host::CallOptions options =
+        callOptions(context, deep, flags.includeQualifiers, flags.includeClassOrigin, flags.propertyList);
+    std::exception_ptr failure;
+    if (context.streamed != nullptr) {
+        options.onInstance = streamInstances(context, encoding, failure);
+    }
+    host::Reply reply = context.core.enumerateInstances(classPath(context, cls.name), options);
+    if (failure) {
+        std::rethrow_exception(failure);
+    }
+    throwIfFailed(reply);
+    writeNamedInstances(context, reply, encoding);
 }
 
 void enumerateInstanceNames(OperationContext& context) {

@@ -13,6 +13,8 @@
 
 namespace orv::cimhost::detail {
 
+class StreamedResponse;
+
 struct OperationContext {
     host::BrokerCore& core;
     const repository::ClassRepository& classes;
@@ -21,6 +23,8 @@ struct OperationContext {
     cimxml::PathDefaults defaults;  // host and request namespace
     cimxml::XmlWriter& out;         // inside IRETURNVALUE (intrinsic) or METHODRESPONSE
     cimxml::ArrayNullElements arrayNulls;  // how NULL array elements are sent
+    // Set when the answer may go out in pieces while the operation runs.
+    StreamedResponse* streamed = nullptr;
 };
 
 using OperationHandler = void (*)(OperationContext& context);

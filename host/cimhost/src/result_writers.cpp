@@ -12,13 +12,18 @@ const CMPIObjectPath* pathOf(const CMPIInstance* instance) {
 
 }  // namespace
 
+void writeNamedInstance(OperationContext& context, const CMPIInstance* instance,
+                        const cimxml::InstanceEncoding& encoding) {
+    context.out.open("VALUE.NAMEDINSTANCE");
+    cimxml::writeInstanceName(context.out, pathOf(instance));
+    cimxml::writeInstance(context.out, instance, encoding);
+    context.out.close();
+}
+
 void writeNamedInstances(OperationContext& context, const host::Reply& reply,
                          const cimxml::InstanceEncoding& encoding) {
     for (const CMPIInstance* instance : reply.instances()) {
-        context.out.open("VALUE.NAMEDINSTANCE");
-        cimxml::writeInstanceName(context.out, pathOf(instance));
-        cimxml::writeInstance(context.out, instance, encoding);
-        context.out.close();
+        writeNamedInstance(context, instance, encoding);
     }
 }
 

@@ -5,6 +5,9 @@
 
 namespace orv::cimhost::detail {
 
+// VALUE.NAMEDINSTANCE (INSTANCENAME + INSTANCE) of one instance.
+void writeNamedInstance(OperationContext& context, const CMPIInstance* instance,
+                        const cimxml::InstanceEncoding& encoding);
 // VALUE.NAMEDINSTANCE (INSTANCENAME + INSTANCE) per returned instance.
 void writeNamedInstances(OperationContext& context, const host::Reply& reply,
                          const cimxml::InstanceEncoding& encoding);

@@ -10,12 +10,12 @@ namespace orv::cimxml {
 
 namespace {
 
-bool selected(const std::optional<std::vector<std::string>>& propertyList, const std::string& name) {
+bool selected(const std::optional<std::vector<std::string>>& propertyList, std::string_view name) {
     if (!propertyList) {
         return true;
     }
     for (const auto& wanted : *propertyList) {
-        if (strcasecmp(wanted.c_str(), name.c_str()) == 0) {
+        if (wanted.size() == name.size() && strncasecmp(wanted.data(), name.data(), name.size()) == 0) {
             return true;
         }
     }
@@ -24,10 +24,37 @@ bool selected(const std::optional<std::vector<std::string>>& propertyList, const
 
 struct PropertyHeader {
     const char* element;
-    std::string name;
+    std::string_view name;
     const std::optional<PropertyInfo>& info;
     bool includeClassOrigin;
 };
+
+// The declaration is needed only for what it adds to the property's start tag: the
+// reference class of a reference, the class origin when asked for.
+bool needsDeclaration(const InstanceEncoding& encoding, CMPIType type) {
+    return encoding.lookup && (encoding.includeClassOrigin || type == CMPI_ref);
+}
+
+std::string_view charsOf(const CMPIString* text) {
+    if (text == nullptr || text->ft == nullptr) {
+        return {};
+    }
+    const char* chars = text->ft->getCharPtr(text, nullptr);
+    return chars == nullptr ? std::string_view() : std::string_view(chars);
+}
+
+// A VALUE element for one item; false when the item has no text (NULL).
+bool writeItem(XmlWriter& out, const CMPIData& item) {
+    if (item.type == CMPI_string && !isNullData(item) && item.value.string != nullptr) {
+        out.leaf("VALUE", charsOf(item.value.string));  // the common case, without a copy
+        return true;
+    }
+    std::optional<std::string> text = itemText(item);
+    if (text) {
+        out.leaf("VALUE", *text);
+    }
+    return text.has_value();
+}
 
 void openProperty(XmlWriter& out, const PropertyHeader& header, CMPIType type) {
     out.open(header.element).attr("NAME", header.name);
@@ -76,9 +103,7 @@ void writeProperty(XmlWriter& out, const PropertyHeader& header, const CMPIData&
         return;
     }
     openProperty(out, header, data.type);
-    if (std::optional<std::string> text = itemText(data)) {
-        out.leaf("VALUE", *text);
-    }
+    writeItem(out, data);
     out.close();
 }
 
@@ -100,10 +125,7 @@ void writeValueArray(XmlWriter& out, const CMPIArray* array, ArrayNullElements n
     const CMPICount size = array->ft->getSize(array, nullptr);
     for (CMPICount i = 0; i < size; ++i) {
         const CMPIData item = array->ft->getElementAt(array, i, nullptr);
-        std::optional<std::string> text = itemText(item);
-        if (text) {
-            out.leaf("VALUE", *text);
-        } else if (nulls == ArrayNullElements::ValueNull) {
+        if (!writeItem(out, item) && nulls == ArrayNullElements::ValueNull) {
             out.open("VALUE.NULL").close();
         }
     }
@@ -117,12 +139,12 @@ void writeInstance(XmlWriter& out, const CMPIInstance* instance, const InstanceE
     for (CMPICount i = 0; i < count; ++i) {
         CMPIString* nameString = nullptr;
         const CMPIData data = instance->ft->getPropertyAt(instance, i, &nameString, nullptr);
-        const std::string name = cmpiString(nameString);
+        const std::string_view name = charsOf(nameString);
         if (!selected(encoding.propertyList, name)) {
             continue;
         }
         std::optional<PropertyInfo> info;
-        if (encoding.lookup) {
+        if (needsDeclaration(encoding, data.type)) {
             info = encoding.lookup(className, name);
         }
         writeProperty(out, PropertyHeader{"PROPERTY", name, info, encoding.includeClassOrigin}, data,

@@ -1,41 +1,66 @@
 #include "orv/cimxml/xml_writer.hpp"
 
-#include <cstdio>
+#include <array>
 #include <stdexcept>
 
 namespace orv::cimxml {
 
 namespace {
 
-void appendCharacterReference(std::string& out, unsigned char c) {
-    char buffer[8];
-    std::snprintf(buffer, sizeof buffer, "&#%u;", static_cast<unsigned>(c));
-    out += buffer;
+// What each byte becomes in text and attribute values: 0 copied as it is, 1 replaced by an
+// entity or character reference, 2 dropped.
+enum : unsigned char { kCopy = 0, kReplace = 1, kDrop = 2 };
+
+constexpr std::array<unsigned char, 256> escapeTable() {
+    std::array<unsigned char, 256> table{};
+    for (unsigned c = 0; c < 0x20; ++c) {
+        // Not representable in XML 1.0 even as a reference: dropped.
+        table[c] = kDrop;
+    }
+    for (unsigned char c : {'&', '<', '>', '"', '\'', '\t', '\n', '\r'}) {
+        table[c] = kReplace;
+    }
+    return table;
+}
+
+constexpr std::array<unsigned char, 256> kEscape = escapeTable();
+
+std::string_view replacement(char c) {
+    switch (c) {
+        case '&': return "&amp;";
+        case '<': return "&lt;";
+        case '>': return "&gt;";
+        case '"': return "&quot;";
+        case '\'': return "&apos;";
+        case '\t': return "&#9;";
+        case '\n': return "&#10;";
+        default: return "&#13;";
+    }
 }
 
 }  // namespace
 
+void appendEscapedXml(std::string& out, std::string_view text) {
+    const char* run = text.data();
+    const char* const end = run + text.size();
+    for (const char* p = run; p != end; ++p) {
+        const unsigned char kind = kEscape[static_cast<unsigned char>(*p)];
+        if (kind == kCopy) {
+            continue;
+        }
+        out.append(run, static_cast<std::size_t>(p - run));
+        if (kind == kReplace) {
+            out += replacement(*p);
+        }
+        run = p + 1;
+    }
+    out.append(run, static_cast<std::size_t>(end - run));
+}
+
 std::string escapeXml(std::string_view text) {
     std::string out;
     out.reserve(text.size());
-    for (char c : text) {
-        switch (c) {
-            case '&': out += "&amp;"; break;
-            case '<': out += "&lt;"; break;
-            case '>': out += "&gt;"; break;
-            case '"': out += "&quot;"; break;
-            case '\'': out += "&apos;"; break;
-            case '\t':
-            case '\n':
-            case '\r': appendCharacterReference(out, static_cast<unsigned char>(c)); break;
-            default:
-                if (static_cast<unsigned char>(c) < 0x20) {
-                    // Not representable in XML 1.0 even as a reference: drop it.
-                    break;
-                }
-                out += c;
-        }
-    }
+    appendEscapedXml(out, text);
     return out;
 }
 
@@ -43,7 +68,8 @@ XmlWriter& XmlWriter::open(std::string_view name) {
     finishStartTag();
     out_ += '<';
     out_ += name;
-    open_.emplace_back(name);
+    openStarts_.push_back(openNames_.size());
+    openNames_ += name;
     startTagPending_ = true;
     return *this;
 }
@@ -55,38 +81,39 @@ XmlWriter& XmlWriter::attr(std::string_view name, std::string_view value) {
     out_ += ' ';
     out_ += name;
     out_ += "=\"";
-    out_ += escapeXml(value);
+    appendEscapedXml(out_, value);
     out_ += '"';
     return *this;
 }
 
 XmlWriter& XmlWriter::text(std::string_view value) {
     finishStartTag();
-    out_ += escapeXml(value);
+    appendEscapedXml(out_, value);
     return *this;
 }
 
 XmlWriter& XmlWriter::close() {
-    if (open_.empty()) {
+    if (openStarts_.empty()) {
         throw std::logic_error("XmlWriter: close without an open element");
     }
     // Always an explicit end tag: some CIM-XML clients do not read empty-element tags.
     finishStartTag();
     out_ += "</";
-    out_ += open_.back();
+    out_.append(openNames_, openStarts_.back());
     out_ += '>';
-    open_.pop_back();
+    popName();
     return *this;
 }
 
 XmlWriter& XmlWriter::leaf(std::string_view name, std::string_view value) {
-    open(name);
     finishStartTag();
-    text(value);
+    out_ += '<';
+    out_ += name;
+    out_ += '>';
+    appendEscapedXml(out_, value);
     out_ += "</";
     out_ += name;
     out_ += '>';
-    open_.pop_back();
     return *this;
 }
 
@@ -99,9 +126,22 @@ XmlWriter& XmlWriter::raw(std::string_view markup) {
 std::string XmlWriter::take() {
     std::string result;
     result.swap(out_);
-    open_.clear();
+    openNames_.clear();
+    openStarts_.clear();
     startTagPending_ = false;
     return result;
+}
+
+std::string XmlWriter::drain() {
+    std::string text;
+    text.swap(out_);
+    out_.reserve(text.capacity());
+    return text;
+}
+
+void XmlWriter::popName() {
+    openNames_.resize(openStarts_.back());
+    openStarts_.pop_back();
 }
 
 void XmlWriter::finishStartTag() {

@@ -124,6 +124,7 @@ Reply send(detail::CoreServices& services, Request request, const CallOptions& o
     PropertyList properties(opts);
     request.properties = properties.get();
     request.caller = callerOf(opts);
+    request.onInstance = opts.onInstance ? &opts.onInstance : nullptr;
     if (request.op == Op::InvokeMethod) {
         ArenaGuard guard(state->arena);
         state->out = detail::newArgs(detail::Owner::Arena);

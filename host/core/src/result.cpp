@@ -42,6 +42,14 @@ void append(ResultSink& sink, ReturnedItem::Kind kind, CMPIType type, void* obje
     sink.items.push_back(item);
 }
 
+// An instance for a listening caller: handed on as it is, nothing kept.
+CMPIStatus forward(const ResultSink& sink, const CMPIInstance* instance) {
+    if (!(*sink.onInstance)(instance)) {
+        return status(CMPI_RC_ERR_FAILED, "the instance could not be sent: the request was given up");
+    }
+    return okStatus();
+}
+
 CMPIStatus returnData(const CMPIResult* result, const CMPIValue* value, CMPIType type) {
     ResultSink* sink = sinkOf(result);
     if (sink == nullptr) {
@@ -68,6 +76,9 @@ CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance
     if (instance == nullptr) {
         return status(CMPI_RC_ERR_INVALID_PARAMETER, "returnInstance with a NULL instance");
     }
+    if (sink->onInstance != nullptr && sink->query == nullptr && instanceImpl(instance) != nullptr) {
+        return forward(*sink, instance);
+    }
     ArenaGuard guard(*sink->out);
     CMPIInstance* copy = cloneInstance(instance, Owner::Arena);
     if (copy == nullptr) {
@@ -93,10 +104,13 @@ CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path
         if (instance == nullptr) {
             return status(CMPI_RC_ERR_INVALID_HANDLE, "returnObjectPath with an object that is not a live object path");
         }
+        ++sink->pathsTurnedIntoInstances;
+        if (sink->onInstance != nullptr && sink->query == nullptr) {
+            return forward(*sink, instance);
+        }
         if (admitted(*sink, instance)) {
             append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, instance);
         }
-        ++sink->pathsTurnedIntoInstances;
         return okStatus();
     }
     CMPIObjectPath* copy = cloneObjectPath(path, Owner::Arena);

@@ -1,12 +1,32 @@
 #include "string.hpp"
 
-#include <string>
+#include <cstring>
+#include <new>
 
 namespace orv::host::detail {
 
 namespace {
 
-using StringObject = Object<std::string>;
+// A string is one allocation: the object, then its NUL-terminated characters. The
+// characters cannot be freed apart from the shell, so a released string keeps them until
+// its arena is cleared, like the shell of any released object.
+struct StringObject : ObjectBase {
+    char* text() noexcept { return reinterpret_cast<char*>(this + 1); }
+
+    static void destroyFn(ObjectBase* base) noexcept {
+        auto* object = static_cast<StringObject*>(base);
+        object->~StringObject();
+        ::operator delete(object);
+    }
+    static void dropFn(ObjectBase* /*base*/) noexcept {}
+};
+
+StringObject* stringObject(const CMPIString* string) noexcept {
+    if (string == nullptr || string->ft != &kStringFT || string->hdl == nullptr) {
+        return nullptr;
+    }
+    return static_cast<StringObject*>(baseOf(string));
+}
 
 CMPIStatus release(CMPIString* string) { return releaseAny(string, &kStringFT); }
 
@@ -31,15 +51,24 @@ char* getCharPtr(const CMPIString* string, CMPIStatus* rc) {
 const CMPIStringFT kStringFT = {1, release, clone, getCharPtr};
 
 CMPIString* newString(std::string_view text, Owner owner) {
-    CMPIString* string = makeObject<CMPIString, std::string>(&kStringFT, owner, text);
-    auto* object = static_cast<StringObject*>(baseOf(string));
-    object->hdl = object->impl->data();
-    return string;
+    void* memory = ::operator new(sizeof(StringObject) + text.size() + 1);
+    auto* object = new (memory) StringObject();
+    char* chars = object->text();
+    if (!text.empty()) {
+        std::memcpy(chars, text.data(), text.size());
+    }
+    chars[text.size()] = '\0';
+    object->hdl = chars;
+    object->ft = &kStringFT;
+    object->destroy = &StringObject::destroyFn;
+    object->drop = &StringObject::dropFn;
+    placeObject(object, owner);
+    return reinterpret_cast<CMPIString*>(static_cast<ObjectBase*>(object));
 }
 
 const char* stringText(const CMPIString* string) noexcept {
-    StringObject* object = objectOf<std::string>(string, &kStringFT);
-    return object != nullptr ? object->impl->c_str() : nullptr;
+    StringObject* object = stringObject(string);
+    return object != nullptr ? object->text() : nullptr;
 }
 
 }  // namespace orv::host::detail

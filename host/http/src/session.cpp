@@ -54,6 +54,9 @@ Response callHandler(const Handler& handler, const Request& request) {
     try {
         return handler(request);
     } catch (...) {
+        if (request.stream != nullptr) {
+            request.stream->abort();  // a body already begun cannot be completed
+        }
         return status(500);
     }
 }
@@ -238,10 +241,20 @@ template <class Stream>
 void Session<Stream>::work() {
     state_ = State::Working;
     transport().expires_never();
+    std::shared_ptr<StreamChannel> channel = parser_->version() == 11 ? openStream() : nullptr;
+    request_.stream = channel.get();
     // The worker reads request_ while this connection waits; nothing else touches it.
-    asio::post(*context_.workers, [self = shared_from_this(), guard = asio::make_work_guard(context_.io)]() mutable {
+    asio::post(*context_.workers, [self = shared_from_this(), channel = std::move(channel),
+                                   guard = asio::make_work_guard(context_.io)]() mutable {
         Response response = callHandler(self->context_.handler, self->request_);
         asio::io_context& io = self->context_.io;
+        if (channel && channel->begun()) {
+            // The I/O thread writes what is left and the last chunk; this post keeps the
+            // connection alive until then (the channel's own wakes do not own it).
+            channel->end();
+            asio::post(io, [self = std::move(self), guard = std::move(guard)] { self->pumpStream(); });
+            return;
+        }
         // The session goes back to the I/O thread with the answer; it is never released here.
         asio::post(io, [self = std::move(self), guard = std::move(guard), response = std::move(response)]() mutable {
             self->finish(std::move(response));
@@ -251,6 +264,7 @@ void Session<Stream>::work() {
 
 template <class Stream>
 void Session<Stream>::finish(Response response) {
+    channel_.reset();  // the handler answered without streaming
     reply(std::move(response), keepAliveAfterThis());
 }
 
@@ -260,28 +274,138 @@ void Session<Stream>::refuse(int code) {
 }
 
 template <class Stream>
-void Session<Stream>::reply(Response response, bool keepAlive) {
+template <class Message>
+void Session<Stream>::prepareHead(Message& message, Response& response, bool keepAlive) {
     ++served_;
     if (context_.accessLog) {
         context_.accessLog(request_, response);
     }
-    response_ = {};
-    response_.version(parser_ && parser_->version() == 10 ? 10 : 11);
-    response_.result(static_cast<unsigned>(response.status));
+    message = {};
+    message.version(parser_ && parser_->version() == 10 ? 10 : 11);
+    message.result(static_cast<unsigned>(response.status));
     for (auto& [name, value] : response.headers) {
-        response_.insert(name, value);
+        message.insert(name, value);
     }
     if (!response.contentType.empty()) {
-        response_.set(beasthttp::field::content_type, response.contentType);
+        message.set(beasthttp::field::content_type, response.contentType);
     }
+    message.keep_alive(keepAlive);
+}
+
+template <class Stream>
+void Session<Stream>::reply(Response response, bool keepAlive) {
+    prepareHead(response_, response, keepAlive);
     response_.body() = std::move(response.body);
-    response_.keep_alive(keepAlive);
     response_.prepare_payload();
     state_ = State::Writing;
     transport().expires_after(context_.options.writeTimeout);
     beasthttp::async_write(stream_, response_, [self = shared_from_this(), keepAlive](error_code ec, std::size_t) {
         self->onWritten(ec, keepAlive);
     });
+}
+
+template <class Stream>
+std::shared_ptr<StreamChannel> Session<Stream>::openStream() {
+    // The producer's changes come back to the I/O thread; a wake that arrives after this
+    // body ended (or the connection went) finds another channel or none and does nothing.
+    std::weak_ptr<Session> weak = shared_from_this();
+    channel_ = std::make_shared<StreamChannel>(
+        context_.options.streamBufferBytes, [weak, &io = context_.io] {
+            asio::post(io, [weak] {
+                if (auto self = weak.lock()) {
+                    self->pumpStream();
+                }
+            });
+        });
+    return channel_;
+}
+
+template <class Stream>
+void Session<Stream>::pumpStream() {
+    if (!channel_ || chunkInFlight_) {
+        return;  // no body streamed now, or the write in flight pumps again when done
+    }
+    StreamChannel::Batch batch = channel_->take();
+    if (batch.aborted) {
+        streamFailed();
+        return;
+    }
+    if (batch.head) {
+        startStream(std::move(*batch.head), std::move(batch.data), batch.last);
+        return;
+    }
+    writeChunk(std::move(batch.data), batch.last);
+}
+
+template <class Stream>
+void Session<Stream>::startStream(Response head, std::string data, bool last) {
+    streamKeepAlive_ = keepAliveAfterThis();
+    prepareHead(streamHead_, head, streamKeepAlive_);
+    streamHead_.chunked(true);
+    headWriter_.emplace(streamHead_);
+    state_ = State::Writing;
+    chunkInFlight_ = true;
+    transport().expires_after(context_.options.writeTimeout);
+    beasthttp::async_write_header(stream_, *headWriter_,
+                                  [self = shared_from_this(), data = std::move(data), last](error_code ec,
+                                                                                           std::size_t) mutable {
+                                      self->chunkInFlight_ = false;
+                                      if (ec) {
+                                          self->streamFailed();
+                                          return;
+                                      }
+                                      self->writeChunk(std::move(data), last);
+                                  });
+}
+
+template <class Stream>
+void Session<Stream>::writeChunk(std::string data, bool last) {
+    if (data.empty()) {
+        if (last) {
+            writeLastChunk();
+        }
+        return;  // nothing yet: the producer's next piece wakes the pump
+    }
+    chunk_ = std::move(data);
+    chunkInFlight_ = true;
+    transport().expires_after(context_.options.writeTimeout);
+    asio::async_write(stream_, beasthttp::make_chunk(asio::buffer(chunk_)),
+                      [self = shared_from_this(), last](error_code ec, std::size_t) {
+                          self->chunkInFlight_ = false;
+                          self->chunk_.clear();
+                          if (ec) {
+                              self->streamFailed();
+                          } else if (last) {
+                              self->writeLastChunk();
+                          } else {
+                              self->pumpStream();
+                          }
+                      });
+}
+
+template <class Stream>
+void Session<Stream>::writeLastChunk() {
+    chunkInFlight_ = true;
+    transport().expires_after(context_.options.writeTimeout);
+    asio::async_write(stream_, beasthttp::make_chunk_last(), [self = shared_from_this()](error_code ec, std::size_t) {
+        self->chunkInFlight_ = false;
+        self->channel_.reset();
+        self->headWriter_.reset();
+        self->onWritten(ec, self->streamKeepAlive_);
+    });
+}
+
+// The client is gone or the body cannot be completed: the connection closes without the
+// last chunk, and the producer's further writes fail.
+template <class Stream>
+void Session<Stream>::streamFailed() {
+    if (channel_) {
+        channel_->close();
+        channel_.reset();
+    }
+    headWriter_.reset();
+    state_ = State::Closing;
+    transport().close();
 }
 
 template <class Stream>

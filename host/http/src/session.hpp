@@ -8,7 +8,9 @@
 #include <boost/asio/steady_timer.hpp>
 #include <boost/beast/core/flat_buffer.hpp>
 #include <boost/beast/core/tcp_stream.hpp>
+#include <boost/beast/http/empty_body.hpp>
 #include <boost/beast/http/message.hpp>
+#include <boost/beast/http/serializer.hpp>
 #include <boost/beast/http/string_body.hpp>
 #include <boost/beast/ssl/ssl_stream.hpp>
 
@@ -20,6 +22,7 @@
 
 #include "request_parser.hpp"
 #include "server_context.hpp"
+#include "stream_channel.hpp"
 
 namespace orv::http::detail {
 
@@ -75,7 +78,16 @@ private:
     void work();
     void finish(Response response);
     void refuse(int status);
+    template <class Message>
+    void prepareHead(Message& message, Response& response, bool keepAlive);
     void reply(Response response, bool keepAlive);
+    // A streamed body: the head, then one chunk per batch the handler's pieces make.
+    std::shared_ptr<StreamChannel> openStream();
+    void pumpStream();
+    void startStream(Response head, std::string data, bool last);
+    void writeChunk(std::string data, bool last);
+    void writeLastChunk();
+    void streamFailed();
     void onWritten(error_code ec, bool keepAlive);
     void closeGracefully();
     void drain();
@@ -86,6 +98,12 @@ private:
     Request request_;
     std::optional<RequestParser> parser_;
     boost::beast::http::response<boost::beast::http::string_body> response_;
+    std::shared_ptr<StreamChannel> channel_;  // the streamed body in progress, if any
+    boost::beast::http::response<boost::beast::http::empty_body> streamHead_;
+    std::optional<boost::beast::http::response_serializer<boost::beast::http::empty_body>> headWriter_;
+    std::string chunk_;
+    bool chunkInFlight_ = false;
+    bool streamKeepAlive_ = false;
     boost::asio::steady_timer delay_;
     std::array<char, 4096> scratch_{};
     std::size_t drained_ = 0;

@@ -9,12 +9,14 @@
 #include "orv/cimxml/object_encoder.hpp"
 #include "orv/cimxml/request.hpp"
 #include "orv/host/broker_core.hpp"
+#include "orv/http/http_server.hpp"
 #include "orv/repository/class_repository.hpp"
 
 namespace orv::cimhost {
 
 namespace detail {
 class CallLimiter;
+class StreamedResponse;
 }
 
 class CimDispatcher {
@@ -35,12 +37,20 @@ public:
     // A request that overruns the call limit is answered CIM_ERR_FAILED; its provider
     // call cannot be stopped and goes on in the background, its result dropped.
     std::string respond(const cimxml::CimRequest& request, const std::string& principal) const;
+    // The same, but a large answer (EnumerateInstances) may go out on `stream` in pieces
+    // while the providers run, with the status and headers of `head`: the document is
+    // then sent and the returned text is empty (see streamed_response.hpp).
+    std::string respond(const cimxml::CimRequest& request, const std::string& principal,
+                        http::ResponseStream& stream, const http::Response& head) const;
     // Waits for every provider call still running (overrunning ones included); the
     // host calls it after the server stopped and before the providers are cleaned up.
     void drain();
 
 private:
-    std::string respondNow(const cimxml::CimRequest& request, const std::string& principal) const;
+    std::string respondNow(const cimxml::CimRequest& request, const std::string& principal,
+                           detail::StreamedResponse* streamed) const;
+    std::string respondWithin(const cimxml::CimRequest& request, const std::string& principal,
+                              const std::shared_ptr<detail::StreamedResponse>& streamed) const;
 
     host::BrokerCore& core_;
     const repository::ClassRepository& classes_;

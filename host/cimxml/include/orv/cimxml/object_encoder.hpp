@@ -22,7 +22,9 @@ struct PropertyInfo {
     bool propagated = false;
 };
 
-// Declaration lookup: (class name, property name) -> info; nullopt when unknown.
+// Declaration lookup: (class name, property name) -> info; nullopt when unknown. The
+// instance encoder asks only where the answer shows in the start tag: for reference
+// properties (REFERENCECLASS) and when class origins are asked for.
 using PropertyLookup =
     std::function<std::optional<PropertyInfo>(std::string_view className, std::string_view property)>;
 

@@ -11,6 +11,8 @@ namespace orv::cimxml {
 // cannot carry (control characters other than tab, line feed and carriage return)
 // written as character references so that a parser rejects nothing we send.
 std::string escapeXml(std::string_view text);
+// The same, appended to `out`.
+void appendEscapedXml(std::string& out, std::string_view text);
 
 class XmlWriter {
 public:
@@ -25,15 +27,22 @@ public:
     // Markup that is already well formed, copied as it is.
     XmlWriter& raw(std::string_view markup);
 
-    std::size_t depth() const noexcept { return open_.size(); }
+    std::size_t depth() const noexcept { return openStarts_.size(); }
     const std::string& str() const noexcept { return out_; }
     std::string take();
+    // The text written so far, leaving the writer inside the same open elements: what
+    // follows continues the document (a response sent in pieces).
+    std::string drain();
 
 private:
     void finishStartTag();
+    void popName();
 
     std::string out_;
-    std::vector<std::string> open_;
+    // The names of the open elements, one after the other, and where each starts: no
+    // allocation per element once the writer has grown.
+    std::string openNames_;
+    std::vector<std::size_t> openStarts_;
     bool startTagPending_ = false;
 };
 

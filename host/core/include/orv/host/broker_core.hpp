@@ -56,6 +56,12 @@ struct CoreConfig {
     std::function<void(const std::string&)> warningSink;
 };
 
+// Receives an instance a provider returns, while the provider's returnInstance runs;
+// the instance is the provider's own and valid only during the call. Answering false
+// (the client is gone, say) makes returnInstance fail with CMPI_RC_ERR_FAILED, so the
+// provider can stop early. Must not throw: it runs inside the provider's call.
+using InstanceListener = std::function<bool(const CMPIInstance* instance)>;
+
 // Per-request settings that reach the provider through its context.
 struct CallOptions {
     std::string principal;            // CMPIPrincipal
@@ -65,6 +71,10 @@ struct CallOptions {
     // Property list handed to the provider; std::nullopt means "all properties"
     // (a NULL list), an empty vector means "no properties".
     std::optional<std::vector<std::string>> properties;
+    // EnumerateInstances and GetInstance: when set, every returned instance goes to
+    // it as it arrives instead of being copied into the Reply, so that a front end
+    // can send each one on while the provider builds the next.
+    InstanceListener onInstance;
 };
 
 // One thing a provider returned, in the order it arrived.

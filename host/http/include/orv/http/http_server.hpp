@@ -36,8 +36,30 @@ struct ServerOptions {
     std::chrono::seconds writeTimeout{30};
     std::chrono::seconds keepAliveTimeout{5};
     std::size_t keepAliveMaxRequests = 100;
+    std::size_t streamBufferBytes = 64U << 10U; // a streamed body's bytes waiting for the client
     std::optional<Credentials> credentials;   // basic authentication when set
     std::string realm = "orv-cimhost";
+};
+
+struct Response;
+
+// A response body sent while it is produced, with the chunked transfer coding. The handler
+// calls begin() with the status and headers (a body given there is the first piece), then
+// write() for each further piece, and returns; the server ends the body when the handler
+// has returned (what the handler returns is then not used). write() blocks while the
+// pieces waiting for the client pass the server's stream buffer, so a slow reader holds
+// the producer back instead of letting memory grow. begin() and write() answer false once
+// the client is gone (the connection closed or timed out) or after abort(): the handler
+// should stop then. abort() says the body cannot be completed: the connection closes
+// without the last chunk, so the client sees an incomplete answer, never a cut one taken
+// for whole. All three may be called from any one thread at a time.
+class ResponseStream {
+public:
+    virtual ~ResponseStream() = default;
+    virtual bool begin(Response head) = 0;
+    virtual bool write(std::string_view piece) = 0;
+    virtual void abort() = 0;
+    virtual bool begun() const = 0;
 };
 
 struct Request {
@@ -46,6 +68,8 @@ struct Request {
     std::vector<std::pair<std::string, std::string>> headers;
     std::string body;
     std::string user;  // the authenticated user, "" without authentication
+    // Set for HTTP/1.1 requests, whose answer the handler may stream; null for HTTP/1.0.
+    ResponseStream* stream = nullptr;
 
     // The first header of this name (any case), or nullptr.
     const std::string* header(std::string_view name) const noexcept;

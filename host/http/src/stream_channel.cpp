@@ -1,0 +1,89 @@
+#include "stream_channel.hpp"
+
+#include <utility>
+
+namespace orv::http::detail {
+
+StreamChannel::StreamChannel(std::size_t limit, std::function<void()> wake)
+    : limit_(limit == 0 ? 1 : limit), wake_(std::move(wake)) {}
+
+void StreamChannel::wakeLocked() {
+    if (!wakePending_) {
+        wakePending_ = true;
+        wake_();
+    }
+}
+
+bool StreamChannel::begin(Response head) {
+    std::lock_guard lock(mutex_);
+    if (begun_ || aborted_ || closed_) {
+        return false;
+    }
+    begun_ = true;
+    pending_ = std::move(head.body);
+    head.body.clear();
+    head_ = std::move(head);
+    wakeLocked();
+    return true;
+}
+
+bool StreamChannel::write(std::string_view piece) {
+    std::unique_lock lock(mutex_);
+    space_.wait(lock, [this] { return pending_.size() < limit_ || aborted_ || closed_; });
+    if (!begun_ || ended_ || aborted_ || closed_) {
+        return false;
+    }
+    pending_.append(piece);
+    wakeLocked();
+    return true;
+}
+
+void StreamChannel::abort() {
+    {
+        std::lock_guard lock(mutex_);
+        if (!begun_ || ended_ || aborted_) {
+            return;
+        }
+        aborted_ = true;
+        wakeLocked();
+    }
+    space_.notify_all();
+}
+
+bool StreamChannel::begun() const {
+    std::lock_guard lock(mutex_);
+    return begun_;
+}
+
+void StreamChannel::end() {
+    std::lock_guard lock(mutex_);
+    if (!begun_ || ended_ || aborted_) {
+        return;
+    }
+    ended_ = true;
+    wakeLocked();
+}
+
+StreamChannel::Batch StreamChannel::take() {
+    Batch batch;
+    {
+        std::lock_guard lock(mutex_);
+        wakePending_ = false;
+        batch.head = std::exchange(head_, std::nullopt);
+        batch.data.swap(pending_);
+        batch.aborted = aborted_;
+        batch.last = ended_ && !aborted_;
+    }
+    space_.notify_all();
+    return batch;
+}
+
+void StreamChannel::close() {
+    {
+        std::lock_guard lock(mutex_);
+        closed_ = true;
+    }
+    space_.notify_all();
+}
+
+}  // namespace orv::http::detail
