@@ -1,6 +1,6 @@
 // The latched health family end to end under orv-cimhost --preload: the
 // project's library and the companion library on a simulated host
-// whose fixture the test rewrites. Label slow: the latching waits two real
+// whose fixture the test rewrites. Label slow: the latching waits three real
 // 120 s monitor periods, the IP change up to one 30 s check.
 #include <gtest/gtest.h>
 #include <signal.h>
@@ -22,13 +22,13 @@ std::unique_ptr<HostProcess> startHost(const HealthFixture& fixture) {
     return startOrvCimhost(fixture.path(), {"--preload", "--state-dir", fixture.folder() + "/state"});
 }
 
-TEST(LatchedHealthE2eTest, OrvCimhostLatchesEscalatesAndKeepsTheWorstStateOfEveryWatchedClassOverThreePasses) {
+TEST(LatchedHealthE2eTest, OrvCimhostLatchesEscalatesAndKeepsTheWorstStateOfEveryWatchedClassOverFourPasses) {
     HealthFixture fixture("latched");
     fixture.write(5, 10);
     std::unique_ptr<HostProcess> host = startHost(fixture);
     ASSERT_TRUE(host->waitReady()) << host->output();
 
-    expectLatchingOverThreePasses(fixture, host->port(), [&] { return host->output(); });
+    expectLatchingOverFourPasses(fixture, host->port(), [&] { return host->output(); });
 
     EXPECT_EQ(host->stop(SIGTERM), 0) << host->output();
 }

@@ -15,6 +15,7 @@ namespace orv::e2e {
 namespace {
 
 using Clock = std::chrono::steady_clock;
+using Records = std::vector<LatchedRecord>;
 
 constexpr std::chrono::seconds kPeriod{120};
 // Room for a busy machine beyond the period: a start, a pass and the requests.
@@ -45,6 +46,12 @@ std::time_t secondsOf(const LatchedRecord& record) {
     return seconds.value_or(0);
 }
 
+// Where class k's records stand from the second pass on: the second
+// elements', latched by the first pass, then the first elements', appended by
+// the second.
+unsigned secondAt(unsigned k) { return k; }
+unsigned firstAt(unsigned k) { return kClasses + k; }
+
 LatchedRecord expected(unsigned eventId, unsigned watched, int healthState, const LatchedRecord& served) {
     return {eventId, kWatchedClasses[watched], "root/cimv2", healthState, served.timestamp};
 }
@@ -54,10 +61,38 @@ void expectAssociation(int port, unsigned eventId, unsigned watched, Element ele
         << "event " << eventId;
 }
 
-void expectServedOneByOne(int port, const std::vector<LatchedRecord>& records) {
-    for (const LatchedRecord& record : records) {
-        EXPECT_EQ(recordsIn(getLatched(port, record.eventId)), std::vector<LatchedRecord>{record});
+// Each record is served alone by its event number, and its association leads
+// to its own element and to nothing else.
+void expectServedOneByOne(int port, const Records& records) {
+    for (unsigned i = 0; i < records.size(); ++i) {
+        const LatchedRecord& record = records[i];
+        EXPECT_EQ(recordsIn(getLatched(port, record.eventId)), Records{record});
+        expectAssociation(port, record.eventId, i % kClasses, i < kClasses ? Element::Second : Element::First);
     }
+}
+
+// An escalation took the time of a later pass, at least a period after the
+// state it replaced, and the replaced number finds nothing any more.
+void expectEscalated(int port, const LatchedRecord& before, const LatchedRecord& escalated) {
+    EXPECT_GE(secondsOf(escalated) - secondsOf(before), kPeriod.count()) << before << " " << escalated;
+    EXPECT_NE(getLatched(port, before.eventId).find("failed to get instances"), std::string::npos)
+        << getLatched(port, before.eventId);
+    const std::vector<std::string> gone = associatedElements(port, before.eventId);
+    EXPECT_TRUE(gone.size() == 1 && gone[0].find("Requested event id not found") != std::string::npos)
+        << "event " << before.eventId << ": " << ::testing::PrintToString(gone);
+}
+
+// The third pass is the one after which every first element's record is failed.
+bool firstElementsFailed(const Records& records) {
+    if (records.size() != 2 * kClasses) {
+        return false;
+    }
+    for (unsigned k = 0; k < kClasses; ++k) {
+        if (records[firstAt(k)].healthState != kFailed) {
+            return false;
+        }
+    }
+    return true;
 }
 
 void logPass(int pass, Clock::time_point started) {
@@ -66,83 +101,95 @@ void logPass(int pass, Clock::time_point started) {
 }
 
 // The records once `passed` holds, read at once: the next pass is a period away.
-std::vector<LatchedRecord> recordsAfter(int pass, const std::function<bool()>& passed, std::chrono::seconds limit,
-                                        int port, const std::function<std::string()>& brokerLog) {
+Records recordsAfter(int pass, const std::function<bool()>& passed, std::chrono::seconds limit, int port,
+                     const std::function<std::string()>& brokerLog) {
     const bool seen = waitUntil(passed, limit, brokerLog);
-    const std::vector<LatchedRecord> records = latchedRecords(port);
+    const Records records = latchedRecords(port);
     EXPECT_TRUE(seen) << "pass " << pass << " not seen; the roll-up is " << rollUpHealthState(port).value_or(-1)
                       << ", " << records.size() << " records" << brokerLog();
     return records;
 }
 
 // Pass 1: the second elements latched at degraded in the monitor's order, the first (OK) ones not.
-void expectFirstPass(int port, const std::vector<LatchedRecord>& records, std::time_t started) {
+void expectFirstPass(int port, const Records& records, std::time_t started) {
     for (unsigned k = 0; k < kClasses; ++k) {
         EXPECT_EQ(records[k], expected(k, k, kDegraded, records[k]));
         EXPECT_LE(std::labs(secondsOf(records[k]) - started), 10) << records[k];
-        expectAssociation(port, k, k, Element::Second);
     }
     expectServedOneByOne(port, records);
     EXPECT_EQ(rollUpHealthState(port), kDegraded);
 }
 
-// Pass 2: each second element escalates to failed with a new event number in
-// place; each first element, now degraded, is appended. Per class the first
-// element is read first, so class k hands out 12 + 2k (new) and 13 + 2k (escalated).
-void expectSecondPass(int port, const std::vector<LatchedRecord>& before, const std::vector<LatchedRecord>& records) {
+// Pass 2 (recognised by its roll-up, failed): per class the first element is
+// read first, so class k hands out 12 + 2k to the first element, now degraded
+// and appended, then 13 + 2k to the second, escalated to failed in place.
+void expectSecondPass(int port, const Records& before, const Records& records) {
     for (unsigned k = 0; k < kClasses; ++k) {
-        const LatchedRecord& escalated = records[k];
-        const LatchedRecord& appended = records[kClasses + k];
+        const LatchedRecord& escalated = records[secondAt(k)];
+        const LatchedRecord& appended = records[firstAt(k)];
         EXPECT_EQ(escalated, expected(kClasses + 2 * k + 1, k, kFailed, escalated));
         EXPECT_EQ(appended, expected(kClasses + 2 * k, k, kDegraded, appended));
-        // The escalation takes the time of the pass, one period after the first.
-        EXPECT_GE(secondsOf(escalated) - secondsOf(before[k]), kPeriod.count()) << before[k] << " " << escalated;
-        expectAssociation(port, escalated.eventId, k, Element::Second);
-        expectAssociation(port, appended.eventId, k, Element::First);
-        // The replaced number finds nothing any more.
-        EXPECT_NE(getLatched(port, k).find("failed to get instances"), std::string::npos) << getLatched(port, k);
-        const std::vector<std::string> gone = associatedElements(port, k);
-        EXPECT_TRUE(gone.size() == 1 && gone[0].find("Requested event id not found") != std::string::npos)
-            << "event " << k << ": " << ::testing::PrintToString(gone);
+        expectEscalated(port, before[secondAt(k)], escalated);
+        // The new record takes the time of this pass too.
+        EXPECT_GE(secondsOf(appended) - secondsOf(before[secondAt(k)]), kPeriod.count()) << appended;
     }
     expectServedOneByOne(port, records);
 }
 
-// Pass 3: every element OK again; the roll-up dropped, the records stay as they were.
-void expectThirdPass(int port, const std::vector<LatchedRecord>& before, const std::vector<LatchedRecord>& records) {
-    EXPECT_EQ(records, before);
+// Pass 3: the second pass handed out 12 to 35, so class k's first element,
+// now failed, escalates in place to 36 + k; the second element reads degraded,
+// lower than its latched failed, which changes nothing. The roll-up stays failed.
+void expectThirdPass(int port, const Records& before, const Records& records) {
     for (unsigned k = 0; k < kClasses; ++k) {
-        expectAssociation(port, before[k].eventId, k, Element::Second);
-        expectAssociation(port, before[kClasses + k].eventId, k, Element::First);
+        const LatchedRecord& escalated = records[firstAt(k)];
+        EXPECT_EQ(escalated, expected(3 * kClasses + k, k, kFailed, escalated));
+        expectEscalated(port, before[firstAt(k)], escalated);
+        EXPECT_EQ(records[secondAt(k)], before[secondAt(k)]);
     }
+    expectServedOneByOne(port, records);
+    EXPECT_EQ(rollUpHealthState(port), kFailed);
+}
+
+// Pass 4 (recognised by its roll-up, OK): every element OK again; the roll-up
+// dropped, the records stay as they were.
+void expectFourthPass(int port, const Records& before, const Records& records) {
+    EXPECT_EQ(records, before);
+    expectServedOneByOne(port, records);
 }
 
 }  // namespace
 
-void expectLatchingOverThreePasses(const HealthFixture& fixture, int port,
-                                   const std::function<std::string()>& brokerLog) {
+void expectLatchingOverFourPasses(const HealthFixture& fixture, int port,
+                                  const std::function<std::string()>& brokerLog) {
     const auto started = Clock::now();
     const std::time_t startedAt = std::time(nullptr);
     // After each pass the host changes at once, before the checks, so that the
     // next pass, a period later, is sure to see the new states.
-    const std::vector<LatchedRecord> first = recordsAfter(
+    const Records first = recordsAfter(
         1, [&] { return latchedRecords(port).size() >= kClasses; }, kSlack, port, brokerLog);
     logPass(1, started);
     ASSERT_EQ(first.size(), kClasses) << brokerLog();
     fixture.write(kDegraded, kFailed);
     expectFirstPass(port, first, startedAt);
 
-    const std::vector<LatchedRecord> second = recordsAfter(
+    const Records second = recordsAfter(
         2, [&] { return rollUpHealthState(port) == kFailed; }, kPeriod + kSlack, port, brokerLog);
     logPass(2, started);
     ASSERT_EQ(second.size(), 2 * kClasses) << brokerLog();
-    fixture.write(kOk, kOk);
+    fixture.write(kFailed, kDegraded);
     expectSecondPass(port, first, second);
 
-    const std::vector<LatchedRecord> third = recordsAfter(
-        3, [&] { return rollUpHealthState(port) == kOk; }, kPeriod + kSlack, port, brokerLog);
+    const Records third = recordsAfter(
+        3, [&] { return firstElementsFailed(latchedRecords(port)); }, kPeriod + kSlack, port, brokerLog);
     logPass(3, started);
+    ASSERT_EQ(third.size(), 2 * kClasses) << brokerLog();
+    fixture.write(kOk, kOk);
     expectThirdPass(port, second, third);
+
+    const Records fourth = recordsAfter(
+        4, [&] { return rollUpHealthState(port) == kOk; }, kPeriod + kSlack, port, brokerLog);
+    logPass(4, started);
+    expectFourthPass(port, third, fourth);
 }
 
 }  // namespace orv::e2e

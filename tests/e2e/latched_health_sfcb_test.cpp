@@ -3,7 +3,7 @@
 // library in a provider process of its own) on a simulated host whose fixture
 // the test rewrites. sfcb loads the latched health provider, and so starts its
 // monitor threads, with the first request for one of its classes. Label slow:
-// the latching waits two real 120 s monitor periods, the IP change up to one
+// the latching waits three real 120 s monitor periods, the IP change up to one
 // 30 s check.
 #include <gtest/gtest.h>
 
@@ -25,7 +25,7 @@ SfcbBroker startSfcb(const HealthFixture& fixture) {
     return SfcbBroker::start(fixture.folder() + "/sfcb", fixture.path(), "", watchedClassesStaging());
 }
 
-TEST(LatchedHealthSfcbTest, SfcbLatchesEscalatesAndKeepsTheWorstStateOfEveryWatchedClassOverThreePasses) {
+TEST(LatchedHealthSfcbTest, SfcbLatchesEscalatesAndKeepsTheWorstStateOfEveryWatchedClassOverFourPasses) {
     HealthFixture fixture("sfcb-latched");
     fixture.write(5, 10);
     SfcbBroker sfcb = startSfcb(fixture);
@@ -33,7 +33,7 @@ TEST(LatchedHealthSfcbTest, SfcbLatchesEscalatesAndKeepsTheWorstStateOfEveryWatc
         GTEST_SKIP() << sfcb.reason();
     }
 
-    expectLatchingOverThreePasses(fixture, sfcb.port(), [&] { return "\n" + sfcb.syslog(); });
+    expectLatchingOverFourPasses(fixture, sfcb.port(), [&] { return "\n" + sfcb.syslog(); });
 
     EXPECT_EQ(sfcb.healthProblem(), "");
     EXPECT_EQ(sfcb.stop(), 0);
