@@ -9,13 +9,15 @@ PACKAGES=(
   # test and measurement tools
   libgtest-dev libgmock-dev googletest libbenchmark-dev valgrind
   # libraries the project links against
-  libboost-dev nlohmann-json3-dev libcpp-httplib-dev libssl-dev libexpat1-dev libmnl-dev
+  libboost-dev nlohmann-json3-dev libcpp-httplib-dev libssl-dev libexpat1-dev libmnl-dev libpam0g-dev
   # tools the end-to-end and Linux tests drive
   sblim-wbemcli ethtool iproute2 curl procps openssl
+  # the PAM login test's throwaway account (useradd, chpasswd, userdel)
+  passwd
   # the stock sfcb broker of the two-broker tests (label sfcb), built from source by
   # ../shared/sfcb/build.sh, and its run script (syslog collector, private mount namespace)
   autoconf automake libtool flex bison make gcc libcurl4-openssl-dev zlib1g-dev
-  libpam0g-dev python3 util-linux
+  python3 util-linux
 )
 
 SUDO=""

@@ -57,6 +57,9 @@ http::ServerOptions serverOptions(const HostConfig& config) {
     if (!config.credentialsFile.empty()) {
         options.credentials = http::Credentials::loadFile(config.credentialsFile);
     }
+    if (!config.pamService.empty()) {
+        options.pam.emplace(config.pamService);
+    }
     return options;
 }
 

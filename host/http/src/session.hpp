@@ -13,6 +13,7 @@
 #include <boost/beast/ssl/ssl_stream.hpp>
 
 #include <array>
+#include <chrono>
 #include <memory>
 #include <optional>
 #include <string>
@@ -60,7 +61,7 @@ public:
 private:
     using error_code = boost::beast::error_code;
     using std::enable_shared_from_this<Session<Stream>>::shared_from_this;
-    enum class State { Handshake, Idle, Head, Body, Working, Delaying, Writing, Closing };
+    enum class State { Handshake, Idle, Head, LoginCheck, Body, Working, Delaying, Writing, Closing };
     static constexpr bool kTls = std::is_same_v<Stream, TlsStream>;
 
     boost::beast::tcp_stream& transport() { return boost::beast::get_lowest_layer(stream_); }
@@ -68,8 +69,13 @@ private:
     void awaitRequest();
     void readHead();
     void onHead(error_code ec);
-    bool loginAccepted();
-    void refuseLogin();
+    void checkLogin();
+    void checkSystemLogin(std::string user, std::string password);
+    void loginSucceeded(std::string user);
+    void loginFailed(const std::string& claimedUser);
+    void challenge();
+    void answerLater(Response response, std::chrono::milliseconds delay);
+    void acceptBody();
     void readBody();
     void onBody(error_code ec);
     void work();

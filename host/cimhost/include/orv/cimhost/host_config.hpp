@@ -32,6 +32,7 @@ struct HostConfig {
     std::filesystem::path fixture;       // simulated host description (sim)
     LogLevel logLevel = LogLevel::Info;
     std::filesystem::path credentialsFile;  // basic authentication when set
+    std::string pamService;                 // basic authentication against the system's accounts when set
     std::size_t maxRequestBytes = 4U << 20U;
     std::chrono::seconds readTimeout{30};
     std::chrono::seconds writeTimeout{30};

@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "orv/http/credentials.hpp"
+#include "orv/http/pam_authentication.hpp"
 
 namespace orv::http {
 
@@ -36,7 +37,10 @@ struct ServerOptions {
     std::chrono::seconds writeTimeout{30};
     std::chrono::seconds keepAliveTimeout{5};
     std::size_t keepAliveMaxRequests = 100;
-    std::optional<Credentials> credentials;   // basic authentication when set
+    std::optional<Credentials> credentials;   // basic authentication against this list when set
+    // Basic authentication against the system's accounts when set (beside the list: a login
+    // either of them accepts is in); the check runs on a worker.
+    std::optional<PamAuthentication> pam;
     std::string realm = "orv-cimhost";
 };
 

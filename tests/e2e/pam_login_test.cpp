@@ -1,0 +1,155 @@
+// Basic authentication against the system's accounts through PAM: a throwaway account made
+// with useradd and a service of pam_unix written into /etc/pam.d for the suite, both removed
+// afterwards. Creating them needs root; as any other user the suite is skipped.
+#include <gtest/gtest.h>
+#include <signal.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <filesystem>
+#include <fstream>
+#include <thread>
+
+#include "host_process.hpp"
+#include "raw_connection.hpp"
+
+namespace orv::e2e {
+namespace {
+
+using namespace std::chrono_literals;
+using Clock = std::chrono::steady_clock;
+
+const std::string kAccount = "orvpam" + std::to_string(getpid());
+const std::string kPassword = "Pam-Test-9!";
+const std::string kService = "orv-cimhost-test-" + std::to_string(getpid());
+const std::filesystem::path kServiceFile = "/etc/pam.d/" + kService;
+
+// useradd and userdel take a lock on /etc/passwd that another process may hold for a moment.
+bool runWithRetries(const std::string& command) {
+    for (int attempt = 0; attempt < 20; ++attempt) {
+        if (std::system((command + " >/dev/null 2>&1").c_str()) == 0) {
+            return true;
+        }
+        std::this_thread::sleep_for(250ms);
+    }
+    return false;
+}
+
+void removeAccountAndService() {
+    runWithRetries("userdel " + kAccount);
+    std::error_code ignored;
+    std::filesystem::remove(kServiceFile, ignored);
+}
+
+class PamLoginTest : public ::testing::Test {
+protected:
+    static void SetUpTestSuite() {
+        if (geteuid() != 0) {
+            return;
+        }
+        std::ofstream(kServiceFile) << "auth required pam_unix.so\naccount required pam_unix.so\n";
+        ASSERT_TRUE(runWithRetries("useradd --no-create-home --shell /usr/sbin/nologin " + kAccount));
+        ASSERT_TRUE(runWithRetries("echo '" + kAccount + ":" + kPassword + "' | chpasswd"));
+        auto args = rawProviderArgs();
+        // A list user beside the system's accounts: either one lets a client in.
+        args.insert(args.end(), {"--pam-service", kService, "--credentials",
+                                 sourceDir() + "/tests/e2e/data/credentials", "--threads", "2"});
+        host_ = new HostProcess(args);
+        ASSERT_TRUE(host_->waitReady()) << host_->output();
+    }
+    static void TearDownTestSuite() {
+        if (host_ != nullptr) {
+            EXPECT_EQ(host_->stop(SIGTERM), 0);
+            delete host_;
+            host_ = nullptr;
+        }
+        if (geteuid() == 0) {
+            removeAccountAndService();
+        }
+    }
+    void SetUp() override {
+        if (geteuid() != 0) {
+            GTEST_SKIP() << "creating a system account and a PAM service needs root; run the suite as root";
+        }
+        ASSERT_NE(host_, nullptr);
+    }
+
+    static std::optional<RawResponse> login(const std::string& user, const std::string& password,
+                                            const std::string& source = "127.0.0.1") {
+        RawConnection client(host_->port(), source);
+        client.send(cimPost(enumerateClassNamesBody(), "EnumerateClassNames", basicAuthorizationLine(user, password)));
+        return client.readResponse(10000ms);
+    }
+
+    static HostProcess* host_;
+};
+
+HostProcess* PamLoginTest::host_ = nullptr;
+
+TEST_F(PamLoginTest, SystemAccountWithTheRightPasswordIsAnswered200) {
+    auto response = login(kAccount, kPassword);
+    ASSERT_TRUE(response);
+    EXPECT_EQ(response->status, 200);
+    EXPECT_NE(response->body.find("<IMETHODRESPONSE NAME=\"EnumerateClassNames\""), std::string::npos);
+}
+
+TEST_F(PamLoginTest, SystemAccountWithAWrongPasswordIsAnswered401) {
+    auto response = login(kAccount, "wrong", "127.0.0.21");
+    ASSERT_TRUE(response);
+    EXPECT_EQ(response->status, 401);
+    EXPECT_EQ(response->headers["www-authenticate"], "Basic realm=\"orv-cimhost\"");
+}
+
+TEST_F(PamLoginTest, UnknownUserIsAnswered401) {
+    auto response = login("orvnosuchuser", kPassword, "127.0.0.22");
+    ASSERT_TRUE(response);
+    EXPECT_EQ(response->status, 401);
+}
+
+TEST_F(PamLoginTest, UserOfTheCredentialsFileIsStillAccepted) {
+    auto response = login("user", "secret");
+    ASSERT_TRUE(response);
+    EXPECT_EQ(response->status, 200);
+}
+
+TEST_F(PamLoginTest, WrongSystemPasswordIsAnsweredWithoutTheModulesOwnDelay) {
+    // pam_unix asks for two seconds after a failure; the host's own delay per address
+    // replaces it, and the first failures of an address are not delayed.
+    const Clock::time_point start = Clock::now();
+    auto response = login(kAccount, "wrong", "127.0.0.23");
+    ASSERT_TRUE(response);
+    EXPECT_EQ(response->status, 401);
+    EXPECT_LT(Clock::now() - start, 1500ms);
+}
+
+TEST_F(PamLoginTest, FailedSystemLoginIsLoggedWithTheClientAddress) {
+    ASSERT_TRUE(login(kAccount, "wrong", "127.0.0.24"));
+    std::this_thread::sleep_for(100ms);
+    EXPECT_NE(host_->output().find("orv-cimhost: warning: failed login from 127.0.0.24 as user \"" + kAccount +
+                                   "\"\n"),
+              std::string::npos)
+        << host_->output();
+}
+
+TEST_F(PamLoginTest, RepeatedFailedSystemLoginsAreDelayed) {
+    for (int i = 0; i < 5; ++i) {
+        ASSERT_TRUE(login(kAccount, "wrong", "127.0.0.25"));
+    }
+    // The sixth failure in a row waits 400 ms before its 401.
+    const Clock::time_point start = Clock::now();
+    auto response = login(kAccount, "wrong", "127.0.0.25");
+    ASSERT_TRUE(response);
+    EXPECT_EQ(response->status, 401);
+    EXPECT_GE(Clock::now() - start, 350ms);
+}
+
+TEST(PamLoginStart, ServiceWithoutAFileStopsTheStartWithOneLine) {
+    auto args = rawProviderArgs();
+    args.insert(args.end(), {"--pam-service", "orv-no-such-service"});
+    HostProcess host(args);
+    EXPECT_EQ(host.waitExit(), 1);
+    EXPECT_EQ(host.output(), "orv-cimhost: cannot start: PAM service 'orv-no-such-service' has no file in /etc/pam.d\n");
+}
+
+}  // namespace
+}  // namespace orv::e2e
