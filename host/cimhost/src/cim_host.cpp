@@ -54,6 +54,7 @@ http::ServerOptions serverOptions(const HostConfig& config) {
     options.keepAliveTimeout = config.keepAliveTimeout;
     options.keepAliveMaxRequests = config.keepAliveMaxRequests;
     options.maxConnectionsPerClient = config.maxConnectionsPerClient;
+    options.serverName = "orv-cimhost/" ORV_VERSION;
     if (!config.credentialsFile.empty()) {
         options.credentials = http::Credentials::loadFile(config.credentialsFile);
     }

@@ -112,6 +112,10 @@ CommandLine parseCommandLine(int argc, const char* const* argv) {
             result.showHelp = true;
             continue;
         }
+        if (arg == "--version") {
+            result.showVersion = true;
+            continue;
+        }
         if (arg == "--preload") {
             options.emplace_back("preload", "true");  // a switch: the value may be left out
             continue;
@@ -158,8 +162,13 @@ std::string usageText() {
         left.resize(32, ' ');
         text += left + std::string(entry.help) + "  [key " + std::string(entry.key) + "]\n";
     }
+    text += "  --version                     the version\n";
     text += "  --help                        this text\n";
     return text;
+}
+
+std::string versionText() {
+    return std::string("orv-cimhost ") + ORV_VERSION;
 }
 
 }  // namespace orv::cimhost

@@ -316,6 +316,9 @@ void Session<Stream>::reply(Response response, bool keepAlive) {
     response_ = {};
     response_.version(parser_ && parser_->version() == 10 ? 10 : 11);
     response_.result(static_cast<unsigned>(response.status));
+    if (!context_.options.serverName.empty()) {
+        response_.set(beasthttp::field::server, context_.options.serverName);
+    }
     for (auto& [name, value] : response.headers) {
         response_.insert(name, value);
     }

@@ -77,11 +77,14 @@ void loadConfigFile(HostConfig& config, const std::filesystem::path& file);
 struct CommandLine {
     HostConfig config;
     bool showHelp = false;
+    bool showVersion = false;
 };
 // Defaults, then --config FILE, then the other options in order; throws ConfigError.
 CommandLine parseCommandLine(int argc, const char* const* argv);
 // The usage text listing every option and its configuration key.
 std::string usageText();
+// "orv-cimhost VERSION": the project's version, also sent in the Server header.
+std::string versionText();
 
 std::string_view logLevelName(LogLevel level) noexcept;
 

@@ -42,6 +42,7 @@ struct ServerOptions {
     // either of them accepts is in); the check runs on a worker.
     std::optional<PamAuthentication> pam;
     std::string realm = "orv-cimhost";
+    std::string serverName;  // the Server header of every response ("product/version"), if set
 };
 
 struct Request {
