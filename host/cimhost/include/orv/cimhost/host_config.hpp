@@ -63,8 +63,10 @@ public:
     using std::runtime_error::runtime_error;
 };
 
-// Defaults of a build tree: provider libraries from its lib folder, the project's
-// registration file and MOF from the source tree.
+// Defaults of a build tree when this program runs from one: provider libraries from its lib
+// folder, the project's registration file and MOF from the source tree. An installed program
+// takes them from where `cmake --install` put them: <libdir>/cmpi, <datadir>/orvprovider, and
+// keeps its state in <localstatedir>/lib/orv-cimhost.
 HostConfig defaultConfig();
 
 // Sets one key ("httpPort", "providerDirs", ...) from its text; relative paths are
