@@ -14,6 +14,9 @@ PACKAGES=(
   sblim-wbemcli ethtool iproute2 curl procps openssl
   # the PAM login test's throwaway account (useradd, chpasswd, userdel)
   passwd
+  # the Debian packages and their test (label package): build, lintian, the unit's check
+  # (systemd-analyze, which looks the unit's man page up with man)
+  debhelper dpkg-dev fakeroot lintian systemd man-db
   # the stock sfcb broker of the two-broker tests (label sfcb), built from source by
   # ../shared/sfcb/build.sh, and its run script (syslog collector, private mount namespace)
   autoconf automake libtool flex bison make gcc libcurl4-openssl-dev zlib1g-dev
