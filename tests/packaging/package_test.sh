@@ -105,7 +105,11 @@ grep -q 'Orvane_EthernetPort.*DeviceID="vmnic0"' <<<"$answer" || fail "wbemcli t
 
 echo "== unregistering"
 /usr/sbin/orv-sfcb-register --prefix "$sfcb_prefix" unregister
-grep -rq "Orvane_EthernetPort" "$sfcb_prefix/var/lib/sfcb/registration" && fail "the classes are still in sfcb's repository"
+# sfcbrepos keeps the previous repository beside the new one (*.previous): only the new counts.
+for file in registration/providerRegister registration/repository/root/cimv2/classSchemas; do
+    grep -q "Orvane_EthernetPort" "$sfcb_prefix/var/lib/sfcb/$file" && fail "Orvane_EthernetPort is still in $file"
+done
+[ -e "$sfcb_prefix/var/lib/sfcb/stage/mofs/root/cimv2/EthernetPort.mof" ] && fail "the class files are still staged"
 sfcb_prefix=""
 
 echo "== purging"
