@@ -313,7 +313,9 @@ void Session<Stream>::reply(Response response, bool keepAlive) {
     if (context_.accessLog) {
         context_.accessLog(request_, response);
     }
-    response_ = {};
+    // Named, not "= {}": clang 14 leaves the destructor of a temporary made from an empty
+    // braced list undefined inside an explicitly instantiated template (a link error).
+    response_ = ResponseMessage{};
     response_.version(parser_ && parser_->version() == 10 ? 10 : 11);
     response_.result(static_cast<unsigned>(response.status));
     if (!context_.options.serverName.empty()) {

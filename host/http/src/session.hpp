@@ -91,7 +91,8 @@ private:
     boost::beast::flat_buffer buffer_;
     Request request_;
     std::optional<RequestParser> parser_;
-    boost::beast::http::response<boost::beast::http::string_body> response_;
+    using ResponseMessage = boost::beast::http::response<boost::beast::http::string_body>;
+    ResponseMessage response_;
     boost::asio::steady_timer delay_;
     std::array<char, 4096> scratch_{};
     std::size_t drained_ = 0;
