@@ -19,7 +19,7 @@ orvprovider ($version) unstable; urgency=medium
 
   * Release $version.
 
- -- orvprovider developers <orvprovider@localhost>  $(date -R -d @"${SOURCE_DATE_EPOCH:-$(date +%s)}")
+ -- orvprovider developers <orvprovider-dev@orvane.example.org>  $(date -R -d @"${SOURCE_DATE_EPOCH:-$(date +%s)}")
 CHANGELOG
 # A compiler cache keeps its folder although debhelper gives the build a HOME of its own.
 if [ -n "${CMAKE_CXX_COMPILER_LAUNCHER:-}" ] && command -v ccache >/dev/null; then
