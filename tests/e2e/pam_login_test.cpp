@@ -5,10 +5,12 @@
 #include <signal.h>
 #include <unistd.h>
 
+#include <atomic>
 #include <chrono>
 #include <filesystem>
 #include <fstream>
 #include <thread>
+#include <vector>
 
 #include "host_process.hpp"
 #include "raw_connection.hpp"
@@ -35,6 +37,11 @@ bool runWithRetries(const std::string& command) {
     return false;
 }
 
+bool createAccount() {
+    return runWithRetries("useradd --no-create-home --shell /usr/sbin/nologin " + kAccount) &&
+           runWithRetries("echo '" + kAccount + ":" + kPassword + "' | chpasswd");
+}
+
 void removeAccountAndService() {
     runWithRetries("userdel " + kAccount);
     std::error_code ignored;
@@ -48,8 +55,7 @@ protected:
             return;
         }
         std::ofstream(kServiceFile) << "auth required pam_unix.so\naccount required pam_unix.so\n";
-        ASSERT_TRUE(runWithRetries("useradd --no-create-home --shell /usr/sbin/nologin " + kAccount));
-        ASSERT_TRUE(runWithRetries("echo '" + kAccount + ":" + kPassword + "' | chpasswd"));
+        ASSERT_TRUE(createAccount());
         auto args = rawProviderArgs();
         // A list user beside the system's accounts: either one lets a client in.
         args.insert(args.end(), {"--pam-service", kService, "--credentials",
@@ -141,6 +147,76 @@ TEST_F(PamLoginTest, RepeatedFailedSystemLoginsAreDelayed) {
     }
     // The sixth failure in a row waits 400 ms before its 401.
     EXPECT_GE(timedWrongLogin("127.0.0.25"), 350ms);
+}
+
+// A service whose auth step takes two seconds (pam_exec running sleep) before pam_unix.
+class SlowPamLoginTest : public PamLoginTest {
+protected:
+    static void SetUpTestSuite() {
+        if (geteuid() != 0) {
+            return;
+        }
+        std::ofstream(kSlowServiceFile) << "auth requisite pam_exec.so quiet /bin/sleep 2\n"
+                                           "auth required pam_unix.so\naccount required pam_unix.so\n";
+        ASSERT_TRUE(createAccount());
+        auto args = rawProviderArgs();
+        args.insert(args.end(), {"--pam-service", kSlowService, "--credentials",
+                                 sourceDir() + "/tests/e2e/data/credentials", "--threads", "2"});
+        host_ = new HostProcess(args);
+        ASSERT_TRUE(host_->waitReady()) << host_->output();
+    }
+    static void TearDownTestSuite() {
+        if (host_ != nullptr) {
+            EXPECT_EQ(host_->stop(SIGTERM), 0);
+            delete host_;
+            host_ = nullptr;
+        }
+        if (geteuid() == 0) {
+            removeAccountAndService();
+            std::error_code ignored;
+            std::filesystem::remove(kSlowServiceFile, ignored);
+        }
+    }
+
+    static inline const std::string kSlowService = kService + "-slow";
+    static inline const std::filesystem::path kSlowServiceFile = "/etc/pam.d/" + kSlowService;
+};
+
+TEST_F(SlowPamLoginTest, SlowSystemLoginsLeaveWorkersToOtherRequests) {
+    // Three slow checks at once on a host of two workers: one check runs at a time, so a
+    // user of the credentials file is still served at once.
+    std::vector<std::thread> guessers;
+    for (int i = 0; i < 3; ++i) {
+        guessers.emplace_back([i] { login("orvnosuchuser", "x", "127.0.0." + std::to_string(31 + i)); });
+    }
+    std::this_thread::sleep_for(300ms);
+    const Clock::time_point start = Clock::now();
+    auto response = login("user", "secret");
+    const Clock::duration took = Clock::now() - start;
+    for (auto& guesser : guessers) {
+        guesser.join();
+    }
+    ASSERT_TRUE(response);
+    EXPECT_EQ(response->status, 200);
+    EXPECT_LT(took, 1000ms);
+}
+
+TEST_F(SlowPamLoginTest, WaitingSystemLoginsAreAllAnswered) {
+    std::vector<std::thread> logins;
+    std::atomic<int> answered{0};
+    for (int i = 0; i < 3; ++i) {
+        logins.emplace_back([&, i] {
+            auto response = login(i == 0 ? kAccount : "orvnosuchuser", i == 0 ? kPassword : "x",
+                                  "127.0.0." + std::to_string(41 + i));
+            if (response && response->status == (i == 0 ? 200 : 401)) {
+                ++answered;
+            }
+        });
+    }
+    for (auto& thread : logins) {
+        thread.join();
+    }
+    EXPECT_EQ(answered.load(), 3);
 }
 
 TEST(PamLoginStart, ServiceWithoutAFileStopsTheStartWithOneLine) {

@@ -189,24 +189,46 @@ void Session<Stream>::checkLogin() {
     loginFailed(claimed->first);
 }
 
+// At most half the workers check logins at a time (the password hash of pam_unix costs
+// milliseconds of processor), so guessed passwords cannot keep the CIM requests from the
+// workers; the checks beyond wait, in order, without holding a worker.
 template <class Stream>
 void Session<Stream>::checkSystemLogin(std::string user, std::string password) {
     state_ = State::LoginCheck;
     transport().expires_never();
-    asio::post(*context_.workers, [self = shared_from_this(), guard = asio::make_work_guard(context_.io),
-                                   user = std::move(user), password = std::move(password)]() mutable {
-        const bool accepted = self->context_.options.pam->check(user, password);
-        asio::io_context& io = self->context_.io;
-        asio::post(io, [self = std::move(self), guard = std::move(guard), user = std::move(user), accepted]() mutable {
-            if (self->context_.stopping) {
-                self->transport().close();  // the body was never read: nothing to answer
-            } else if (accepted) {
-                self->loginSucceeded(std::move(user));
-            } else {
-                self->loginFailed(user);
-            }
+    auto check = [self = shared_from_this(), user = std::move(user), password = std::move(password)]() mutable {
+        asio::post(*self->context_.workers, [self, guard = asio::make_work_guard(self->context_.io),
+                                             user = std::move(user), password = std::move(password)]() mutable {
+            const bool accepted = self->context_.options.pam->check(user, password);
+            asio::io_context& io = self->context_.io;
+            asio::post(io, [self = std::move(self), guard = std::move(guard), user = std::move(user),
+                            accepted]() mutable { self->onSystemLogin(user, accepted); });
         });
-    });
+    };
+    if (context_.loginChecksRunning < context_.loginCheckLimit()) {
+        ++context_.loginChecksRunning;
+        check();
+    } else {
+        context_.loginChecksWaiting.emplace_back(std::move(check));
+    }
+}
+
+template <class Stream>
+void Session<Stream>::onSystemLogin(std::string& user, bool accepted) {
+    if (context_.loginChecksWaiting.empty()) {
+        --context_.loginChecksRunning;
+    } else {
+        auto next = std::move(context_.loginChecksWaiting.front());
+        context_.loginChecksWaiting.pop_front();
+        next();
+    }
+    if (context_.stopping) {
+        transport().close();  // the body was never read: nothing to answer
+    } else if (accepted) {
+        loginSucceeded(std::move(user));
+    } else {
+        loginFailed(user);
+    }
 }
 
 template <class Stream>

@@ -71,6 +71,7 @@ private:
     void onHead(error_code ec);
     void checkLogin();
     void checkSystemLogin(std::string user, std::string password);
+    void onSystemLogin(std::string& user, bool accepted);
     void loginSucceeded(std::string user);
     void loginFailed(const std::string& claimedUser);
     void challenge();
