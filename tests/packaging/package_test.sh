@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # The Debian packages end to end:
 #   package_test.sh SOURCE_DIR BUILD_DIR
-# builds them (scripts/build-packages.sh), runs lintian, installs them with dpkg -i, runs the
+# builds them (scripts/build-packages.sh; ORV_PACKAGE_DIR=DIR takes them from DIR), runs lintian, installs them with dpkg -i, runs the
 # installed orv-cimhost on a free port and queries it with wbemcli, verifies the unit with
 # systemd-analyze, registers the installed library into a copy of the test sfcb with the
 # installed orv-sfcb-register and queries it there, unregisters it, then purges the packages
@@ -40,11 +40,17 @@ rm -rf "$work"
 mkdir -p "$work"
 version=$(sed -n 's/^project([^)]*VERSION \([0-9.]*\).*/\1/p' "$src/CMakeLists.txt")
 
-echo "== building the packages"
-"$src/scripts/build-packages.sh" "$work/debs" >"$work/build.log" 2>&1 || { tail -n 40 "$work/build.log"; fail "package build"; }
+# ORV_PACKAGE_DIR takes the packages scripts/build-packages.sh put there instead of building
+# them again (when working on the steps after the build).
+debs_dir=${ORV_PACKAGE_DIR:-$work/debs}
+if [ -z "${ORV_PACKAGE_DIR:-}" ]; then
+    echo "== building the packages"
+    "$src/scripts/build-packages.sh" "$debs_dir" >"$work/build.log" 2>&1 ||
+        { tail -n 40 "$work/build.log"; fail "package build"; }
+fi
 debs=()
 for package in "${packages[@]}"; do
-    debs+=("$work/debs/${package}_${version}_$(dpkg --print-architecture).deb")
+    debs+=("$debs_dir/${package}_${version}_$(dpkg --print-architecture).deb")
 done
 
 echo "== lintian"
