@@ -67,6 +67,7 @@ installed=$(dpkg -L "${packages[@]}" | sort -u)
 echo "== the installed orv-cimhost"
 [ "$(/usr/sbin/orv-cimhost --version)" = "orv-cimhost $version" ] || fail "orv-cimhost --version"
 [ -f /usr/share/man/man8/orv-cimhost.8.gz ] || fail "no man page of orv-cimhost"
+: >"$work/host.log"
 /usr/sbin/orv-cimhost --port 0 --platform sim --fixture /usr/share/doc/orv-cimhost/examples/host.json \
     2>"$work/host.log" &
 host_pid=$!
@@ -113,7 +114,8 @@ echo "== unregistering"
 /usr/sbin/orv-sfcb-register --prefix "$sfcb_prefix" unregister
 # sfcbrepos keeps the previous repository beside the new one (*.previous): only the new counts.
 for file in registration/providerRegister registration/repository/root/cimv2/classSchemas; do
-    grep -q "Orvane_EthernetPort" "$sfcb_prefix/var/lib/sfcb/$file" && fail "Orvane_EthernetPort is still in $file"
+    [ -f "$sfcb_prefix/var/lib/sfcb/$file" ] && grep -q "Orvane_EthernetPort" "$sfcb_prefix/var/lib/sfcb/$file" &&
+        fail "Orvane_EthernetPort is still in $file"
 done
 [ -e "$sfcb_prefix/var/lib/sfcb/stage/mofs/root/cimv2/EthernetPort.mof" ] && fail "the class files are still staged"
 sfcb_prefix=""
