@@ -24,7 +24,6 @@ using Clock = std::chrono::steady_clock;
 const std::string kAccount = "orvpam" + std::to_string(getpid());
 const std::string kPassword = "Pam-Test-9!";
 const std::string kService = "orv-cimhost-test-" + std::to_string(getpid());
-const std::filesystem::path kServiceFile = "/etc/pam.d/" + kService;
 
 // useradd and userdel take a lock on /etc/passwd that another process may hold for a moment.
 bool runWithRetries(const std::string& command) {
@@ -42,35 +41,37 @@ bool createAccount() {
            runWithRetries("echo '" + kAccount + ":" + kPassword + "' | chpasswd");
 }
 
-void removeAccountAndService() {
-    runWithRetries("userdel " + kAccount);
-    std::error_code ignored;
-    std::filesystem::remove(kServiceFile, ignored);
-}
-
 class PamLoginTest : public ::testing::Test {
 protected:
     static void SetUpTestSuite() {
+        startHostWithService(kService, "auth required pam_unix.so\naccount required pam_unix.so\n");
+    }
+    static void TearDownTestSuite() { stopHostAndRemoveService(kService); }
+
+    // Writes the PAM service, makes the account and starts a host checking logins with both
+    // the service and the credentials file (either one lets a client in); as root only.
+    static void startHostWithService(const std::string& service, const std::string& text) {
         if (geteuid() != 0) {
             return;
         }
-        std::ofstream(kServiceFile) << "auth required pam_unix.so\naccount required pam_unix.so\n";
+        std::ofstream("/etc/pam.d/" + service) << text;
         ASSERT_TRUE(createAccount());
         auto args = rawProviderArgs();
-        // A list user beside the system's accounts: either one lets a client in.
-        args.insert(args.end(), {"--pam-service", kService, "--credentials",
+        args.insert(args.end(), {"--pam-service", service, "--credentials",
                                  sourceDir() + "/tests/e2e/data/credentials", "--threads", "2"});
         host_ = new HostProcess(args);
         ASSERT_TRUE(host_->waitReady()) << host_->output();
     }
-    static void TearDownTestSuite() {
+    static void stopHostAndRemoveService(const std::string& service) {
         if (host_ != nullptr) {
             EXPECT_EQ(host_->stop(SIGTERM), 0);
             delete host_;
             host_ = nullptr;
         }
         if (geteuid() == 0) {
-            removeAccountAndService();
+            runWithRetries("userdel " + kAccount);
+            std::error_code ignored;
+            std::filesystem::remove("/etc/pam.d/" + service, ignored);
         }
     }
     void SetUp() override {
@@ -153,33 +154,12 @@ TEST_F(PamLoginTest, RepeatedFailedSystemLoginsAreDelayed) {
 class SlowPamLoginTest : public PamLoginTest {
 protected:
     static void SetUpTestSuite() {
-        if (geteuid() != 0) {
-            return;
-        }
-        std::ofstream(kSlowServiceFile) << "auth requisite pam_exec.so quiet /bin/sleep 2\n"
-                                           "auth required pam_unix.so\naccount required pam_unix.so\n";
-        ASSERT_TRUE(createAccount());
-        auto args = rawProviderArgs();
-        args.insert(args.end(), {"--pam-service", kSlowService, "--credentials",
-                                 sourceDir() + "/tests/e2e/data/credentials", "--threads", "2"});
-        host_ = new HostProcess(args);
-        ASSERT_TRUE(host_->waitReady()) << host_->output();
+        startHostWithService(kSlowService, "auth requisite pam_exec.so quiet /bin/sleep 2\n"
+                                           "auth required pam_unix.so\naccount required pam_unix.so\n");
     }
-    static void TearDownTestSuite() {
-        if (host_ != nullptr) {
-            EXPECT_EQ(host_->stop(SIGTERM), 0);
-            delete host_;
-            host_ = nullptr;
-        }
-        if (geteuid() == 0) {
-            removeAccountAndService();
-            std::error_code ignored;
-            std::filesystem::remove(kSlowServiceFile, ignored);
-        }
-    }
+    static void TearDownTestSuite() { stopHostAndRemoveService(kSlowService); }
 
     static inline const std::string kSlowService = kService + "-slow";
-    static inline const std::filesystem::path kSlowServiceFile = "/etc/pam.d/" + kSlowService;
 };
 
 TEST_F(SlowPamLoginTest, SlowSystemLoginsLeaveWorkersToOtherRequests) {
