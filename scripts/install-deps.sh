@@ -9,15 +9,20 @@ PACKAGES=(
   # test and measurement tools
   libgtest-dev libgmock-dev googletest libbenchmark-dev valgrind
   # libraries the project links against
-  libboost-dev nlohmann-json3-dev libcpp-httplib-dev libssl-dev libexpat1-dev libmnl-dev
+  libboost-dev nlohmann-json3-dev libcpp-httplib-dev libssl-dev libexpat1-dev libmnl-dev libpam0g-dev
   # tools the end-to-end and Linux tests drive
   sblim-wbemcli ethtool iproute2 curl procps openssl
   # xmllint: the CIM-XML requests and answers of the tests are checked against the DTD
   libxml2-utils
+  # the PAM login test's throwaway account (useradd, chpasswd, userdel)
+  passwd
+  # the Debian packages and their test (label package): build, lintian, the unit's check
+  # (systemd-analyze, which looks the unit's man page up with man)
+  debhelper dpkg-dev fakeroot lintian systemd man-db
   # the stock sfcb broker of the two-broker tests (label sfcb), built from source by
   # ../shared/sfcb/build.sh, and its run script (syslog collector, private mount namespace)
   autoconf automake libtool flex bison make gcc libcurl4-openssl-dev zlib1g-dev
-  libpam0g-dev python3 util-linux
+  python3 util-linux
 )
 
 SUDO=""

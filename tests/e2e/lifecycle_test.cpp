@@ -60,6 +60,20 @@ TEST(CimHostLifecycle, SigtermRightAfterStartStillStops) {
     EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
 }
 
+TEST(CimHostLifecycle, VersionOptionPrintsTheProjectVersion) {
+    EXPECT_EQ(runCommand(buildDir() + "/bin/orv-cimhost --version; echo status $?"),
+              std::string("orv-cimhost ") + ORV_VERSION + "\nstatus 0\n");
+}
+
+TEST(CimHostLifecycle, ResponsesCarryTheServerHeaderWithTheVersion) {
+    HostProcess host(rawProviderArgs());
+    ASSERT_TRUE(host.waitReady()) << host.output();
+    const std::string head = runCommand("curl -s -o /dev/null -D - -X POST http://127.0.0.1:" +
+                                        std::to_string(host.port()) + "/cimom");
+    EXPECT_NE(head.find(std::string("\r\nServer: orv-cimhost/") + ORV_VERSION + "\r\n"), std::string::npos) << head;
+    EXPECT_EQ(host.stop(SIGTERM), 0);
+}
+
 TEST(CimHostLifecycle, PortTakenFailsWithOneLine) {
     HostProcess first(rawProviderArgs());
     ASSERT_TRUE(first.waitReady()) << first.output();

@@ -35,6 +35,20 @@ struct CimHost::Impl {
     std::atomic<bool> stopRequested{false};
     std::atomic<bool> runEntered{false};
     std::atomic<bool> runFinished{false};
+
+    // The stop order, also when a start fails half-way: the providers are cleaned up while
+    // the host's own interop provider still exists, since the core calls its cleanup too.
+    ~Impl() {
+        if (dispatcher) {
+            dispatcher->drain();
+        }
+        if (indications) {
+            indications->stop();
+        }
+        if (core) {
+            core->shutdown();
+        }
+    }
 };
 
 namespace {
@@ -63,8 +77,12 @@ http::ServerOptions serverOptions(const HostConfig& config) {
     options.keepAliveTimeout = config.keepAliveTimeout;
     options.keepAliveMaxRequests = config.keepAliveMaxRequests;
     options.maxConnectionsPerClient = config.maxConnectionsPerClient;
+    options.serverName = "orv-cimhost/" ORV_VERSION;
     if (!config.credentialsFile.empty()) {
         options.credentials = http::Credentials::loadFile(config.credentialsFile);
+    }
+    if (!config.pamService.empty()) {
+        options.pam.emplace(config.pamService);
     }
     return options;
 }
@@ -127,15 +145,6 @@ CimHost::CimHost(const HostConfig& config) : impl_(std::make_unique<Impl>()) {
 
 CimHost::~CimHost() {
     stop();
-    if (impl_->dispatcher) {
-        impl_->dispatcher->drain();
-    }
-    if (impl_->indications) {
-        impl_->indications->stop();
-    }
-    if (impl_->core) {
-        impl_->core->shutdown();
-    }
 }
 
 int CimHost::port() const noexcept {

@@ -115,6 +115,10 @@ constexpr std::array kKeys = {
               [](HostConfig& c, std::string_view v, Base) { c.logLevel = parseLogLevel(v); }},
     ConfigKey{"credentialsFile", "credentials", "file of user:password lines; enables basic authentication",
               [](HostConfig& c, std::string_view v, Base b) { c.credentialsFile = resolve(v, b); }},
+    ConfigKey{"pamService", "pam-service",
+              "PAM service (a file of /etc/pam.d) checking logins against the system's accounts; "
+              "enables basic authentication",
+              [](HostConfig& c, std::string_view v, Base) { c.pamService = std::string(v); }},
     ConfigKey{"maxRequestBytes", "max-request-bytes", "largest request body accepted (4194304)",
               [](HostConfig& c, std::string_view v, Base) {
                   c.maxRequestBytes = parseNumber<std::size_t>(v, 1024, std::size_t{1} << 30U);

@@ -19,13 +19,27 @@ std::string_view logLevelName(LogLevel level) noexcept {
     return "info";
 }
 
+namespace {
+
+// True when this program is the one built into the build tree's bin folder, false for an
+// installed copy.
+bool runsFromBuildTree() {
+    std::error_code ec;
+    const fs::path program = fs::read_symlink("/proc/self/exe", ec);
+    return !ec && fs::weakly_canonical(program.parent_path(), ec) == fs::weakly_canonical(ORV_BUILD_BIN_DIR, ec);
+}
+
+}  // namespace
+
 HostConfig defaultConfig() {
+    const bool buildTree = runsFromBuildTree();
+    const fs::path mofDir = buildTree ? ORV_DEFAULT_MOF_DIR : ORV_INSTALLED_DATA_DIR;
     HostConfig config;
-    config.providerDirs = {fs::path(ORV_DEFAULT_PROVIDER_DIR)};
-    config.registrationFiles = {fs::path(ORV_DEFAULT_MOF_DIR) / "orvprovider.reg"};
-    config.mofFiles = {fs::path(ORV_DEFAULT_MOF_DIR) / "orvprovider.mof"};
-    config.interopMof = fs::path(ORV_DEFAULT_MOF_DIR) / "interop" / "interop.mof";
-    config.stateDir = fs::path(ORV_DEFAULT_STATE_DIR);
+    config.providerDirs = {fs::path(buildTree ? ORV_DEFAULT_PROVIDER_DIR : ORV_INSTALLED_PROVIDER_DIR)};
+    config.registrationFiles = {mofDir / "orvprovider.reg"};
+    config.mofFiles = {mofDir / "orvprovider.mof"};
+    config.interopMof = mofDir / "interop" / "interop.mof";
+    config.stateDir = fs::path(buildTree ? ORV_DEFAULT_STATE_DIR : ORV_INSTALLED_STATE_DIR);
     return config;
 }
 
@@ -112,6 +126,10 @@ CommandLine parseCommandLine(int argc, const char* const* argv) {
             result.showHelp = true;
             continue;
         }
+        if (arg == "--version") {
+            result.showVersion = true;
+            continue;
+        }
         if (arg == "--preload") {
             options.emplace_back("preload", "true");  // a switch: the value may be left out
             continue;
@@ -158,8 +176,13 @@ std::string usageText() {
         left.resize(32, ' ');
         text += left + std::string(entry.help) + "  [key " + std::string(entry.key) + "]\n";
     }
+    text += "  --version                     the version\n";
     text += "  --help                        this text\n";
     return text;
+}
+
+std::string versionText() {
+    return std::string("orv-cimhost ") + ORV_VERSION;
 }
 
 }  // namespace orv::cimhost

@@ -83,6 +83,10 @@ int main(int argc, char** argv) {
         std::fputs(usageText().c_str(), stdout);
         return 0;
     }
+    if (commandLine.showVersion) {
+        std::puts(versionText().c_str());
+        return 0;
+    }
     setLogLevel(commandLine.config.logLevel);
     return serve(commandLine.config, signals);
 }

@@ -7,6 +7,8 @@
 #include <boost/asio/thread_pool.hpp>
 
 #include <cstddef>
+#include <deque>
+#include <functional>
 #include <string>
 #include <unordered_map>
 #include <unordered_set>
@@ -29,6 +31,11 @@ struct ServerContext {
     std::unordered_map<std::string, std::size_t> connectionsPerAddress;
     std::unordered_set<SessionBase*> sessions;
     bool stopping = false;
+    // PAM checks on the workers, and the ones waiting for a turn (see Session::checkSystemLogin).
+    std::size_t loginChecksRunning = 0;
+    std::deque<std::function<void()>> loginChecksWaiting;
+
+    std::size_t loginCheckLimit() const { return options.threads < 2 ? 1 : options.threads / 2; }
 
     void event(const std::string& line) const {
         if (eventLog) {

@@ -50,6 +50,12 @@ Response status(int code) {
     return response;
 }
 
+Response unauthorized(const std::string& realm) {
+    Response response = status(401);
+    response.headers.emplace_back("WWW-Authenticate", "Basic realm=\"" + realm + "\"");
+    return response;
+}
+
 Response callHandler(const Handler& handler, const Request& request) {
     try {
         return handler(request);
@@ -153,10 +159,121 @@ void Session<Stream>::onHead(error_code ec) {
         reply(std::move(response), keepAliveAfterThis());
         return;
     }
-    if (!loginAccepted()) {
-        refuseLogin();
+    checkLogin();
+}
+
+// Decided from the head alone, before any of the body is read: the credentials list on
+// this thread, the system's accounts on a worker.
+template <class Stream>
+void Session<Stream>::checkLogin() {
+    const ServerOptions& options = context_.options;
+    if (!options.credentials && !options.pam) {
+        acceptBody();
         return;
     }
+    const std::string* authorization = request_.header("Authorization");
+    if (authorization == nullptr) {
+        challenge();  // the first step of the challenge, not a failed login
+        return;
+    }
+    auto claimed = basicAuthorization(*authorization);
+    if (!claimed) {
+        loginFailed(std::string());
+        return;
+    }
+    if (options.credentials && options.credentials->check(claimed->first, claimed->second)) {
+        loginSucceeded(std::move(claimed->first));
+        return;
+    }
+    if (options.pam) {
+        checkSystemLogin(std::move(claimed->first), std::move(claimed->second));
+        return;
+    }
+    loginFailed(claimed->first);
+}
+
+// At most half the workers check logins at a time (the password hash of pam_unix costs
+// milliseconds of processor), so guessed passwords cannot keep the CIM requests from the
+// workers; the checks beyond wait, in order, without holding a worker.
+template <class Stream>
+void Session<Stream>::checkSystemLogin(std::string user, std::string password) {
+    state_ = State::LoginCheck;
+    transport().expires_never();
+    auto check = [self = shared_from_this(), user = std::move(user), password = std::move(password)]() mutable {
+        asio::post(*self->context_.workers, [self, guard = asio::make_work_guard(self->context_.io),
+                                             user = std::move(user), password = std::move(password)]() mutable {
+            const bool accepted = self->context_.options.pam->check(user, password);
+            asio::io_context& io = self->context_.io;
+            asio::post(io, [self = std::move(self), guard = std::move(guard), user = std::move(user),
+                            accepted]() mutable { self->onSystemLogin(user, accepted); });
+        });
+    };
+    if (context_.loginChecksRunning < context_.loginCheckLimit()) {
+        ++context_.loginChecksRunning;
+        check();
+    } else {
+        context_.loginChecksWaiting.emplace_back(std::move(check));
+    }
+}
+
+template <class Stream>
+void Session<Stream>::onSystemLogin(std::string& user, bool accepted) {
+    if (context_.loginChecksWaiting.empty()) {
+        --context_.loginChecksRunning;
+    } else {
+        auto next = std::move(context_.loginChecksWaiting.front());
+        context_.loginChecksWaiting.pop_front();
+        next();
+    }
+    if (context_.stopping) {
+        transport().close();  // the body was never read: nothing to answer
+    } else if (accepted) {
+        loginSucceeded(std::move(user));
+    } else {
+        loginFailed(user);
+    }
+}
+
+template <class Stream>
+void Session<Stream>::loginSucceeded(std::string user) {
+    context_.logins.succeeded(address_);
+    request_.user = std::move(user);
+    acceptBody();
+}
+
+template <class Stream>
+void Session<Stream>::challenge() {
+    reply(unauthorized(context_.options.realm), keepAliveAfterThis());
+}
+
+template <class Stream>
+void Session<Stream>::loginFailed(const std::string& claimedUser) {
+    auto verdict = context_.logins.failed(address_, claimedUser, LoginThrottle::Clock::now());
+    if (verdict.logLine) {
+        context_.event(*verdict.logLine);
+    }
+    if (verdict.delay.count() == 0) {
+        challenge();
+        return;
+    }
+    answerLater(unauthorized(context_.options.realm), verdict.delay);
+}
+
+// The delay holds this connection only; the I/O thread goes on serving the others.
+template <class Stream>
+void Session<Stream>::answerLater(Response response, std::chrono::milliseconds delay) {
+    state_ = State::Delaying;
+    delay_.expires_after(delay);
+    delay_.async_wait([self = shared_from_this(), response = std::move(response)](error_code ec) mutable {
+        if (!ec) {
+            const bool keepAlive = self->keepAliveAfterThis();
+            self->reply(std::move(response), keepAlive);
+        }
+    });
+}
+
+template <class Stream>
+void Session<Stream>::acceptBody() {
     const std::string* expect = request_.header("Expect");
     if (expect != nullptr && sameText(*expect, "100-continue") && !parser_->is_done()) {
         transport().expires_after(context_.options.writeTimeout);
@@ -169,53 +286,6 @@ void Session<Stream>::onHead(error_code ec) {
         return;
     }
     readBody();
-}
-
-template <class Stream>
-bool Session<Stream>::loginAccepted() {
-    if (!context_.options.credentials) {
-        return true;
-    }
-    const std::string* authorization = request_.header("Authorization");
-    std::optional<std::string> user =
-        authorization == nullptr ? std::nullopt : context_.options.credentials->authenticate(*authorization);
-    if (!user) {
-        return false;
-    }
-    context_.logins.succeeded(address_);
-    request_.user = std::move(*user);
-    return true;
-}
-
-template <class Stream>
-void Session<Stream>::refuseLogin() {
-    Response response = status(401);
-    response.headers.emplace_back("WWW-Authenticate", "Basic realm=\"" + context_.options.realm + "\"");
-    const std::string* authorization = request_.header("Authorization");
-    if (authorization == nullptr) {
-        // The first step of the challenge, not a failed login.
-        reply(std::move(response), keepAliveAfterThis());
-        return;
-    }
-    auto claimed = basicAuthorization(*authorization);
-    auto verdict = context_.logins.failed(address_, claimed ? claimed->first : std::string(),
-                                          LoginThrottle::Clock::now());
-    if (verdict.logLine) {
-        context_.event(*verdict.logLine);
-    }
-    if (verdict.delay.count() == 0) {
-        reply(std::move(response), keepAliveAfterThis());
-        return;
-    }
-    // The delay holds this connection only; the I/O thread goes on serving the others.
-    state_ = State::Delaying;
-    delay_.expires_after(verdict.delay);
-    delay_.async_wait([self = shared_from_this(), response = std::move(response)](error_code ec) mutable {
-        if (!ec) {
-            const bool keepAlive = self->keepAliveAfterThis();
-            self->reply(std::move(response), keepAlive);
-        }
-    });
 }
 
 template <class Stream>
@@ -280,9 +350,14 @@ void Session<Stream>::prepareHead(Message& message, Response& response, bool kee
     if (context_.accessLog) {
         context_.accessLog(request_, response);
     }
-    message = {};
+    // Named, not "= {}": clang 14 leaves the destructor of a temporary made from an empty
+    // braced list undefined inside an explicitly instantiated template (a link error).
+    message = Message{};
     message.version(parser_ && parser_->version() == 10 ? 10 : 11);
     message.result(static_cast<unsigned>(response.status));
+    if (!context_.options.serverName.empty()) {
+        message.set(beasthttp::field::server, context_.options.serverName);
+    }
     for (auto& [name, value] : response.headers) {
         message.insert(name, value);
     }

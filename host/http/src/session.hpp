@@ -15,6 +15,7 @@
 #include <boost/beast/ssl/ssl_stream.hpp>
 
 #include <array>
+#include <chrono>
 #include <memory>
 #include <optional>
 #include <string>
@@ -63,7 +64,7 @@ public:
 private:
     using error_code = boost::beast::error_code;
     using std::enable_shared_from_this<Session<Stream>>::shared_from_this;
-    enum class State { Handshake, Idle, Head, Body, Working, Delaying, Writing, Closing };
+    enum class State { Handshake, Idle, Head, LoginCheck, Body, Working, Delaying, Writing, Closing };
     static constexpr bool kTls = std::is_same_v<Stream, TlsStream>;
 
     boost::beast::tcp_stream& transport() { return boost::beast::get_lowest_layer(stream_); }
@@ -71,8 +72,14 @@ private:
     void awaitRequest();
     void readHead();
     void onHead(error_code ec);
-    bool loginAccepted();
-    void refuseLogin();
+    void checkLogin();
+    void checkSystemLogin(std::string user, std::string password);
+    void onSystemLogin(std::string& user, bool accepted);
+    void loginSucceeded(std::string user);
+    void loginFailed(const std::string& claimedUser);
+    void challenge();
+    void answerLater(Response response, std::chrono::milliseconds delay);
+    void acceptBody();
     void readBody();
     void onBody(error_code ec);
     void work();
@@ -97,7 +104,8 @@ private:
     boost::beast::flat_buffer buffer_;
     Request request_;
     std::optional<RequestParser> parser_;
-    boost::beast::http::response<boost::beast::http::string_body> response_;
+    using ResponseMessage = boost::beast::http::response<boost::beast::http::string_body>;
+    ResponseMessage response_;
     std::shared_ptr<StreamChannel> channel_;  // the streamed body in progress, if any
     boost::beast::http::response<boost::beast::http::empty_body> streamHead_;
     std::optional<boost::beast::http::response_serializer<boost::beast::http::empty_body>> headWriter_;

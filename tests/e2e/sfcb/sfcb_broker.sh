@@ -13,6 +13,7 @@
 #                                                          with ORV_ROOT=$ORV_SFCB_ROOT when that is set
 #                                                          (default: tests/e2e/data/root)
 #   sfcb_broker.sh stop BUILD_DIR SOURCE_DIR RUN_DIR      stop that sfcbd and everything it started
+#   sfcb_broker.sh paths BUILD_DIR SOURCE_DIR             print "PREFIX SCRIPTS_DIR" (prepared as above)
 # start stages more beside the library when the tests name it (space-separated lists):
 #   ORV_SFCB_EXTRA_LIBRARIES      further provider libraries (lib<location>.so)
 #   ORV_SFCB_EXTRA_REGISTRATIONS  their registration files
@@ -80,6 +81,13 @@ case $cmd in
 prepare)
     rm -f "$base/unavailable"
     pristine_prefix > /dev/null ;;
+paths)
+    # For other tests that run their own sfcb: the pristine prefix (never to be written) and
+    # the folder of the sfcb scripts, on one line.
+    prefix=$(pristine_prefix)
+    [ -f "$base/unavailable" ] && exit 0
+    scripts=$(sfcb_scripts) || unavailable "no sfcb scripts: set ORV_SFCB_SOURCE to the folder of sfcb-run.sh"
+    echo "$prefix $scripts" ;;
 start)
     run=$(realpath -m "${4:?RUN_DIR}")
     fixture=$(realpath "${5:-$src/platform/sim/examples/host.json}")

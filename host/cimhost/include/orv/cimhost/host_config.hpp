@@ -32,6 +32,7 @@ struct HostConfig {
     std::filesystem::path fixture;       // simulated host description (sim)
     LogLevel logLevel = LogLevel::Info;
     std::filesystem::path credentialsFile;  // basic authentication when set
+    std::string pamService;                 // basic authentication against the system's accounts when set
     std::size_t maxRequestBytes = 4U << 20U;
     std::chrono::seconds readTimeout{30};
     std::chrono::seconds writeTimeout{30};
@@ -62,8 +63,10 @@ public:
     using std::runtime_error::runtime_error;
 };
 
-// Defaults of a build tree: provider libraries from its lib folder, the project's
-// registration file and MOF from the source tree.
+// Defaults of a build tree when this program runs from one: provider libraries from its lib
+// folder, the project's registration file and MOF from the source tree. An installed program
+// takes them from where `cmake --install` put them: <libdir>/cmpi, <datadir>/orvprovider, and
+// keeps its state in <localstatedir>/lib/orv-cimhost.
 HostConfig defaultConfig();
 
 // Sets one key ("httpPort", "providerDirs", ...) from its text; relative paths are
@@ -76,11 +79,14 @@ void loadConfigFile(HostConfig& config, const std::filesystem::path& file);
 struct CommandLine {
     HostConfig config;
     bool showHelp = false;
+    bool showVersion = false;
 };
 // Defaults, then --config FILE, then the other options in order; throws ConfigError.
 CommandLine parseCommandLine(int argc, const char* const* argv);
 // The usage text listing every option and its configuration key.
 std::string usageText();
+// "orv-cimhost VERSION": the project's version, also sent in the Server header.
+std::string versionText();
 
 std::string_view logLevelName(LogLevel level) noexcept;
 

@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "orv/http/credentials.hpp"
+#include "orv/http/pam_authentication.hpp"
 
 namespace orv::http {
 
@@ -37,8 +38,12 @@ struct ServerOptions {
     std::chrono::seconds keepAliveTimeout{5};
     std::size_t keepAliveMaxRequests = 100;
     std::size_t streamBufferBytes = 64U << 10U; // a streamed body's bytes waiting for the client
-    std::optional<Credentials> credentials;   // basic authentication when set
+    std::optional<Credentials> credentials;   // basic authentication against this list when set
+    // Basic authentication against the system's accounts when set (beside the list: a login
+    // either of them accepts is in); the check runs on a worker.
+    std::optional<PamAuthentication> pam;
     std::string realm = "orv-cimhost";
+    std::string serverName;  // the Server header of every response ("product/version"), if set
 };
 
 struct Response;
