@@ -19,15 +19,6 @@ namespace orv::cimhost {
 namespace fs = std::filesystem;
 
 struct CimHost::Impl {
-    // A start that fails after the interop provider was registered with the core (the port
-    // is taken, say) destroys the members without ~CimHost: the providers are cleaned up
-    // here, while the interop provider the core calls is still alive. Idempotent.
-    ~Impl() {
-        if (core) {
-            core->shutdown();
-        }
-    }
-
     std::unique_ptr<host::BrokerCore> core;
     std::unique_ptr<detail::HostIndications> indications;
     std::unique_ptr<CimDispatcher> dispatcher;
