@@ -52,7 +52,7 @@ struct CoreConfig {
     std::string mofNamespace = "root/cimv2";
     // Receives the core's warnings, one line each without line end (such as the
     // one logged once per provider that hands object paths to instance
-    // requests). Unset: they go to standard error.
+    // requests, and the class repository's warnings about the MOF at start). Unset: they go to standard error.
     std::function<void(const std::string&)> warningSink;
 };
 
