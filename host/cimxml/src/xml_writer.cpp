@@ -3,6 +3,8 @@
 #include <cstdio>
 #include <stdexcept>
 
+#include "control_pictures.hpp"
+
 namespace orv::cimxml {
 
 namespace {
@@ -29,8 +31,8 @@ std::string escapeXml(std::string_view text) {
             case '\n':
             case '\r': appendCharacterReference(out, static_cast<unsigned char>(c)); break;
             default:
-                if (static_cast<unsigned char>(c) < 0x20) {
-                    // Not representable in XML 1.0 even as a reference: drop it.
+                if (needsControlPicture(static_cast<unsigned char>(c))) {
+                    appendControlPicture(out, static_cast<unsigned char>(c));
                     break;
                 }
                 out += c;
