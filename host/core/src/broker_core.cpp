@@ -124,6 +124,9 @@ Reply send(detail::CoreServices& services, Request request, const CallOptions& o
     PropertyList properties(opts);
     request.properties = properties.get();
     request.caller = callerOf(opts);
+    if (opts.onItem) {
+        state->sink.consumer = &opts.onItem;
+    }
     if (request.op == Op::InvokeMethod) {
         ArenaGuard guard(state->arena);
         state->out = detail::newArgs(detail::Owner::Arena);

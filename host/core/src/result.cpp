@@ -27,13 +27,21 @@ CMPIResult* clone(const CMPIResult* /*result*/, CMPIStatus* rc) {
     return nullptr;
 }
 
-void append(ResultSink& sink, ReturnedItem::Kind kind, CMPIType type, void* object) {
+// Keeps the item, or hands it to the streaming consumer and frees what was made
+// for it since `mark` (the sink arena's newest object before the copy).
+CMPIStatus append(ResultSink& sink, ReturnedItem::Kind kind, CMPIType type, void* object, const ObjectBase* mark) {
     ReturnedItem item;
     item.kind = kind;
     item.data.type = type;
     item.data.state = CMPI_goodValue;
     item.data.value.inst = static_cast<CMPIInstance*>(object);
-    sink.items.push_back(item);
+    if (sink.consumer == nullptr) {
+        sink.items.push_back(item);
+        return okStatus();
+    }
+    const bool taken = (*sink.consumer)(item);
+    sink.out->clearAfter(mark);
+    return taken ? okStatus() : status(CMPI_RC_ERR_FAILED, "the client no longer takes results of this request");
 }
 
 CMPIStatus returnData(const CMPIResult* result, const CMPIValue* value, CMPIType type) {
@@ -62,13 +70,16 @@ CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance
     if (instance == nullptr) {
         return status(CMPI_RC_ERR_INVALID_PARAMETER, "returnInstance with a NULL instance");
     }
-    ArenaGuard guard(*sink->out);
-    CMPIInstance* copy = cloneInstance(instance, Owner::Arena);
+    const ObjectBase* mark = sink->out->top();
+    CMPIInstance* copy = nullptr;
+    {
+        ArenaGuard guard(*sink->out);
+        copy = cloneInstance(instance, Owner::Arena);
+    }
     if (copy == nullptr) {
         return status(CMPI_RC_ERR_INVALID_HANDLE, "returnInstance with an object that is not a live instance");
     }
-    append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy);
-    return okStatus();
+    return append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy, mark);
 }
 
 CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path) {
@@ -79,22 +90,25 @@ CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path
     if (path == nullptr) {
         return status(CMPI_RC_ERR_INVALID_PARAMETER, "returnObjectPath with a NULL path");
     }
-    ArenaGuard guard(*sink->out);
-    if (sink->pathsAsInstances) {
-        CMPIInstance* instance = objectPathImpl(path) != nullptr ? newInstance(path, Owner::Arena) : nullptr;
-        if (instance == nullptr) {
-            return status(CMPI_RC_ERR_INVALID_HANDLE, "returnObjectPath with an object that is not a live object path");
+    const ObjectBase* mark = sink->out->top();
+    const bool asInstance = sink->pathsAsInstances;
+    void* copy = nullptr;
+    {
+        ArenaGuard guard(*sink->out);
+        if (asInstance) {
+            copy = objectPathImpl(path) != nullptr ? newInstance(path, Owner::Arena) : nullptr;
+        } else {
+            copy = cloneObjectPath(path, Owner::Arena);
         }
-        append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, instance);
-        ++sink->pathsTurnedIntoInstances;
-        return okStatus();
     }
-    CMPIObjectPath* copy = cloneObjectPath(path, Owner::Arena);
     if (copy == nullptr) {
         return status(CMPI_RC_ERR_INVALID_HANDLE, "returnObjectPath with an object that is not a live object path");
     }
-    append(*sink, ReturnedItem::Kind::ObjectPath, CMPI_ref, copy);
-    return okStatus();
+    if (asInstance) {
+        ++sink->pathsTurnedIntoInstances;
+        return append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy, mark);
+    }
+    return append(*sink, ReturnedItem::Kind::ObjectPath, CMPI_ref, copy, mark);
 }
 
 CMPIStatus returnDone(const CMPIResult* result) {

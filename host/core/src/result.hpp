@@ -23,6 +23,9 @@ struct ResultSink {
     bool pathsAsInstances = false;
     // How many paths were turned into instances so.
     unsigned pathsTurnedIntoInstances = 0;
+    // Set when the caller streams (CallOptions::onItem): instances and paths go to
+    // it and are freed at once instead of being kept in `items`.
+    const ItemConsumer* consumer = nullptr;
 };
 
 // A caller-owned result feeding `sink`; free it with disposeObject.

@@ -56,6 +56,10 @@ struct CoreConfig {
     std::function<void(const std::string&)> warningSink;
 };
 
+struct ReturnedItem;
+// Receives returned objects one at a time (see CallOptions::onItem).
+using ItemConsumer = std::function<bool(const ReturnedItem&)>;
+
 // Per-request settings that reach the provider through its context.
 struct CallOptions {
     std::string principal;            // CMPIPrincipal
@@ -65,6 +69,13 @@ struct CallOptions {
     // Property list handed to the provider; std::nullopt means "all properties"
     // (a NULL list), an empty vector means "no properties".
     std::optional<std::vector<std::string>> properties;
+    // Streaming: when set, every instance and object path a provider returns is
+    // handed to it at once, on the provider's thread, and freed when it returns
+    // (valid only during the call; clone to keep), instead of being kept in the
+    // Reply, so a request costs the memory of one object whatever the provider
+    // returns. Answering false refuses the object: the provider's return call gets
+    // CMPI_RC_ERR_FAILED, which tells it to stop.
+    ItemConsumer onItem;
 };
 
 // One thing a provider returned, in the order it arrived.
