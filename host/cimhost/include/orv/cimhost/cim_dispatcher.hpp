@@ -15,6 +15,7 @@ namespace orv::cimhost {
 
 namespace detail {
 class CallLimiter;
+class EnumerationRegistry;
 }
 
 class CimDispatcher {
@@ -35,9 +36,12 @@ public:
     // A request that overruns the call limit is answered CIM_ERR_FAILED; its provider
     // call cannot be stopped and goes on in the background, its result dropped.
     std::string respond(const cimxml::CimRequest& request, const std::string& principal) const;
-    // Waits for every provider call still running (overrunning ones included); the
-    // host calls it after the server stopped and before the providers are cleaned up.
+    // Waits for every provider call still running (overrunning ones included), then
+    // closes the open enumerations of the pull operations and joins their producers;
+    // the host calls it after the server stopped and before the providers are cleaned up.
     void drain();
+    // How many enumerations of the pull operations are open now.
+    std::size_t openEnumerations() const;
 
 private:
     std::string respondNow(const cimxml::CimRequest& request, const std::string& principal) const;
@@ -47,6 +51,7 @@ private:
     std::string hostName_;
     cimxml::ArrayNullElements arrayNulls_;
     std::unique_ptr<detail::CallLimiter> limiter_;
+    std::unique_ptr<detail::EnumerationRegistry> enumerations_;
 };
 
 }  // namespace orv::cimhost
