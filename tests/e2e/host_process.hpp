@@ -41,6 +41,15 @@ private:
     std::string output_;
 };
 
+// One orv-cimhost over the raw test provider with the users of
+// tests/e2e/data/credentials, shared by the tests of a suite: start() in
+// SetUpTestSuite, stop() in TearDownTestSuite (expects a clean exit).
+struct SharedRawHost {
+    static HostProcess* host;
+    static void start();
+    static void stop();
+};
+
 // Runs a shell command; its standard output and error, in that order.
 std::string runCommand(const std::string& command);
 

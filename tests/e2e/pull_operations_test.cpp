@@ -42,16 +42,8 @@ struct Answer {
 
 class PullOperationsTest : public ::testing::Test {
 protected:
-    static void SetUpTestSuite() {
-        auto args = rawProviderArgs();
-        args.insert(args.end(), {"--credentials", sourceDir() + "/tests/e2e/data/credentials"});
-        host_ = new HostProcess(args);
-        ASSERT_TRUE(host_->waitReady()) << host_->output();
-    }
-    static void TearDownTestSuite() {
-        EXPECT_EQ(host_->stop(SIGTERM), 0);
-        delete host_;
-    }
+    static void SetUpTestSuite() { SharedRawHost::start(); }
+    static void TearDownTestSuite() { SharedRawHost::stop(); }
 
     static Answer call(const std::string& method, const std::string& params, const std::string& user = "user") {
         const std::string body =
@@ -59,7 +51,7 @@ protected:
             "<MESSAGE ID=\"5\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><IMETHODCALL NAME=\"" + method +
             "\"><LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/></LOCALNAMESPACEPATH>" +
             params + "</IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
-        httplib::Client client("127.0.0.1", host_->port());
+        httplib::Client client("127.0.0.1", SharedRawHost::host->port());
         client.set_read_timeout(20);
         client.set_basic_auth(user, "secret");
         auto result = client.Post("/cimom",
@@ -202,10 +194,7 @@ protected:
         return names;
     }
 
-    static HostProcess* host_;
 };
-
-HostProcess* PullOperationsTest::host_ = nullptr;
 
 constexpr int kInvalidEnumerationContext = 21;
 

@@ -92,19 +92,40 @@ void writeParam(cimxml::XmlWriter& out, const char* name, const std::string& val
     out.close();
 }
 
+// An operation's use of an enumeration: released when the operation ends, however
+// it ends, so that the context's timer runs again (or the context is freed).
+class Use {
+public:
+    Use(EnumerationRegistry& registry, std::shared_ptr<EnumerationContext> enumeration)
+        : registry_(registry), enumeration_(std::move(enumeration)) {}
+    ~Use() { registry_.release(enumeration_, remove_); }
+    Use(const Use&) = delete;
+    Use& operator=(const Use&) = delete;
+
+    EnumerationContext& operator*() const { return *enumeration_; }
+    EnumerationContext* operator->() const { return enumeration_.get(); }
+    // Frees the context when the operation ends.
+    void removeAtEnd() { remove_ = true; }
+
+private:
+    EnumerationRegistry& registry_;
+    std::shared_ptr<EnumerationContext> enumeration_;
+    bool remove_ = false;
+};
+
 // Writes up to `max` objects of the enumeration, then EndOfSequence and the
 // EnumerationContext (empty at the end); an ended or failed enumeration is freed.
-void answerBatch(OperationContext& context, const std::shared_ptr<EnumerationContext>& enumeration,
-                 std::uint32_t max) {
-    EnumerationRegistry& registry = *context.enumerations;
-    const std::size_t count = std::min<std::uint32_t>(max, registry.limits().maxObjectCount);
+void answerBatch(OperationContext& context, Use& enumeration, std::uint32_t max) {
+    const std::size_t count = std::min<std::uint32_t>(max, context.enumerations->limits().maxObjectCount);
     EnumerationContext::Batch batch = enumeration->take(count);
     if (enumeration->closed()) {
-        registry.release(enumeration, true);
+        enumeration.removeAtEnd();
         throw CimError(CimStatus::PullHasBeenAbandoned, "the enumeration was closed while this pull waited");
     }
+    if (batch.errorCode != 0 || batch.end) {
+        enumeration.removeAtEnd();
+    }
     if (batch.errorCode != 0) {
-        registry.release(enumeration, true);
         throw CimError(batch.errorCode, batch.errorMessage);
     }
     for (const std::string& fragment : batch.fragments) {
@@ -113,7 +134,6 @@ void answerBatch(OperationContext& context, const std::shared_ptr<EnumerationCon
     context.out.close();  // IRETURNVALUE
     writeParam(context.out, "EndOfSequence", batch.end ? "TRUE" : "FALSE");
     writeParam(context.out, "EnumerationContext", batch.end ? std::string() : enumeration->id());
-    registry.release(enumeration, batch.end);
 }
 
 // Encodes one returned object as a pull of `kind` returns it ("" to skip it).
@@ -186,8 +206,8 @@ EnumerationContext::Producer producer(host::BrokerCore& core, ProviderCall call,
 // Starts the enumeration and answers its first batch.
 void open(OperationContext& context, PullKind kind, const OpenParameters& parameters, ProviderCall call,
           host::CallOptions options, const cimxml::InstanceEncoding& encoding) {
-    auto enumeration = context.enumerations->open(context.principal, context.request.nameSpace, kind,
-                                                  parameters.timeout);
+    Use enumeration(*context.enumerations, context.enumerations->open(context.principal, context.request.nameSpace,
+                                                                      kind, parameters.timeout));
     enumeration->start(producer(context.core, std::move(call), std::move(options),
                                 encoder(kind, encoding, context.defaults), parameters.filter));
     answerBatch(context, enumeration, parameters.maxObjectCount);
@@ -299,9 +319,8 @@ void pull(OperationContext& context, PullKind kind) {
     if (!id || !max) {
         throw CimError(CimStatus::InvalidParameter, "EnumerationContext and MaxObjectCount are required");
     }
-    auto enumeration = context.enumerations->acquire(*id, context.principal, request.nameSpace);
+    Use enumeration(*context.enumerations, context.enumerations->acquire(*id, context.principal, request.nameSpace));
     if (enumeration->kind() != kind) {
-        context.enumerations->release(enumeration, false);
         throw CimError(CimStatus::InvalidEnumerationContext,
                        "this enumeration was opened for another pull operation (" + request.methodName +
                            " does not fit it)");
@@ -384,11 +403,10 @@ void closeEnumeration(OperationContext& context) {
 // The number of objects left when the producer has ended; NULL (an empty
 // IRETURNVALUE) while it still runs, since the count is not known before.
 void enumerationCount(OperationContext& context) {
-    auto enumeration =
-        context.enumerations->acquire(requiredContext(context.request), context.principal, context.request.nameSpace);
-    const std::optional<std::size_t> remaining = enumeration->remaining();
-    context.enumerations->release(enumeration, false);
-    if (remaining) {
+    const Use enumeration(*context.enumerations, context.enumerations->acquire(requiredContext(context.request),
+                                                                               context.principal,
+                                                                               context.request.nameSpace));
+    if (const std::optional<std::size_t> remaining = enumeration->remaining()) {
         context.out.leaf("VALUE", std::to_string(*remaining));
     }
 }
