@@ -65,7 +65,9 @@ EnumerationContext::Batch EnumerationContext::take(std::size_t max) {
         }
         changed_.notify_all();  // room for the producer
     }
-    if (finished_ && queue_.empty()) {
+    // A closed enumeration ends nothing: its pull is abandoned, whatever the
+    // producer did after the close.
+    if (!closed_ && finished_ && queue_.empty()) {
         batch.end = true;
         if (errorCode_ != 0 && batch.fragments.empty()) {
             batch.errorCode = errorCode_;
