@@ -12,6 +12,8 @@ PACKAGES=(
   libboost-dev nlohmann-json3-dev libcpp-httplib-dev libssl-dev libexpat1-dev libmnl-dev
   # tools the end-to-end and Linux tests drive
   sblim-wbemcli ethtool iproute2 curl procps openssl
+  # xmllint: the CIM-XML requests and answers of the tests are checked against the DTD
+  libxml2-utils
   # the stock sfcb broker of the two-broker tests (label sfcb), built from source by
   # ../shared/sfcb/build.sh, and its run script (syslog collector, private mount namespace)
   autoconf automake libtool flex bison make gcc libcurl4-openssl-dev zlib1g-dev

@@ -7,7 +7,6 @@
 //   linux_floor_bench [rounds]      (default 2000)
 #include "linux_backend.hpp"
 #include "linux_pnic.hpp"
-#include "sysfs_net.hpp"
 #include "nic_records.hpp"
 
 #include "nodemgr/lib/NodeMgrException.h"
@@ -276,7 +275,12 @@ void measure(const Row& row, int rounds)
 int main(int argc, char** argv)
 {
     const int rounds = argc > 1 ? std::max(1, std::atoi(argv[1])) : 2000;
-    auto nics = SysfsNet().busDevices();
+    LinuxNetwork network("/sys", std::make_shared<IoctlEthtoolChannel>());
+    std::vector<std::string> nics;
+    for (auto* pnic : network.getPnics()) {
+        nics.push_back(pnic->GetName());
+        delete pnic;
+    }
     std::printf("| per unit | substitute (median) | floor (median) | ratio |\n|---|---|---|---|\n");
     if (nics.empty()) {
         std::printf("(no NIC on a bus: NIC rows skipped)\n");
@@ -290,7 +294,6 @@ int main(int argc, char** argv)
         if (ethtool(nic, &driver) == 0 && ::access(("/sys/bus/pci/devices/" + std::string(driver.bus_info)).c_str(), F_OK) == 0) {
             nic.pciDir = "/sys/bus/pci/devices/" + std::string(driver.bus_info) + "/";
         }
-        LinuxNetwork network("/sys", std::make_shared<IoctlEthtoolChannel>(), std::make_shared<GenlEthtoolChannel>());
         const std::string unitNic = "NIC " + nic.name + ", all records";
         measure({unitNic.c_str(), [&] { substituteNicRecords(network, nic.name); }, [&] { floorNicRecords(nic); }}, rounds);
         measure({"one Ethernet port instance", [&] { substitutePortInstance(network, nic.name); }, [&] { floorPortInstance(nic); }},

@@ -3,7 +3,7 @@
 // the ioctls) against its floor, the same generic-netlink requests sent on the
 // open socket with nothing parsed; and the ioctl path for the same data.
 #include "ethtool_reader.hpp"
-#include "sysfs_net.hpp"
+#include "rtnetlink_links.hpp"
 
 #include <benchmark/benchmark.h>
 #include <linux/ethtool_netlink.h>
@@ -17,8 +17,10 @@ constexpr std::uint8_t kMessages[] = {ETHTOOL_MSG_LINKINFO_GET, ETHTOOL_MSG_LINK
 
 std::string firstBusNic()
 {
-    auto nics = SysfsNet().busDevices();
-    return nics.empty() ? std::string() : nics.front();
+    for (const auto& link : RouteLinks().all()) {
+        if (link.onBus()) return link.name;
+    }
+    return {};
 }
 
 template <typename Call>
@@ -75,3 +77,4 @@ void IoctlLinkDataPerNic(benchmark::State& state)
 BENCHMARK(NetlinkLinkDataPerNic);
 BENCHMARK(NetlinkFloorPerNic);
 BENCHMARK(IoctlLinkDataPerNic);
+BENCHMARK_MAIN();

@@ -83,6 +83,17 @@ Answer EthtoolReader::simple(std::uint32_t command, const char* name) const
     return answer;
 }
 
+template <typename Answer>
+std::optional<Answer> EthtoolReader::simpleIfSupported(std::uint32_t command, const char* name) const
+{
+    Answer answer{};
+    answer.cmd = command;
+    const int error = channel_.exchange(ifname_, &answer, sizeof answer);
+    if (error == EOPNOTSUPP) return std::nullopt;
+    if (error) throw LinuxCallError(name, ifname_, error);
+    return answer;
+}
+
 LinkSettings EthtoolReader::linkSettings() const
 {
     if (auto settings = netlinkSettings()) return *settings;
@@ -158,10 +169,11 @@ ethtool_drvinfo EthtoolReader::driverInfo() const
     return simple<ethtool_drvinfo>(ETHTOOL_GDRVINFO, "ETHTOOL_GDRVINFO");
 }
 
-ethtool_wolinfo EthtoolReader::wakeOnLan() const
+std::optional<ethtool_wolinfo> EthtoolReader::wakeOnLan() const
 {
-    return preferNetlink<ethtool_wolinfo>(ETHTOOL_MSG_WOL_GET, "ETHTOOL_MSG_WOL_GET", parseWakeOnLan, ETHTOOL_GWOL,
-                              "ETHTOOL_GWOL");
+    ethtool_wolinfo answer{};
+    if (fromNetlink(ETHTOOL_MSG_WOL_GET, "ETHTOOL_MSG_WOL_GET", parseWakeOnLan, answer)) return answer;
+    return simpleIfSupported<ethtool_wolinfo>(ETHTOOL_GWOL, "ETHTOOL_GWOL");
 }
 
 ethtool_coalesce EthtoolReader::coalesce() const
@@ -182,9 +194,11 @@ ethtool_ringparam EthtoolReader::rings() const
                               "ETHTOOL_GRINGPARAM");
 }
 
-std::uint32_t EthtoolReader::messageLevel() const
+std::optional<std::uint32_t> EthtoolReader::messageLevel() const
 {
-    return value(ETHTOOL_GMSGLVL, "ETHTOOL_GMSGLVL");
+    auto answer = simpleIfSupported<ethtool_value>(ETHTOOL_GMSGLVL, "ETHTOOL_GMSGLVL");
+    if (!answer) return std::nullopt;
+    return answer->data;
 }
 
 bool EthtoolReader::linkDetected() const

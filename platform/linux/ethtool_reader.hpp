@@ -49,11 +49,14 @@ public:
     // kernel or driver does not know that command either.
     LinkSettings linkSettings() const;
     ethtool_drvinfo driverInfo() const;
-    ethtool_wolinfo wakeOnLan() const;
+    // Nothing when the driver does not implement wake-on-LAN (EOPNOTSUPP): a
+    // common answer, so it is no exception.
+    std::optional<ethtool_wolinfo> wakeOnLan() const;
     ethtool_coalesce coalesce() const;
     ethtool_pauseparam pause() const;
     ethtool_ringparam rings() const;
-    std::uint32_t messageLevel() const;
+    // Nothing when the driver does not implement it (EOPNOTSUPP).
+    std::optional<std::uint32_t> messageLevel() const;
     bool linkDetected() const;
     // A legacy on/off query answered in an ethtool_value (ETHTOOL_GRXCSUM, ...).
     std::uint32_t value(std::uint32_t command, const char* name) const;
@@ -69,6 +72,9 @@ private:
     void exchange(void* buffer, std::size_t size, const char* command) const;
     template <typename Answer>
     Answer simple(std::uint32_t command, const char* name) const;
+    // As simple, answering nothing when the driver does not implement the command.
+    template <typename Answer>
+    std::optional<Answer> simpleIfSupported(std::uint32_t command, const char* name) const;
     template <typename Answer>
     bool fromNetlink(std::uint8_t message, const char* name, bool (*parse)(const NetlinkMessage&, Answer&),
                      Answer& answer) const;

@@ -7,8 +7,10 @@
 
 namespace orv::linuxhost {
 
-LinuxBackend::LinuxBackend(LinuxRoots roots, std::string fileRoot, bool hypervisorKernel)
-    : network_(roots.sys, std::make_shared<IoctlEthtoolChannel>(), std::make_shared<GenlEthtoolChannel>()),
+LinuxBackend::LinuxBackend(LinuxRoots roots, std::string fileRoot, bool hypervisorKernel, bool ethtoolNetlink)
+    : network_(roots.sys, std::make_shared<IoctlEthtoolChannel>(),
+               ethtoolNetlink ? std::make_shared<GenlEthtoolChannel>() : nullptr),
+      health_(roots.sys, roots.dev),
       ksi_(roots),
       version_(std::move(fileRoot), hypervisorKernel)
 {
@@ -37,7 +39,8 @@ std::unique_ptr<Backend> makeLinuxBackend(std::string& error)
         std::string fileRoot = orvRootPath("/");
         if (!fileRoot.empty() && fileRoot.back() == '/') fileRoot.pop_back();
         const bool hypervisor = linuxhost::parseHostTypeSetting(std::getenv("ORV_LINUX_HYPERVISOR_KERNEL"));
-        return std::make_unique<linuxhost::LinuxBackend>(roots, fileRoot, hypervisor);
+        const bool netlink = linuxhost::parseHostTypeSetting(std::getenv("ORV_LINUX_ETHTOOL_NETLINK"));
+        return std::make_unique<linuxhost::LinuxBackend>(roots, fileRoot, hypervisor, netlink);
     } catch (const std::exception& failure) {
         error = std::string("the linux platform substitute cannot start: ") + failure.what();
         return nullptr;

@@ -2,10 +2,12 @@
 #pragma once
 
 #include "canonical_name.hpp"
+#include "health/linux_health.hpp"
 #include "ethtool_channel.hpp"
 #include "ethtool_netlink_channel.hpp"
-#include "link_statistics.hpp"
+#include "kernel_release.hpp"
 #include "linux_ksi.hpp"
+#include "linux_pnic.hpp"
 #include "os_version.hpp"
 
 #include "orv/platform/backend/Backend.h"
@@ -14,20 +16,26 @@
 
 namespace orv::linuxhost {
 
-// The physical NICs: net devices with a bus device, in interface-index order.
+// The physical NICs: the links of the backend's network namespace that sit on
+// a bus device (recognizeNic), in interface-index order. A listing is one
+// RTM_GETLINK dump whose answers the pnics keep; a pnic by name is one
+// RTM_GETLINK for that name.
 class LinuxNetwork final : public orv::platform::NetworkBackend {
 public:
     // Without a netlink channel every ethtool query goes through the ioctls.
+    // `kernelNamesParents` false: the kernel's link answers name no parent
+    // device, so the bus device is asked of each link's driver.
     LinuxNetwork(std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
-                 std::shared_ptr<EthtoolNetlinkChannel> netlink = nullptr);
+                 std::shared_ptr<EthtoolNetlinkChannel> netlink = nullptr,
+                 bool kernelNamesParents = kernelNamesParentDevices());
     std::vector<NodeMgr::Network::Pnic*> getPnics() override;
     NodeMgr::Network::Pnic* getPnicByName(const std::string& name) override;
 
 private:
-    std::string sysRoot_;
-    std::shared_ptr<EthtoolChannel> channel_;
-    std::shared_ptr<EthtoolNetlinkChannel> netlink_;
-    std::shared_ptr<RouteStatistics> route_;  // one rtnetlink socket for every NIC
+    bool isNic(LinkRecord& link) const;
+
+    NicKernel kernel_;
+    bool kernelNamesParents_;
 };
 
 // Version record from os-release and uname; host type from configuration.
@@ -59,21 +67,25 @@ private:
 };
 
 void fillVersionRecord(const SystemVersion& version, TmkuserVersion_SystemVersionInfo& info);
-// "1", "true", "yes" (any case) switch the hypervisor-kernel host type on.
+// "1", "true", "yes" (any case) switch the hypervisor-kernel host type on; the
+// same texts of ORV_LINUX_ETHTOOL_NETLINK send ethtool queries to netlink first.
 bool parseHostTypeSetting(const char* value);
 
 class LinuxBackend final : public orv::platform::Backend {
 public:
-    LinuxBackend(LinuxRoots roots, std::string fileRoot, bool hypervisorKernel);
+    // `ethtoolNetlink`: ask ethtool netlink before the ioctls.
+    LinuxBackend(LinuxRoots roots, std::string fileRoot, bool hypervisorKernel, bool ethtoolNetlink = false);
     const char* name() const override { return "linux"; }
     void beginBatch() override { ksi_.invalidate(); }
     orv::platform::NetworkBackend& network() override { return network_; }
     orv::platform::KsiBackend& ksi() override { return ksi_; }
     orv::platform::VersionBackend& version() override { return version_; }
     orv::platform::HostBackend& host() override { return host_; }
+    orv::platform::HealthBackend* health() override { return &health_; }
 
 private:
     LinuxNetwork network_;
+    LinuxHealth health_;
     LinuxKsi ksi_;
     LinuxVersion version_;
     LinuxHost host_;

@@ -1,25 +1,37 @@
+#include "bus_device.hpp"
 #include "linux_backend.hpp"
+#include "linux_call_error.hpp"
 #include "linux_pnic.hpp"
-#include "sysfs_net.hpp"
 
 #include "nodemgr/lib/NodeMgrException.h"
 
 namespace orv::linuxhost {
 
 LinuxNetwork::LinuxNetwork(std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
-                           std::shared_ptr<EthtoolNetlinkChannel> netlink)
-    : sysRoot_(std::move(sysRoot)),
-      channel_(std::move(channel)),
-      netlink_(std::move(netlink)),
-      route_(std::make_shared<RouteStatistics>())
+                           std::shared_ptr<EthtoolNetlinkChannel> netlink, bool kernelNamesParents)
+    : kernel_(std::move(channel), std::move(netlink), std::make_shared<RouteLinks>(), std::move(sysRoot)),
+      kernelNamesParents_(kernelNamesParents)
 {
+}
+
+bool LinuxNetwork::isNic(LinkRecord& link) const
+{
+    return recognizeNic(link, *kernel_.ethtool, kernelNamesParents_);
 }
 
 std::vector<NodeMgr::Network::Pnic*> LinuxNetwork::getPnics()
 {
     std::vector<NodeMgr::Network::Pnic*> pnics;
     try {
-        for (const auto& name : SysfsNet(sysRoot_).busDevices()) pnics.push_back(new LinuxPnic(name, sysRoot_, channel_, netlink_, route_));
+        auto pci = std::make_shared<PciIdentities>(kernel_.sysRoot);
+        for (auto& link : kernel_.route->all()) {
+            if (!isNic(link)) continue;
+            std::string name = link.name;
+            pnics.push_back(new LinuxPnic(std::move(name), kernel_, std::move(link), pci));
+        }
+    } catch (const LinuxCallError& error) {
+        for (auto* pnic : pnics) delete pnic;
+        throw NodeMgr::Lib::NodeMgrException(std::string("GetPnics failed: ") + error.what());
     } catch (...) {
         for (auto* pnic : pnics) delete pnic;
         throw;
@@ -29,9 +41,15 @@ std::vector<NodeMgr::Network::Pnic*> LinuxNetwork::getPnics()
 
 NodeMgr::Network::Pnic* LinuxNetwork::getPnicByName(const std::string& name)
 {
-    if (name.empty() || name.find('/') != std::string::npos || name == "." || name == "..") return nullptr;
-    if (!SysfsNet(sysRoot_).hasBusDevice(name)) return nullptr;
-    return new LinuxPnic(name, sysRoot_, channel_, netlink_, route_);
+    std::optional<LinkRecord> link;
+    try {
+        link = kernel_.route->named(name);
+        if (!isNic(*link)) return nullptr;
+    } catch (const LinuxCallError& error) {
+        if (error.vanished()) return nullptr;  // no such interface
+        throw NodeMgr::Lib::NodeMgrException("GetPnicByName failed for " + name + ": " + error.what());
+    }
+    return new LinuxPnic(name, kernel_, std::move(link));
 }
 
 }  // namespace orv::linuxhost

@@ -1,14 +1,12 @@
 #include "linux_pnic.hpp"
 
 #include "link_modes.hpp"
-#include "link_statistics.hpp"
-#include "linux_call_error.hpp"
 #include "pnic_records.hpp"
 
 #include "nodemgr/lib/NodeMgrException.h"
 
-#include <linux/netlink.h>
-#include <net/if.h>
+#include <cerrno>
+#include <linux/if.h>
 #include <ostream>
 
 namespace orv::linuxhost {
@@ -16,14 +14,12 @@ namespace orv::linuxhost {
 namespace NN = NodeMgr::Network;
 using NodeMgr::Lib::NodeMgrException;
 
-LinuxPnic::LinuxPnic(std::string name, std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
-                     std::shared_ptr<EthtoolNetlinkChannel> netlink, std::shared_ptr<RouteStatistics> route)
-    : name_(std::move(name)),
-      sysfs_(std::move(sysRoot)),
-      channel_(std::move(channel)),
-      netlink_(std::move(netlink)),
-      route_(route ? std::move(route) : std::make_shared<RouteStatistics>())
+LinuxPnic::LinuxPnic(std::string name, NicKernel kernel, std::optional<LinkRecord> link,
+                     std::shared_ptr<PciIdentities> pci)
+    : name_(std::move(name)), kernel_(std::move(kernel)), pciIdentities_(std::move(pci)), link_(std::move(link))
 {
+    if (!kernel_.route) kernel_.route = std::make_shared<RouteLinks>();
+    if (!pciIdentities_) pciIdentities_ = std::make_shared<PciIdentities>(kernel_.sysRoot);
 }
 
 template <typename Operation>
@@ -41,25 +37,68 @@ void LinuxPnic::refuse(const char* operation) const
     throw NodeMgrException(std::string(operation) + " is not available for " + name_ + " on this host");
 }
 
+const LinkRecord& LinuxPnic::link() const
+{
+    if (!link_) link_ = kernel_.route->named(name_);
+    return *link_;
+}
+
+const rtnl_link_stats64& LinuxPnic::statistics() const
+{
+    if (!link().statistics) throw LinuxCallError("RTM_GETLINK", name_, ENODATA);
+    return *link().statistics;
+}
+
 bool LinuxPnic::linkUp() const
 {
-    const bool up = sysfs_.numberAttribute(name_, "flags") & IFF_UP;
-    return up && sysfs_.carrier(name_).value_or(false);
+    return administrativelyUp() && link().carrier.value_or(false);
+}
+
+const LinkSettings& LinuxPnic::settings() const
+{
+    if (settingsError_) throw *settingsError_;
+    if (!settings_) {
+        try {
+            settings_ = ethtool().linkSettings();
+        } catch (const LinuxCallError& error) {
+            settingsError_ = error;
+            throw;
+        }
+    }
+    return *settings_;
+}
+
+const LinkSettings* LinuxPnic::settingsIfSupported() const
+{
+    try {
+        return &settings();
+    } catch (const LinuxCallError& error) {
+        if (!error.unsupported()) throw;
+        return nullptr;
+    }
+}
+
+const ethtool_drvinfo& LinuxPnic::driverInfo() const
+{
+    if (!driver_) driver_ = ethtool().driverInfo();
+    return *driver_;
 }
 
 std::optional<ethtool_wolinfo> LinuxPnic::wakeOnLan() const
 {
-    if (wol_) return *wol_;
-    try {
-        wol_ = ethtool().wakeOnLan();
-    } catch (const LinuxCallError& error) {
-        if (!error.unsupported()) throw;
-        wol_ = std::optional<ethtool_wolinfo>();
-    }
+    if (!wol_) wol_ = ethtool().wakeOnLan();
     return *wol_;
 }
 
-void LinuxPnic::Refresh() { wol_.reset(); }
+void LinuxPnic::Refresh()
+{
+    link_.reset();
+    settings_.reset();
+    settingsError_.reset();
+    driver_.reset();
+    pci_.reset();
+    wol_.reset();
+}
 void LinuxPnic::SaveConfig() { refuse("SaveConfig"); }
 void LinuxPnic::LoadConfig() { refuse("LoadConfig"); }
 
@@ -75,17 +114,22 @@ std::vector<NodeMgr::Lib::NodeMgrObject*> LinuxPnic::GetChildren() const { retur
 NN::PciDevice* LinuxPnic::GetPciDevice() const
 {
     if (!pci_) {
-        auto info = sysfs_.pciDevice(name_);
-        if (info) pci_ = std::make_unique<LinuxPciDevice>(*info);
+        std::optional<PciDeviceInfo> info;
+        try {
+            info = pciIdentities_->of(driverInfo().bus_info);
+        } catch (const LinuxCallError&) {
+            // no driver info (the NIC vanished): no bus address to follow
+        }
+        pci_ = info ? std::make_unique<LinuxPciDevice>(*info) : nullptr;
     }
-    return pci_.get();
+    return pci_->get();
 }
 
 NN::Duplex LinuxPnic::GetConfiguredDuplex() const
 {
     return guarded("GetConfiguredDuplex", [&] {
-        auto settings = ethtool().linkSettings();
-        return settings.autoneg == AUTONEG_ENABLE ? NN::DUPLEX_MODE_AUTO : toDuplex(settings.duplex);
+        const auto& current = settings();
+        return current.autoneg == AUTONEG_ENABLE ? NN::DUPLEX_MODE_AUTO : toDuplex(current.duplex);
     });
 }
 
@@ -93,8 +137,8 @@ NN::Duplex LinuxPnic::GetDuplex() const
 {
     return guarded("GetDuplex", [&] {
         if (!linkUp()) return NN::DUPLEX_MODE_AUTO;  // drivers keep the last speed and duplex after the link drops
-        auto duplex = sysfs_.duplex(name_);
-        return duplex == "full" ? NN::DUPLEX_MODE_FULL : duplex == "half" ? NN::DUPLEX_MODE_HALF : NN::DUPLEX_MODE_AUTO;
+        const LinkSettings* current = settingsIfSupported();
+        return current ? toDuplex(current->duplex) : NN::DUPLEX_MODE_AUTO;
     });
 }
 
@@ -105,24 +149,24 @@ bool LinuxPnic::IsLinkUp() const
 
 bool LinuxPnic::IsOperationalLinkUp() const
 {
-    return guarded("IsOperationalLinkUp", [&] { return attributes().operstate == "up"; });
+    return guarded("IsOperationalLinkUp", [&] { return link().operstate == IF_OPER_UP; });
 }
 
 bool LinuxPnic::IsAdministrativeLinkUp() const
 {
-    return guarded("IsAdministrativeLinkUp", [&] { return (sysfs_.numberAttribute(name_, "flags") & IFF_UP) != 0; });
+    return guarded("IsAdministrativeLinkUp", [&] { return administrativelyUp(); });
 }
 
 bool LinuxPnic::IsEnabled() const
 {
-    return guarded("IsEnabled", [&] { return (sysfs_.numberAttribute(name_, "flags") & IFF_UP) != 0; });
+    return guarded("IsEnabled", [&] { return administrativelyUp(); });
 }
 
 NN::LinkSpeed LinuxPnic::GetConfiguredLinkSpeed() const
 {
     return guarded("GetConfiguredLinkSpeed", [&] {
-        auto settings = ethtool().linkSettings();
-        return settings.autoneg == AUTONEG_ENABLE ? NN::CONNECTION_AUTO : toLinkSpeed(settings.speed);
+        const auto& current = settings();
+        return current.autoneg == AUTONEG_ENABLE ? NN::CONNECTION_AUTO : toLinkSpeed(current.speed);
     });
 }
 
@@ -130,8 +174,8 @@ NN::LinkSpeed LinuxPnic::GetLinkSpeed() const
 {
     return guarded("GetLinkSpeed", [&] {
         if (!linkUp()) return NN::CONNECTION_AUTO;
-        auto speed = sysfs_.speed(name_).value_or(-1);
-        return speed > 0 ? toLinkSpeed(static_cast<std::uint32_t>(speed)) : NN::CONNECTION_AUTO;
+        const LinkSettings* current = settingsIfSupported();
+        return current ? toLinkSpeed(current->speed) : NN::CONNECTION_AUTO;
     });
 }
 
@@ -141,17 +185,17 @@ uint32_t LinuxPnic::GetHardwareCapabilities() const { return 0; }
 
 std::string LinuxPnic::GetDriverName() const
 {
-    return guarded("GetDriverName", [&] { return toDriverInfo(ethtool().driverInfo()).name; });
+    return guarded("GetDriverName", [&] { return toDriverInfo(driverInfo()).name; });
 }
 
 std::vector<NN::LinkMode> LinuxPnic::GetSupportedModes() const
 {
-    return guarded("GetSupportedModes", [&] { return toLinkModes(ethtool().linkSettings().supported); });
+    return guarded("GetSupportedModes", [&] { return toLinkModes(settings().supported); });
 }
 
 NN::PnicPortMode LinuxPnic::GetPort() const
 {
-    return guarded("GetPort", [&] { return static_cast<NN::PnicPortMode>(recordPort(ethtool().linkSettings().port)); });
+    return guarded("GetPort", [&] { return static_cast<NN::PnicPortMode>(recordPort(settings().port)); });
 }
 
 std::string LinuxPnic::GetHint() const { return {}; }
@@ -165,20 +209,14 @@ NN::MacAddress LinuxPnic::GetMacAddress() const
         } catch (const LinuxCallError& error) {
             if (!error.unsupported()) throw;
         }
-        if (permanent.size() == 6) {
-            std::array<unsigned char, 6> bytes{};
-            std::copy(permanent.begin(), permanent.end(), bytes.begin());
-            return NN::MacAddress(bytes);
-        }
-        return GetVirtualMacAddress();
+        return toMacAddress(permanent.size() == 6 ? permanent : link().address);
     });
 }
 
 NN::MacAddress LinuxPnic::GetVirtualMacAddress() const
 {
     return guarded("GetVirtualMacAddress", [&] {
-        auto bytes = parseMac(attributes().address);
-        return bytes ? NN::MacAddress(*bytes) : NN::MacAddress();
+        return toMacAddress(link().address);
     });
 }
 
@@ -210,7 +248,7 @@ void LinuxPnic::GetLldpInfo(NN::PnicDiscoveryInfo& info) const { info.fields.cle
 
 uint32_t LinuxPnic::GetMTU() const
 {
-    return guarded("GetMTU", [&] { return static_cast<uint32_t>(sysfs_.numberAttribute(name_, "mtu")); });
+    return guarded("GetMTU", [&] { return link().mtu; });
 }
 
 bool LinuxPnic::IsPseudoDevice() const { return false; }
@@ -218,22 +256,22 @@ bool LinuxPnic::IsPseudoDevice() const { return false; }
 void LinuxPnic::GetSourcePortStats(NN::PnicSourcePortStats& stats) const
 {
     guarded("GetSourcePortStats", [&] {
-        auto link = route_->read(name_);
-        stats = NN::PnicSourcePortStats{link.tx_packets, link.rx_packets, link.tx_bytes, link.rx_bytes};
+        const auto& counters = statistics();
+        stats = NN::PnicSourcePortStats{counters.tx_packets, counters.rx_packets, counters.tx_bytes, counters.rx_bytes};
     });
 }
 
 void LinuxPnic::GetPnicStats(NN::PnicStats& stats) const
 {
     guarded("GetPnicStats", [&] {
-        auto link = route_->read(name_);
+        const auto& counters = statistics();
         std::vector<DriverStatistic> driver;
         try {
             driver = ethtool().driverStatistics();
         } catch (const LinuxCallError& error) {
             if (!error.unsupported()) throw;
         }
-        stats = toStats(link, driver);
+        stats = toStats(counters, driver);
     });
 }
 
@@ -251,32 +289,18 @@ void LinuxPnic::GetPnicInfo(NN::PnicInfo& info) const
 {
     guarded("GetPnicInfo", [&] {
         const bool up = linkUp();
-        EthtoolReader reader = ethtool();
-        fillLinkPart(info, reader.linkSettings(), up);
+        fillLinkPart(info, settings(), up);
         fillWakeOnPart(info, wakeOnLan());
-        std::optional<std::uint32_t> level;
-        try {
-            level = reader.messageLevel();
-        } catch (const LinuxCallError& error) {
-            if (!error.unsupported()) throw;
-        }
-        fillMessageLevel(info, level);
-        info.viraddr = attributes().address;
+        fillMessageLevel(info, ethtool().messageLevel());
+        info.viraddr = addressText(link().address);
     });
 }
 
 void LinuxPnic::GetPnicPauseInfo(NN::PnicPauseInfo& info) const
 {
     guarded("GetPnicPauseInfo", [&] {
-        EthtoolReader reader = ethtool();
-        auto pause = reader.pause();
-        std::optional<LinkSettings> settings;
-        try {
-            settings = reader.linkSettings();
-        } catch (const LinuxCallError& error) {
-            if (!error.unsupported()) throw;
-        }
-        info = toPauseInfo(pause, settings ? &*settings : nullptr);
+        auto pause = ethtool().pause();
+        info = toPauseInfo(pause, settingsIfSupported());
     });
 }
 
@@ -302,7 +326,7 @@ void LinuxPnic::GetPnicSoftwareSimulationInfo(NN::PnicSoftwareSimulationInfo& in
 
 void LinuxPnic::GetPnicDriverInfo(NN::PnicDriverInfo& info) const
 {
-    guarded("GetPnicDriverInfo", [&] { info = toDriverInfo(ethtool().driverInfo()); });
+    guarded("GetPnicDriverInfo", [&] { info = toDriverInfo(driverInfo()); });
 }
 
 void LinuxPnic::SetPnicInfo(const NN::PnicInfo&) { refuse("SetPnicInfo"); }

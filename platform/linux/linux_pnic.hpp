@@ -1,18 +1,22 @@
 // One physical NIC of the running machine behind the NIC library's Pnic
-// interface. A pnic object lives for one request: every operation asks the
-// kernel afresh, except wake-on-LAN and the PCI identity, read once per object
-// (a port instance asks wake-on-LAN three times). A kernel refusal (the NIC
-// vanished, the driver does not implement the query) fails that operation
-// alone with NodeMgrException.
+// interface. A pnic object lives for one request and is that request's
+// snapshot of the NIC: its link (one rtnetlink answer: flags, MTU, state,
+// address, counters), link settings, driver info, wake-on-LAN and PCI identity
+// are each read at most once per object, when first needed (or handed over by
+// the listing that made it); Refresh() reads them afresh. The other records
+// are asked when called. A kernel refusal (the NIC vanished, the driver does
+// not implement the query) fails that operation alone with NodeMgrException.
 #pragma once
 
 #include "ethtool_reader.hpp"
-#include "link_statistics.hpp"
-#include "sysfs_net.hpp"
+#include "linux_call_error.hpp"
+#include "pci_identity.hpp"
+#include "rtnetlink_links.hpp"
 
 #include "nodemgr/network/Pnic.h"
 
 #include <memory>
+#include <net/if.h>
 #include <optional>
 #include <string>
 
@@ -32,11 +36,31 @@ private:
     PciDeviceInfo info_;
 };
 
+// The kernel paths the NICs of a backend share, all of the namespace the
+// backend was made in: the ethtool ioctl socket, the ethtool netlink channel
+// (null: the ioctls answer everything), the rtnetlink socket, and the sysfs
+// root the PCI identity files are read under.
+struct NicKernel {
+    explicit NicKernel(std::shared_ptr<EthtoolChannel> ethtoolChannel,
+                       std::shared_ptr<EthtoolNetlinkChannel> netlinkChannel = nullptr,
+                       std::shared_ptr<RouteLinks> routeLinks = nullptr, std::string sys = "/sys")
+        : ethtool(std::move(ethtoolChannel)), netlink(std::move(netlinkChannel)), route(std::move(routeLinks)),
+          sysRoot(std::move(sys))
+    {
+    }
+
+    std::shared_ptr<EthtoolChannel> ethtool;
+    std::shared_ptr<EthtoolNetlinkChannel> netlink;
+    std::shared_ptr<RouteLinks> route;  // null: the pnic opens one of its own
+    std::string sysRoot = "/sys";
+};
+
 class LinuxPnic final : public NodeMgr::Network::Pnic {
 public:
-    // Without a shared rtnetlink socket the pnic opens one of its own.
-    LinuxPnic(std::string name, std::string sysRoot, std::shared_ptr<EthtoolChannel> channel,
-              std::shared_ptr<EthtoolNetlinkChannel> netlink = nullptr, std::shared_ptr<RouteStatistics> route = nullptr);
+    // `link` is the listing's answer for the NIC; without it the link is asked
+    // by name when first needed. `pci` holds the identities of the listing.
+    LinuxPnic(std::string name, NicKernel kernel, std::optional<LinkRecord> link = std::nullopt,
+              std::shared_ptr<PciIdentities> pci = nullptr);
 
     void Refresh() override;
     void SaveConfig() override;
@@ -103,17 +127,25 @@ private:
     template <typename Operation>
     auto guarded(const char* operation, Operation&& body) const -> decltype(body());
     [[noreturn]] void refuse(const char* operation) const;
-    EthtoolReader ethtool() const { return EthtoolReader(*channel_, name_, netlink_.get()); }
-    SysfsLinkAttributes attributes() const { return sysfs_.linkAttributes(name_); }
+    EthtoolReader ethtool() const { return EthtoolReader(*kernel_.ethtool, name_, kernel_.netlink.get()); }
+    const LinkRecord& link() const;
+    const rtnl_link_stats64& statistics() const;
+    bool administrativelyUp() const { return (link().flags & IFF_UP) != 0; }
     bool linkUp() const;
+    const LinkSettings& settings() const;
+    // Link settings, or nothing when the driver does not implement them.
+    const LinkSettings* settingsIfSupported() const;
+    const ethtool_drvinfo& driverInfo() const;
     std::optional<ethtool_wolinfo> wakeOnLan() const;
 
     std::string name_;
-    SysfsNet sysfs_;
-    std::shared_ptr<EthtoolChannel> channel_;
-    std::shared_ptr<EthtoolNetlinkChannel> netlink_;
-    std::shared_ptr<RouteStatistics> route_;
-    mutable std::unique_ptr<LinuxPciDevice> pci_;
+    NicKernel kernel_;
+    std::shared_ptr<PciIdentities> pciIdentities_;
+    mutable std::optional<LinkRecord> link_;
+    mutable std::optional<LinkSettings> settings_;
+    mutable std::optional<LinuxCallError> settingsError_;  // the refusal of the settings, kept like an answer
+    mutable std::optional<ethtool_drvinfo> driver_;
+    mutable std::optional<std::unique_ptr<LinuxPciDevice>> pci_;  // outer: looked up yet; null: not on PCI
     mutable std::optional<std::optional<ethtool_wolinfo>> wol_;  // outer: asked yet; inner: supported
 };
 

@@ -35,17 +35,28 @@ NetlinkSocket::~NetlinkSocket() { mnl_socket_close(socket_); }
 
 int NetlinkSocket::transact(nlmsghdr* request, std::vector<NetlinkMessage>& answers)
 {
-    request->nlmsg_flags |= NLM_F_ACK;
+    return exchange(request, answers, true);
+}
+
+int NetlinkSocket::ask(nlmsghdr* request, std::vector<NetlinkMessage>& answers)
+{
+    return exchange(request, answers, false);
+}
+
+int NetlinkSocket::exchange(nlmsghdr* request, std::vector<NetlinkMessage>& answers, bool untilAcknowledged)
+{
+    if (untilAcknowledged) request->nlmsg_flags |= NLM_F_ACK;
     request->nlmsg_seq = nextSequence();
     if (mnl_socket_sendto(socket_, request, request->nlmsg_len) < 0) return errno;
     std::vector<char> buffer(32768);
     for (;;) {
         ssize_t received = mnl_socket_recvfrom(socket_, buffer.data(), buffer.size());
         if (received < 0) return errno;
+        errno = 0;
         int status = mnl_cb_run(buffer.data(), static_cast<std::size_t>(received), request->nlmsg_seq, portId_,
                                 keepMessage, &answers);
         if (status < 0) return errno ? errno : EPROTO;
-        if (status == MNL_CB_STOP) return 0;
+        if (status == MNL_CB_STOP || (!untilAcknowledged && !answers.empty())) return 0;
     }
 }
 

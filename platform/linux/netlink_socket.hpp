@@ -20,9 +20,14 @@ public:
     // Sends the request (an acknowledgement is asked for) and collects every answer
     // message until the acknowledgement or the end of a dump. Returns 0 or errno.
     int transact(nlmsghdr* request, std::vector<NetlinkMessage>& answers);
+    // A request that the kernel answers with one message (a get that is no
+    // dump): no acknowledgement is asked for, the first answer ends it.
+    int ask(nlmsghdr* request, std::vector<NetlinkMessage>& answers);
     std::uint32_t nextSequence() { return ++sequence_; }
 
 private:
+    int exchange(nlmsghdr* request, std::vector<NetlinkMessage>& answers, bool untilAcknowledged);
+
     mnl_socket* socket_;
     std::uint32_t portId_;
     std::uint32_t sequence_;

@@ -215,17 +215,12 @@ NN::PnicStats toStats(const rtnl_link_stats64& link, const std::vector<DriverSta
     return s;
 }
 
-std::optional<std::array<unsigned char, 6>> parseMac(const std::string& text)
+NN::MacAddress toMacAddress(const std::vector<std::uint8_t>& bytes)
 {
-    std::array<unsigned int, 6> parts{};
-    char extra = 0;
-    if (std::sscanf(text.c_str(), "%2x:%2x:%2x:%2x:%2x:%2x%c", &parts[0], &parts[1], &parts[2], &parts[3], &parts[4],
-                    &parts[5], &extra) != 6) {
-        return std::nullopt;
-    }
-    std::array<unsigned char, 6> bytes{};
-    for (std::size_t i = 0; i < 6; ++i) bytes[i] = static_cast<unsigned char>(parts[i]);
-    return bytes;
+    if (bytes.size() != 6) return NN::MacAddress();
+    std::array<unsigned char, 6> address{};
+    std::copy(bytes.begin(), bytes.end(), address.begin());
+    return NN::MacAddress(address);
 }
 
 }  // namespace orv::linuxhost

@@ -4,6 +4,7 @@
 
 #include "ethtool_reader.hpp"
 
+#include "nodemgr/network/MacAddress.h"
 #include "nodemgr/network/PnicRecords.h"
 
 #include <array>
@@ -35,7 +36,7 @@ void toRingInfo(const ethtool_ringparam& rings, NodeMgr::Network::PnicRingInfo& 
 // Interface counters first; counters rtnetlink does not keep come from the
 // driver's statistics by name (see README).
 NodeMgr::Network::PnicStats toStats(const rtnl_link_stats64& link, const std::vector<DriverStatistic>& driver);
-// "aa:bb:cc:dd:ee:ff" -> 6 bytes; nothing on other text.
-std::optional<std::array<unsigned char, 6>> parseMac(const std::string& text);
+// Six address bytes as a MAC address; an empty address for any other length.
+NodeMgr::Network::MacAddress toMacAddress(const std::vector<std::uint8_t>& bytes);
 
 }  // namespace orv::linuxhost

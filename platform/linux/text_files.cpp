@@ -97,4 +97,19 @@ std::optional<std::int64_t> readSignedNumber(const std::string& path)
     return negative ? -value : value;
 }
 
+std::optional<std::uint64_t> readAttributeNumber(const std::string& path)
+{
+    int fd = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
+    if (fd < 0) return std::nullopt;
+    char buffer[4096];
+    ssize_t n;
+    do {
+        n = ::read(fd, buffer, sizeof buffer);
+    } while (n < 0 && errno == EINTR);
+    ::close(fd);
+    if (n <= 0) return std::nullopt;
+    std::string_view text(buffer, static_cast<std::size_t>(n));
+    return parseNumber(text.substr(0, text.find('\n')));
+}
+
 }  // namespace orv::linuxhost

@@ -87,7 +87,7 @@ TEST_F(MethodEncoderTest, OutputArgumentsInProviderOrderWithArraysNullElementsAn
               "<PARAMVALUE NAME=\"Target\" PARAMTYPE=\"reference\"><VALUE.REFERENCE><LOCALINSTANCEPATH>"
               "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"></NAMESPACE><NAMESPACE NAME=\"cimv2\"></NAMESPACE>"
               "</LOCALNAMESPACEPATH><INSTANCENAME CLASSNAME=\"Raw_Element\"><KEYBINDING NAME=\"Name\">"
-              "<KEYVALUE VALUETYPE=\"string\">e1</KEYVALUE></KEYBINDING></INSTANCENAME></LOCALINSTANCEPATH>"
+              "<KEYVALUE VALUETYPE=\"string\" TYPE=\"string\">e1</KEYVALUE></KEYBINDING></INSTANCENAME></LOCALINSTANCEPATH>"
               "</VALUE.REFERENCE></PARAMVALUE>"
               "<PARAMVALUE NAME=\"Why\" PARAMTYPE=\"string\"><VALUE>a&lt;b</VALUE></PARAMVALUE>"
               "<PARAMVALUE NAME=\"Nothing\" PARAMTYPE=\"string\"></PARAMVALUE>");

@@ -77,6 +77,48 @@ TEST(RequestParser, ReadsInstanceWithArrayNullElementsAndNullProperty) {
     EXPECT_FALSE(instance.properties[1].value);
 }
 
+TEST(RequestParser, ReadsClassAndQualifierDeclarationParameters) {
+    const CimRequest request = parseRequest(call(
+        "<IPARAMVALUE NAME=\"NewClass\"><CLASS NAME=\"X_New\" SUPERCLASS=\"X_Base\"><PROPERTY NAME=\"P\" "
+        "TYPE=\"uint8\"/><METHOD NAME=\"M\"/></CLASS></IPARAMVALUE>"
+        "<IPARAMVALUE NAME=\"QualifierDeclaration\"><QUALIFIER.DECLARATION NAME=\"Q\" TYPE=\"string\" "
+        "ISARRAY=\"true\"><SCOPE CLASS=\"true\"/></QUALIFIER.DECLARATION></IPARAMVALUE>",
+        "CreateClass"));
+    const auto& cls = std::get<ClassParam>(*request.param("NewClass"));
+    EXPECT_EQ(cls.name, "X_New");
+    EXPECT_EQ(cls.superClass, "X_Base");
+    const auto& declaration = std::get<QualifierDeclarationParam>(*request.param("QualifierDeclaration"));
+    EXPECT_EQ(declaration.name, "Q");
+    EXPECT_EQ(declaration.type, "string");
+    EXPECT_TRUE(declaration.isArray);
+}
+
+TEST(RequestParser, ReadsReferenceArraysWithNullElements) {
+    const CimRequest request = parseRequest(call(
+        "<IPARAMVALUE NAME=\"Refs\"><VALUE.REFARRAY><VALUE.NULL/><VALUE.REFERENCE><INSTANCENAME CLASSNAME=\"X\">"
+        "<KEYBINDING NAME=\"K\"><KEYVALUE>v</KEYVALUE></KEYBINDING></INSTANCENAME></VALUE.REFERENCE>"
+        "</VALUE.REFARRAY></IPARAMVALUE>"));
+    const auto& refs = std::get<RefArrayParam>(*request.param("Refs"));
+    ASSERT_EQ(refs.items.size(), 2U);
+    EXPECT_FALSE(refs.items[0].has_value());
+    ASSERT_TRUE(refs.items[1].has_value());
+    EXPECT_EQ(refs.items[1]->className, "X");
+    EXPECT_EQ(refs.items[1]->keys.at(0).value, "v");
+}
+
+TEST(RequestParser, MisshapenClassQualifierAndReferenceArrayAreNotValid) {
+    EXPECT_EQ(failureKind(call("<IPARAMVALUE NAME=\"C\"><CLASS/></IPARAMVALUE>")), ProtocolError::Kind::NotValid);
+    EXPECT_EQ(failureKind(call("<IPARAMVALUE NAME=\"C\"><CLASS NAME=\"X\"><VALUE/></CLASS></IPARAMVALUE>")),
+              ProtocolError::Kind::NotValid);
+    EXPECT_EQ(failureKind(call("<IPARAMVALUE NAME=\"Q\"><QUALIFIER.DECLARATION NAME=\"Q\"/></IPARAMVALUE>")),
+              ProtocolError::Kind::NotValid);
+    EXPECT_EQ(failureKind(call("<IPARAMVALUE NAME=\"Q\"><QUALIFIER.DECLARATION NAME=\"Q\" TYPE=\"string\" "
+                               "ISARRAY=\"maybe\"/></IPARAMVALUE>")),
+              ProtocolError::Kind::NotValid);
+    EXPECT_EQ(failureKind(call("<IPARAMVALUE NAME=\"R\"><VALUE.REFARRAY><VALUE>x</VALUE></VALUE.REFARRAY></IPARAMVALUE>")),
+              ProtocolError::Kind::NotValid);
+}
+
 TEST(RequestParser, NotWellFormedXmlIsReported) {
     EXPECT_EQ(failureKind("<CIM"), ProtocolError::Kind::NotWellFormed);
 }

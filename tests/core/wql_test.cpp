@@ -46,6 +46,18 @@ TEST_F(WqlTest, AndBindsTighterThanOrAndParenthesesRegroup) {
                         inst));
 }
 
+TEST_F(WqlTest, LiteralBeforeThePropertyComparesTheOtherWayRound) {
+    CMPIInstance* inst = element();
+    setUint(inst, "Counter", 5);
+    setText(inst, "Text", "m");
+    EXPECT_TRUE(matches("SELECT * FROM Raw_Element WHERE 3 < Counter", inst));
+    EXPECT_FALSE(matches("SELECT * FROM Raw_Element WHERE 5 > Counter", inst));
+    EXPECT_TRUE(matches("SELECT * FROM Raw_Element WHERE 5 >= Counter AND 5 <= Counter AND 5 = Counter", inst));
+    EXPECT_TRUE(matches("SELECT * FROM Raw_Element WHERE 'z' > Text AND NOT 'a' > Text", inst));
+    EXPECT_THROW(WqlQuery::parse("SELECT * FROM Raw_Element WHERE 'm%' LIKE Text"), WqlError);
+    EXPECT_THROW(WqlQuery::parse("SELECT * FROM Raw_Element WHERE 3 < 4"), WqlError);
+}
+
 TEST_F(WqlTest, NotNegatesComparisonsGroupsAndNullTests) {
     CMPIInstance* inst = element();
     setUint(inst, "Counter", 5);

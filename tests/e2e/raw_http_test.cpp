@@ -403,5 +403,42 @@ TEST_F(RawHttpTest, MalformedHttpRequestLineAnswers400) {
     EXPECT_EQ(std::string(buffer).substr(0, 12), "HTTP/1.1 400");
 }
 
+TEST_F(RawHttpTest, CreateClassWithAClassParameterAnswersCimErrNotSupported) {
+    const std::string params =
+        "<IPARAMVALUE NAME=\"NewClass\"><CLASS NAME=\"Raw_New\" SUPERCLASS=\"Raw_Base\"><PROPERTY NAME=\"Size\" "
+        "TYPE=\"uint32\"/></CLASS></IPARAMVALUE>";
+    auto result = post(requestWith(params, "CreateClass"), headers("CreateClass"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 200);
+    EXPECT_NE(result->body.find("<ERROR CODE=\"7\" DESCRIPTION=\"operation CreateClass is not supported\""),
+              std::string::npos)
+        << result->body;
+}
+
+TEST_F(RawHttpTest, SetQualifierWithADeclarationAnswersCimErrNotSupported) {
+    const std::string params =
+        "<IPARAMVALUE NAME=\"QualifierDeclaration\"><QUALIFIER.DECLARATION NAME=\"Colour\" TYPE=\"string\">"
+        "<SCOPE CLASS=\"true\"/><VALUE>blue</VALUE></QUALIFIER.DECLARATION></IPARAMVALUE>";
+    auto result = post(requestWith(params, "SetQualifier"), headers("SetQualifier"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 200);
+    EXPECT_NE(result->body.find("<ERROR CODE=\"7\""), std::string::npos) << result->body;
+}
+
+TEST_F(RawHttpTest, MethodCallWithAReferenceArrayReachesTheProvider) {
+    const std::string params =
+        "<PARAMVALUE NAME=\"Elements\" PARAMTYPE=\"reference\"><VALUE.REFARRAY><VALUE.REFERENCE>"
+        "<INSTANCENAME CLASSNAME=\"Raw_Element\"><KEYBINDING NAME=\"Name\"><KEYVALUE>a</KEYVALUE></KEYBINDING>"
+        "</INSTANCENAME></VALUE.REFERENCE><VALUE.REFERENCE><INSTANCENAME CLASSNAME=\"Raw_Element\"><KEYBINDING "
+        "NAME=\"Name\"><KEYVALUE>b</KEYVALUE></KEYBINDING></INSTANCENAME></VALUE.REFERENCE></VALUE.REFARRAY>"
+        "</PARAMVALUE>";
+    auto result = post(methodCall("JoinNames", params), headers("JoinNames", "root%2Fcimv2%3ARaw_Element"));
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->status, 200);
+    EXPECT_NE(result->body.find("<RETURNVALUE PARAMTYPE=\"string\"><VALUE>a,b</VALUE></RETURNVALUE>"),
+              std::string::npos)
+        << result->body;
+}
+
 }  // namespace
 }  // namespace orv::e2e

@@ -20,6 +20,18 @@ std::string trimmed(std::string text) {
     return text;
 }
 
+// `name`='the words' for the script's environment; nothing for an empty list.
+std::string environmentList(const char* name, const std::vector<std::string>& words) {
+    if (words.empty()) {
+        return "";
+    }
+    std::string value;
+    for (const std::string& word : words) {
+        value += (value.empty() ? "" : " ") + word;
+    }
+    return std::string(name) + "='" + value + "' ";
+}
+
 bool processAlive(const std::string& pidText) {
     const int pid = std::atoi(pidText.c_str());
     return pid > 0 && kill(pid, 0) == 0;
@@ -45,9 +57,14 @@ SfcbBroker::SfcbBroker(std::string runDir, bool owned) : runDir_(std::move(runDi
 
 SfcbBroker SfcbBroker::shared() { return SfcbBroker(buildDir() + "/sfcb/shared", false); }
 
-SfcbBroker SfcbBroker::start(const std::string& runDir, const std::string& fixture, const std::string& root) {
-    const std::string output = runCommand((root.empty() ? "" : "ORV_SFCB_ROOT='" + root + "' ") +
-                                          sfcbBrokerScript("start") + " '" + runDir + "' " +
+SfcbBroker SfcbBroker::start(const std::string& runDir, const std::string& fixture, const std::string& root,
+                              const SfcbStaging& staging) {
+    const std::string environment = (root.empty() ? "" : "ORV_SFCB_ROOT='" + root + "' ") +
+                                    environmentList("ORV_SFCB_EXTRA_LIBRARIES", staging.libraries) +
+                                    environmentList("ORV_SFCB_EXTRA_REGISTRATIONS", staging.registrations) +
+                                    environmentList("ORV_SFCB_EXTRA_MOFS", staging.mofs) +
+                                    environmentList("ORV_SFCB_SCHEMA_MOFS", staging.schemaMofs);
+    const std::string output = runCommand(environment + sfcbBrokerScript("start") + " '" + runDir + "' " +
                                           (fixture.empty() ? "" : "'" + fixture + "'"));
     SfcbBroker broker(runDir, true);
     if (!broker.available()) {

@@ -4,8 +4,20 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 namespace orv::e2e {
+
+// What a private sfcbd stages beside the project's library: further provider
+// libraries with their registration and class files, and the DMTF schema files
+// (relative to sfcb's schema folder) of classes a provider serves itself, which
+// sfcb keeps only when a staged file names them.
+struct SfcbStaging {
+    std::vector<std::string> libraries;
+    std::vector<std::string> registrations;
+    std::vector<std::string> mofs;
+    std::vector<std::string> schemaMofs;
+};
 
 class SfcbBroker {
 public:
@@ -14,8 +26,10 @@ public:
     static SfcbBroker shared();
     // Starts a private sfcbd in runDir on a free port, serving the simulated
     // host `fixture` (empty: the shipped example host), with ORV_ROOT=`root` in its
-    // environment (empty: tests/e2e/data/root); stopped by the destructor.
-    static SfcbBroker start(const std::string& runDir, const std::string& fixture = "", const std::string& root = "");
+    // environment (empty: tests/e2e/data/root), with `staging` beside the library;
+    // stopped by the destructor.
+    static SfcbBroker start(const std::string& runDir, const std::string& fixture = "", const std::string& root = "",
+                            const SfcbStaging& staging = {});
 
     ~SfcbBroker();
     SfcbBroker(SfcbBroker&& other) noexcept;

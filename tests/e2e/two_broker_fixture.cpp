@@ -21,14 +21,16 @@ std::string wbemcli(int port, const std::string& command, const std::string& obj
     return std::regex_replace(output, std::regex(where), "localhost:PORT");
 }
 
-std::unique_ptr<HostProcess> startOrvCimhost(const std::string& fixture) {
+std::unique_ptr<HostProcess> startOrvCimhost(const std::string& fixture, const std::vector<std::string>& extraArgs) {
     char host[256] = {};
     gethostname(host, sizeof host - 1);
     setenv("ORV_ROOT", (sourceDir() + "/tests/e2e/data/root").c_str(), 1);
-    auto process = std::make_unique<HostProcess>(std::vector<std::string>{
+    std::vector<std::string> args{
         "--provider-dir", buildDir() + "/lib", "--registration", sourceDir() + "/cim/mof/orvprovider.reg", "--mof",
         sourceDir() + "/cim/mof/orvprovider.mof", "--platform", "sim", "--fixture",
-        fixture.empty() ? sourceDir() + "/platform/sim/examples/host.json" : fixture, "--host-name", host});
+        fixture.empty() ? sourceDir() + "/platform/sim/examples/host.json" : fixture, "--host-name", host};
+    args.insert(args.end(), extraArgs.begin(), extraArgs.end());
+    auto process = std::make_unique<HostProcess>(args);
     unsetenv("ORV_ROOT");
     return process;
 }

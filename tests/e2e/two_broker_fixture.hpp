@@ -15,6 +15,7 @@
 
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "host_process.hpp"
 #include "orv/repository/class_repository.hpp"
@@ -29,8 +30,10 @@ std::string wbemcli(int port, const std::string& command, const std::string& obj
 
 // orv-cimhost serving the project's library as the shared sfcb does: the
 // shipped simulated host, the test alternate boot bank and this machine's
-// host name (sfcb names it in the paths of association answers).
-std::unique_ptr<HostProcess> startOrvCimhost(const std::string& fixture = "");
+// host name (sfcb names it in the paths of association answers); `extraArgs`
+// follow (more providers, --preload).
+std::unique_ptr<HostProcess> startOrvCimhost(const std::string& fixture = "",
+                                             const std::vector<std::string>& extraArgs = {});
 
 // True when a test must stop because `sfcb` is unavailable: it then skips
 // (GTEST_SKIP with sfcb.reason()) outside CI; with CI=true this also fails it.

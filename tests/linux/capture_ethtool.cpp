@@ -1,7 +1,7 @@
 // Captures what the kernel answers to the substitute's ethtool queries for one
 // interface, as replay files for the unit tests: capture_ethtool <ifname> <dir>.
 #include "ethtool_reader.hpp"
-#include "link_statistics.hpp"
+#include "rtnetlink_links.hpp"
 #include "linux_call_error.hpp"
 #include "support/ethtool_replay.hpp"
 

@@ -2,6 +2,7 @@
 // ip, ethtool, uname and /proc report.
 #include "linux_backend.hpp"
 #include "stack_params.hpp"
+#include "mac_text.hpp"
 #include "tool_output.hpp"
 
 #include "nodemgr/lib/NodeMgrException.h"
@@ -9,13 +10,16 @@
 #include "tmkctl/util/AutoVector.h"
 
 #include <arpa/inet.h>
+#include <atomic>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 #include <set>
 #include <sys/utsname.h>
+#include <thread>
 
 using namespace orv::linuxhost;
 using orv::linuxtest::fieldAfter;
+using orv::linuxtest::macText;
 using orv::linuxtest::stackParams;
 using orv::linuxtest::toolOutput;
 using json = nlohmann::json;
@@ -50,15 +54,6 @@ std::vector<std::string> pnicNames(orv::platform::Backend& backend)
 std::unique_ptr<NN::Pnic> pnicNamed(orv::platform::Backend& backend, const std::string& name)
 {
     return std::unique_ptr<NN::Pnic>(backend.network().getPnicByName(name));
-}
-
-std::string macText(const NN::MacAddress& mac)
-{
-    unsigned char bytes[6];
-    mac.GetBinaryAddress(bytes);
-    char text[18];
-    std::snprintf(text, sizeof text, "%02x:%02x:%02x:%02x:%02x:%02x", bytes[0], bytes[1], bytes[2], bytes[3], bytes[4], bytes[5]);
-    return text;
 }
 
 // Values of "key : value" lines of /proc/cpuinfo, in order.
@@ -194,8 +189,9 @@ TEST(Machine, NicStatisticsBetweenTwoReadingsOfIp)
 {
     auto backend = machine();
     for (const auto& name : pnicNames(*backend)) {
-        auto pnic = pnicNamed(*backend, name);
+        // The pnic is its request's snapshot: its counters are read when it is made.
         auto before = toolJson("ip -s -j link show dev " + name).at(0)["stats64"];
+        auto pnic = pnicNamed(*backend, name);
         NN::PnicStats stats;
         pnic->GetPnicStats(stats);
         auto after = toolJson("ip -s -j link show dev " + name).at(0)["stats64"];
@@ -371,4 +367,35 @@ TEST(Machine, OffloadsEqualEthtoolFeatures)
         EXPECT_EQ(info.largeReceive, isOn(*features, "large-receive-offload")) << name;
         EXPECT_EQ(info.udpFragmentation, isOn(*features, "udp-fragmentation-offload")) << name;
     }
+}
+
+TEST(Machine, ConcurrentNicRequestsShareTheBackendsSocketsAndAgree)
+{
+    auto backend = machine();
+    const auto expected = pnicNames(*backend);
+    ASSERT_FALSE(expected.empty());
+    std::atomic<unsigned> disagreements{0}, failures{0};
+    std::vector<std::thread> clients;
+    for (int client = 0; client < 4; ++client) {
+        clients.emplace_back([&] {
+            for (int request = 0; request < 50; ++request) {
+                if (pnicNames(*backend) != expected) ++disagreements;
+                for (const auto& name : expected) {
+                    try {
+                        auto pnic = pnicNamed(*backend, name);
+                        NN::PnicInfo info;
+                        NN::PnicStats stats;
+                        pnic->GetPnicInfo(info);
+                        pnic->GetPnicStats(stats);
+                        if (pnic->GetMTU() == 0 || pnic->GetPciDevice() == nullptr) ++disagreements;
+                    } catch (const NodeMgr::Lib::NodeMgrException&) {
+                        ++failures;
+                    }
+                }
+            }
+        });
+    }
+    for (auto& client : clients) client.join();
+    EXPECT_EQ(disagreements.load(), 0u);
+    EXPECT_EQ(failures.load(), 0u);
 }

@@ -89,7 +89,7 @@ protected:
         return texts;
     }
 
-    LinuxPnic outerPnic() { return LinuxPnic(outer_, "/sys", channel_); }
+    LinuxPnic outerPnic() { return LinuxPnic(outer_, NicKernel{channel_}); }
 
     std::string ns_, outer_, inner_;
     int home_ = -1;
@@ -197,15 +197,18 @@ TEST_F(VethNamespace, VethIsNoNicButAnswersItsLinkCalls)
     EXPECT_EQ(pnic.GetPciDevice(), nullptr);
 }
 
-TEST_F(VethNamespace, LinkDownAndUp)
+TEST_F(VethNamespace, LinkDownAndUpSeenAfterRefresh)
 {
     auto pnic = outerPnic();
     EXPECT_TRUE(pnic.IsEnabled());
     EXPECT_TRUE(pnic.IsLinkUp());
     ASSERT_TRUE(inside("ip link set " + inner_ + " down"));  // the peer going down drops the carrier
+    EXPECT_TRUE(pnic.IsLinkUp());  // the pnic is its request's snapshot
+    pnic.Refresh();
     EXPECT_TRUE(pnic.IsEnabled());
     EXPECT_FALSE(pnic.IsLinkUp());
     ASSERT_TRUE(runTool("ip link set " + outer_ + " down"));
+    pnic.Refresh();
     EXPECT_FALSE(pnic.IsEnabled());
     EXPECT_FALSE(pnic.IsAdministrativeLinkUp());
     NN::PnicInfo info;
@@ -213,15 +216,28 @@ TEST_F(VethNamespace, LinkDownAndUp)
     EXPECT_EQ(info.linkStatus, "Down");
     ASSERT_TRUE(runTool("ip link set " + outer_ + " up"));
     ASSERT_TRUE(inside("ip link set " + inner_ + " up"));
+    pnic.Refresh();
     EXPECT_TRUE(pnic.IsEnabled());
     EXPECT_TRUE(pnic.IsLinkUp());
 }
 
-TEST_F(VethNamespace, MtuChanged)
+TEST_F(VethNamespace, MtuChangedSeenByTheNextPnic)
 {
-    auto pnic = outerPnic();
-    EXPECT_EQ(pnic.GetMTU(), 1500u);
+    EXPECT_EQ(outerPnic().GetMTU(), 1500u);
     ASSERT_TRUE(runTool("ip link set " + outer_ + " mtu 1280"));
-    EXPECT_EQ(pnic.GetMTU(), 1280u);
+    EXPECT_EQ(outerPnic().GetMTU(), 1280u);
     EXPECT_EQ(toolOutput("cat /sys/class/net/" + outer_ + "/mtu").value_or(""), "1280\n");
+}
+
+TEST_F(VethNamespace, PnicWhoseInterfaceVanishesKeepsItsLinkAnswerAndFailsEthtoolCalls)
+{
+    auto route = std::make_shared<RouteLinks>();
+    LinuxPnic pnic(outer_, NicKernel{channel_, nullptr, route}, route->named(outer_));  // as a listing hands it over
+    ASSERT_TRUE(runTool("ip link del " + outer_));
+    EXPECT_EQ(pnic.GetMTU(), 1500u);  // the request's snapshot
+    EXPECT_TRUE(pnic.IsEnabled());
+    NN::PnicDriverInfo driver;
+    EXPECT_THROW(pnic.GetPnicDriverInfo(driver), NodeMgr::Lib::NodeMgrException);
+    pnic.Refresh();  // the next look finds it gone
+    EXPECT_THROW(pnic.GetMTU(), NodeMgr::Lib::NodeMgrException);
 }

@@ -9,6 +9,7 @@
 #include "os_version.hpp"
 #include "pci_address.hpp"
 #include "pnic_records.hpp"
+#include "rtnetlink_links.hpp"
 #include "text_files.hpp"
 
 #include <arpa/inet.h>
@@ -413,12 +414,14 @@ TEST(PnicStatsMapping, InterfaceCountersThenDriverCountersByName)
     EXPECT_EQ(stats.broadcastPktsTx, 0u);  // no counter of that name
 }
 
-TEST(MacText, SixHexBytes)
+TEST(MacAddress, SixBytesOrNone)
 {
-    auto mac = parseMac("02:fc:00:00:00:01");
-    ASSERT_TRUE(mac);
-    EXPECT_EQ((*mac)[1], 0xfc);
-    EXPECT_EQ((*mac)[5], 0x01);
-    EXPECT_FALSE(parseMac("02:fc:00:00:00"));
-    EXPECT_FALSE(parseMac("02:fc:00:00:00:01:02"));
+    unsigned char bytes[6];
+    toMacAddress({0x02, 0xfc, 0, 0, 0, 0x01}).GetBinaryAddress(bytes);
+    EXPECT_EQ(bytes[1], 0xfc);
+    EXPECT_EQ(bytes[5], 0x01);
+    toMacAddress({0x02, 0xfc, 0, 0, 0}).GetBinaryAddress(bytes);
+    EXPECT_EQ(bytes[1], 0);
+    EXPECT_EQ(addressText({0x02, 0xfc, 0, 0, 0, 0x01}), "02:fc:00:00:00:01");
+    EXPECT_EQ(addressText({}), "");
 }

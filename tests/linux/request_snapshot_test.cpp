@@ -6,14 +6,13 @@
 // interface vanished.
 #include "linux_backend.hpp"
 #include "stack_params.hpp"
+#include "join_namespace.hpp"
 #include "tool_output.hpp"
 
 #include <atomic>
 #include <chrono>
-#include <fcntl.h>
 #include <functional>
 #include <gtest/gtest.h>
-#include <sched.h>
 #include <thread>
 #include <unistd.h>
 
@@ -91,14 +90,7 @@ protected:
     bool ip(const std::string& arguments) { return runTool("ip -n " + ns_ + " " + arguments); }
 
     // Joins the calling thread to the test namespace.
-    bool enter()
-    {
-        int fd = ::open(("/var/run/netns/" + ns_).c_str(), O_RDONLY | O_CLOEXEC);
-        if (fd < 0) return false;
-        const bool joined = ::setns(fd, CLONE_NEWNET) == 0;
-        ::close(fd);
-        return joined;
-    }
+    bool enter() { return orv::linuxtest::joinNamedNamespace(ns_); }
 
     // Runs body on `count` threads, each joined to the test namespace first;
     // answers how many threads could not join it.

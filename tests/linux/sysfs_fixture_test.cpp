@@ -1,13 +1,17 @@
-// The sysfs readers on a sysfs tree written out by the test: a NIC on a PCI bus
-// behind a virtio device, a virtual device without a bus, and a CPU topology.
+// The sysfs readers on a sysfs tree written out by the test: PCI functions
+// under bus/pci/devices, and a CPU topology. NIC pnics made from link records
+// written by the test and replayed ethtool answers.
 #include "cpu_topology.hpp"
-#include "linux_call_error.hpp"
 #include "linux_pnic.hpp"
-#include "sysfs_net.hpp"
+#include "pci_identity.hpp"
+#include "support/ethtool_replay.hpp"
+#include "support/test_data.hpp"
 
 #include <filesystem>
 #include <fstream>
 #include <gtest/gtest.h>
+#include <linux/ethtool.h>
+#include <linux/if.h>
 #include <unistd.h>
 
 using namespace orv::linuxhost;
@@ -21,7 +25,9 @@ protected:
     {
         root_ = fs::temp_directory_path() / ("orv-sysfs-" + std::to_string(::getpid()));
         fs::remove_all(root_);
-        buildNet();
+        pciFunction("0000:00:03.0", "0x1af4", "0x1041");  // a virtio NIC's PCI function
+        pciFunction("0000:00:14.0", "0x8086", "0xa36d");  // a USB host controller
+        pciFunction("0000:00:05.0", "0x8086", "0x10fb");
         buildCpus();
     }
     void TearDown() override { fs::remove_all(root_); }
@@ -31,68 +37,12 @@ protected:
         fs::create_directories(file.parent_path());
         std::ofstream(file) << text;
     }
-    void link(const fs::path& target, const fs::path& at)
+    // A PCI function with its identity files, as bus/pci/devices shows it.
+    void pciFunction(const std::string& address, const std::string& vendor, const std::string& device)
     {
-        fs::create_directories(at.parent_path());
-        fs::create_symlink(target, at);
-    }
-    void netDevice(const fs::path& dir, const std::string& index, const std::string& mtu)
-    {
-        write(dir / "ifindex", index + "\n");
-        write(dir / "flags", "0x1003\n");
-        write(dir / "mtu", mtu + "\n");
-        write(dir / "operstate", "up\n");
-        write(dir / "carrier", "1\n");
-        write(dir / "address", "02:fc:00:00:00:01\n");
-        write(dir / "speed", "-1\n");
-        write(dir / "duplex", "unknown\n");
-    }
-    // A PCI function at devices/pci0000:00/<address> with its identity files.
-    fs::path pciFunction(const std::string& address, const std::string& vendor, const std::string& device)
-    {
-        const fs::path pci = root_ / "devices/pci0000:00" / address;
+        const fs::path pci = root_ / "bus/pci/devices" / address;
         write(pci / "vendor", vendor + "\n");
         write(pci / "device", device + "\n");
-        link(root_ / "bus/pci", pci / "subsystem");
-        return pci;
-    }
-    // The net device `name` of a bus device, with its `device` link and class entry.
-    fs::path netDeviceOf(const fs::path& busDevice, const std::string& name, const std::string& index)
-    {
-        netDevice(busDevice / "net" / name, index, "1500");
-        link(busDevice, busDevice / "net" / name / "device");
-        link(busDevice / "net" / name, root_ / "class/net" / name);
-        return busDevice / "net" / name;
-    }
-    void buildNet()
-    {
-        const fs::path virtio = pciFunction("0000:00:03.0", "0x1af4", "0x1000") / "virtio2";
-        write(virtio / "vendor", "0x1af4\n");
-        link(root_ / "bus/virtio", virtio / "subsystem");
-        write(netDeviceOf(virtio, "eth0", "4") / "mtu", "1400\n");
-        netDevice(root_ / "devices/virtual/net/veth0", "2", "1500");
-        link(root_ / "devices/virtual/net/veth0", root_ / "class/net/veth0");
-        buildUsbNic();
-        buildLinkDownNic();
-    }
-    // A USB NIC: its interface sits under the USB host controller, a PCI function.
-    void buildUsbNic()
-    {
-        const fs::path device = pciFunction("0000:00:14.0", "0x8086", "0xa36d") / "usb1/1-1";
-        write(device / "idVendor", "0bda\n");
-        link(root_ / "bus/usb", device / "subsystem");
-        const fs::path interface = device / "1-1:1.0";
-        link(root_ / "bus/usb", interface / "subsystem");
-        netDeviceOf(interface, "usb0", "5");
-    }
-    // A PCI NIC whose cable is out: up, no carrier, the driver still showing the last speed.
-    void buildLinkDownNic()
-    {
-        const fs::path eth1 = netDeviceOf(pciFunction("0000:00:05.0", "0x8086", "0x10fb"), "eth1", "6");
-        write(eth1 / "carrier", "0\n");
-        write(eth1 / "operstate", "down\n");
-        write(eth1 / "speed", "10000\n");
-        write(eth1 / "duplex", "full\n");
     }
     void buildCpus()
     {
@@ -113,76 +63,77 @@ protected:
 
 }  // namespace
 
-TEST_F(SysfsTree, NicsAreTheDevicesWithABusDevice)
+TEST_F(SysfsTree, PciIdentityIsTheFunctionAtTheDriversBusAddress)
 {
-    SysfsNet sysfs(root_.string());
-    EXPECT_EQ(sysfs.allDevices(), (std::vector<std::string>{"veth0", "eth0", "usb0", "eth1"}));  // interface-index order
-    EXPECT_EQ(sysfs.busDevices(), (std::vector<std::string>{"eth0", "usb0", "eth1"}));
-    EXPECT_FALSE(sysfs.hasBusDevice("veth0"));
-}
-
-TEST_F(SysfsTree, PciFunctionIsTheNearestPciAncestor)
-{
-    SysfsNet sysfs(root_.string());
-    auto pci = sysfs.pciDevice("eth0");
+    auto pci = readPciIdentity(root_.string(), "0000:00:03.0");
     ASSERT_TRUE(pci);
     EXPECT_EQ(pci->address.segment, 0);
     EXPECT_EQ(pci->address.bus, 0);
     EXPECT_EQ(pci->address.slot, 3);
     EXPECT_EQ(pci->address.function, 0);
     EXPECT_EQ(pci->vendorId, 0x1af4);
-    EXPECT_EQ(pci->deviceId, 0x1000);  // the PCI function's, not the virtio device's
-    EXPECT_FALSE(sysfs.pciDevice("veth0"));
-}
-
-TEST_F(SysfsTree, LinkAttributesAndAVanishedDevice)
-{
-    SysfsNet sysfs(root_.string());
-    auto link = sysfs.linkAttributes("eth0");
-    EXPECT_EQ(link.ifindex, 4);
-    EXPECT_EQ(link.mtu, 1400u);
-    EXPECT_EQ(link.flags, 0x1003u);
-    EXPECT_EQ(link.operstate, "up");
-    EXPECT_EQ(link.carrier, true);
-    EXPECT_EQ(link.speed, -1);
-    EXPECT_EQ(link.address, "02:fc:00:00:00:01");
-    fs::remove_all(root_ / "devices/pci0000:00/0000:00:03.0/virtio2/net/eth0");
-    try {
-        sysfs.linkAttributes("eth0");
-        FAIL() << "a vanished device must not answer";
-    } catch (const LinuxCallError& error) {
-        EXPECT_TRUE(error.vanished());
-    }
-    EXPECT_EQ(sysfs.busDevices(), (std::vector<std::string>{"usb0", "eth1"}));
-}
-
-TEST_F(SysfsTree, PciNicIsItsOwnPciFunction)
-{
-    auto pci = SysfsNet(root_.string()).pciDevice("eth1");
-    ASSERT_TRUE(pci);
-    EXPECT_EQ(pci->address.slot, 5);
-    EXPECT_EQ(pci->vendorId, 0x8086);
-    EXPECT_EQ(pci->deviceId, 0x10fb);
+    EXPECT_EQ(pci->deviceId, 0x1041);
+    EXPECT_FALSE(readPciIdentity(root_.string(), "0000:00:09.0"));  // no such function
+    EXPECT_FALSE(readPciIdentity(root_.string(), ""));              // a virtual device names no bus address
 }
 
 TEST_F(SysfsTree, UsbNicHasNoPciIdentityOfItsHostController)
 {
-    SysfsNet sysfs(root_.string());
-    EXPECT_FALSE(sysfs.pciDevice("usb0"));
-    LinuxPnic pnic("usb0", root_.string(), std::make_shared<IoctlEthtoolChannel>());
-    EXPECT_EQ(pnic.GetPciDevice(), nullptr);
+    // A USB NIC's driver names the USB port behind the controller's address.
+    EXPECT_FALSE(readPciIdentity(root_.string(), "usb-0000:00:14.0-1"));
+    EXPECT_TRUE(readPciIdentity(root_.string(), "0000:00:14.0"));
+}
+
+TEST_F(SysfsTree, OneReadingPerBusAddressWithinAListing)
+{
+    PciIdentities identities(root_.string());
+    auto first = identities.of("0000:00:05.0");
+    ASSERT_TRUE(first);
+    fs::remove_all(root_ / "bus/pci/devices/0000:00:05.0");
+    auto second = identities.of("0000:00:05.0");  // a second port of the same function
+    ASSERT_TRUE(second);
+    EXPECT_EQ(second->deviceId, 0x10fb);
+    EXPECT_FALSE(PciIdentities(root_.string()).of("0000:00:05.0"));  // the next listing reads again
+}
+
+TEST_F(SysfsTree, PnicPciIdentityFollowsTheDriverInfoBusAddress)
+{
+    auto channel = std::make_shared<orv::linuxtest::ReplayChannel>(orv::linuxtest::testData("ethtool/virtio_net"));
+    LinkRecord link;
+    link.name = "eth0";
+    link.parentDevice = "virtio2";
+    LinuxPnic pnic("eth0", NicKernel{channel, nullptr, nullptr, root_.string()}, link);
+    auto* pci = pnic.GetPciDevice();
+    ASSERT_NE(pci, nullptr);  // the capture's bus-info is 0000:00:03.0
+    EXPECT_EQ(pci->GetSlot(), 3);
+    EXPECT_EQ(pci->GetVendorId(), 0x1af4);
+    EXPECT_EQ(pci->GetDeviceId(), 0x1041);
 }
 
 TEST_F(SysfsTree, LinkDownNicShowsNoSpeedOrDuplex)
 {
-    LinuxPnic pnic("eth1", root_.string(), std::make_shared<IoctlEthtoolChannel>());
-    EXPECT_FALSE(pnic.IsLinkUp());
-    EXPECT_EQ(pnic.GetLinkSpeed(), NodeMgr::Network::CONNECTION_AUTO);
-    EXPECT_EQ(pnic.GetDuplex(), NodeMgr::Network::DUPLEX_MODE_AUTO);
-    write(root_ / "class/net/eth1/carrier", "1\n");  // the cable back in
-    EXPECT_TRUE(pnic.IsLinkUp());
-    EXPECT_EQ(pnic.GetLinkSpeed(), NodeMgr::Network::CONNECTION_10000);
-    EXPECT_EQ(pnic.GetDuplex(), NodeMgr::Network::DUPLEX_MODE_FULL);
+    // The driver still answers 1000 Mb/s full duplex after the cable is out.
+    auto channel = std::make_shared<orv::linuxtest::ReplayChannel>(orv::linuxtest::testData("ethtool/composed_copper_1g"));
+    LinkRecord link;
+    link.name = "eno1";
+    link.flags = IFF_UP | IFF_BROADCAST | IFF_MULTICAST;
+    link.carrier = false;
+    LinuxPnic down("eno1", NicKernel{channel, nullptr, nullptr, root_.string()}, link);
+    EXPECT_TRUE(down.IsEnabled());
+    EXPECT_FALSE(down.IsLinkUp());
+    EXPECT_EQ(down.GetLinkSpeed(), NodeMgr::Network::CONNECTION_AUTO);
+    EXPECT_EQ(down.GetDuplex(), NodeMgr::Network::DUPLEX_MODE_AUTO);
+    link.carrier = true;  // the cable back in
+    auto again = std::make_shared<orv::linuxtest::ReplayChannel>(orv::linuxtest::testData("ethtool/composed_copper_1g"));
+    LinuxPnic up("eno1", NicKernel{again, nullptr, nullptr, root_.string()}, link);
+    EXPECT_TRUE(up.IsLinkUp());
+    EXPECT_EQ(up.GetLinkSpeed(), NodeMgr::Network::CONNECTION_1000);
+    EXPECT_EQ(up.GetDuplex(), NodeMgr::Network::DUPLEX_MODE_FULL);
+    NodeMgr::Network::PnicInfo info;
+    up.GetPnicInfo(info);
+    EXPECT_EQ(info.speed, NodeMgr::Network::CONNECTION_1000);
+    // One settings handshake for the pnic's speed, duplex and record.
+    EXPECT_EQ(again->exchanges(ETHTOOL_GLINKSETTINGS), 2u);
 }
 
 TEST_F(SysfsTree, PackagesCoresAndCpuOrder)

@@ -8,6 +8,10 @@
  *             uint32 data, the status codes it got back
  *   "upcall"  enumerates Raw_SubElement through the broker and returns what came back
  *   "paths"   two object paths (path-0, path-1), whatever was asked for
+ *   "nosuchproperty" CMPI_RC_ERR_NO_SUCH_PROPERTY "key Name is missing",
+ *             "invalidclass" CMPI_RC_ERR_INVALID_CLASS "class not served here"
+ *   "noquery" execQuery answers CMPI_RC_ERR_NOT_SUPPORTED without a message,
+ *             as the binding's default does
  * getInstance of the Name "gaps" answers Numbers = 0, NULL, 20.
  * Lifecycle calls are appended, one line each, to the file named by the
  * environment variable RAW_PROVIDER_LOG; RAW_PROVIDER_CLEANUP_RC sets what
@@ -162,6 +166,14 @@ static int steered(const CMPIContext* ctx, const CMPIResult* rslt, const CMPIObj
     }
     if (is(who, "errornomsg")) {
         *out = status(CMPI_RC_ERR_NOT_FOUND, NULL);
+        return 1;
+    }
+    if (is(who, "nosuchproperty")) {
+        *out = status(CMPI_RC_ERR_NO_SUCH_PROPERTY, "key Name is missing");
+        return 1;
+    }
+    if (is(who, "invalidclass")) {
+        *out = status(CMPI_RC_ERR_INVALID_CLASS, "class not served here");
         return 1;
     }
     if (is(who, "none")) {
@@ -343,9 +355,13 @@ static CMPIStatus instExecQuery(CMPIInstanceMI* mi, const CMPIContext* ctx, cons
                                 const CMPIObjectPath* op, const char* query, const char* lang)
 {
     CMPIStatus st = {CMPI_RC_OK, NULL};
-    CMPISelectExp* se = broker->eft->newSelectExp(broker, query, lang, NULL, &st);
+    CMPISelectExp* se;
     int i;
     (void)mi;
+    if (is(principal(ctx), "noquery")) {
+        return status(CMPI_RC_ERR_NOT_SUPPORTED, NULL);
+    }
+    se = broker->eft->newSelectExp(broker, query, lang, NULL, &st);
     if (se == NULL) {
         return st;
     }
@@ -503,6 +519,33 @@ static CMPIUint32 raiseIndications(const CMPIContext* ctx, const CMPIArgs* in)
     return accepted;
 }
 
+/* JoinNames: the Name keys of the Elements references, joined with ',' (NULL for a null element) */
+static CMPIStatus joinNames(const CMPIResult* rslt, const CMPIArgs* in)
+{
+    CMPIData refs = in->ft->getArg(in, "Elements", NULL);
+    char joined[256] = "";
+    CMPICount n, i;
+    if (refs.type != CMPI_refA || refs.value.array == NULL) {
+        return status(CMPI_RC_ERR_INVALID_PARAMETER, "Elements is not an array of references");
+    }
+    n = refs.value.array->ft->getSize(refs.value.array, NULL);
+    for (i = 0; i < n; ++i) {
+        CMPIData ref = refs.value.array->ft->getElementAt(refs.value.array, i, NULL);
+        const char* text = "NULL";
+        if ((ref.state & CMPI_nullValue) == 0 && ref.value.ref != NULL) {
+            CMPIData name = ref.value.ref->ft->getKey(ref.value.ref, "Name", NULL);
+            text = name.type == CMPI_string ? (const char*)name.value.string->hdl : "?";
+        }
+        if (i > 0) {
+            strncat(joined, ",", sizeof joined - strlen(joined) - 1);
+        }
+        strncat(joined, text, sizeof joined - strlen(joined) - 1);
+    }
+    rslt->ft->returnData(rslt, (const CMPIValue*)joined, CMPI_chars);
+    rslt->ft->returnDone(rslt);
+    return status(CMPI_RC_OK, NULL);
+}
+
 static CMPIStatus methInvoke(CMPIMethodMI* mi, const CMPIContext* ctx, const CMPIResult* rslt,
                              const CMPIObjectPath* op, const char* method, const CMPIArgs* in, CMPIArgs* out)
 {
@@ -515,6 +558,8 @@ static CMPIStatus methInvoke(CMPIMethodMI* mi, const CMPIContext* ctx, const CMP
             CMPIData d = in->ft->getArgAt(in, i, &name, NULL);
             out->ft->addArg(out, (const char*)name->hdl, &d.value, d.type);
         }
+    } else if (is(method, "JoinNames")) {
+        return joinNames(rslt, in);
     } else if (is(method, "Params")) {
         rslt->ft->returnData(rslt, (const CMPIValue*)entryText(ctx, "sfcbProviderParameters"), CMPI_chars);
         rslt->ft->returnDone(rslt);

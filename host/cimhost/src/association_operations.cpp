@@ -88,8 +88,10 @@ using ClassFinder = std::vector<std::string> (*)(const repository::ClassReposito
 
 // When the source is a class, writes the classes `find` names (paths alone, or with
 // their classes when `flags` is given) and returns true.
+// An INSTANCENAME names an instance even without keys (a keyless instance name of
+// a class with keys is refused when its path is built).
 bool answeredForClass(OperationContext& context, const Source& source, ClassFinder find, const ObjectFlags* flags) {
-    if (!source.model.keys.empty()) {
+    if (source.model.instance || !source.model.keys.empty()) {
         return false;
     }
     const auto names = find(context.classes, context.request.nameSpace, source.model.className, source.filters);

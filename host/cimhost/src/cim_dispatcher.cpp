@@ -8,6 +8,7 @@
 #include "call_limiter.hpp"
 #include "enumeration_registry.hpp"
 #include "operation_context.hpp"
+#include "operation_errors.hpp"
 #include "orv/cimxml/cim_status.hpp"
 #include "orv/cimxml/response_writer.hpp"
 #include "pull_operations.hpp"
@@ -103,6 +104,7 @@ std::string CimDispatcher::respondNow(const cimxml::CimRequest& request, const s
         return cimxml::errorResponse(request.messageId, request.methodName, request.intrinsic, code, description);
     };
     detail::OperationHandler handler = detail::invokeMethod;
+    std::string_view operationName = detail::kMethodCall;
     if (request.intrinsic) {
         const Operation* operation = findOperation(request.methodName);
         if (operation == nullptr) {
@@ -110,6 +112,7 @@ std::string CimDispatcher::respondNow(const cimxml::CimRequest& request, const s
                         "operation " + request.methodName + " is not supported");
         }
         handler = operation->handler;
+        operationName = operation->name;
     }
     if (!classes_.hasNamespace(request.nameSpace)) {
         return fail(static_cast<int>(CimStatus::InvalidNamespace),
@@ -127,7 +130,7 @@ std::string CimDispatcher::respondNow(const cimxml::CimRequest& request, const s
                                          enumerations_.get()};
         handler(context);
     } catch (const CimError& error) {
-        return fail(error.code(), error.description());
+        return fail(detail::answeredCode(operationName, error.code()), error.description());
     }
     return cimxml::finishResponse(out);
 }

@@ -1,5 +1,7 @@
 #include "cmpi_builder.hpp"
 
+#include "key_check.hpp"
+
 #include <strings.h>
 
 #include <charconv>
@@ -189,12 +191,14 @@ CMPIType typeFromXmlName(std::string_view name) {
 
 void addKey(const CMPIBroker* broker, const repository::ClassRepository& classes, std::string_view nameSpace,
             CMPIObjectPath* path, const cimxml::ObjectPathModel& model, const cimxml::KeyBindingModel& key) {
-    const repository::PropertyDecl* declared = declaredProperty(classes, nameSpace, model.className, key.name);
+    // A bare KEYVALUE (no KEYBINDING) is the value of the class's only key.
+    const std::string name = key.name.empty() ? soleKeyName(classes, nameSpace, model.className) : key.name;
+    const repository::PropertyDecl* declared = declaredProperty(classes, nameSpace, model.className, name);
     Converted converted;
     converted.type = declared != nullptr ? cmpiType(declared->type.type) : guessedKeyType(key);
     if (converted.type == CMPI_ref || key.kind == cimxml::KeyBindingModel::Kind::Reference) {
         if (!key.reference) {
-            badValue(key.name, key.value, "reference");
+            badValue(name, key.value, "reference");
         }
         converted.type = CMPI_ref;
         // As sfcb does, a reference key reaches the provider without the host the
@@ -204,9 +208,9 @@ void addKey(const CMPIBroker* broker, const repository::ClassRepository& classes
         local.host.clear();
         converted.value.ref = buildObjectPath(broker, classes, nameSpace, local);
     } else {
-        convertText(broker, converted, key.name, key.value);
+        convertText(broker, converted, name, key.value);
     }
-    path->ft->addKey(path, key.name.c_str(), converted.pointer(), converted.type);
+    path->ft->addKey(path, name.c_str(), converted.pointer(), converted.type);
 }
 
 CMPIType propertyType(const repository::PropertyDecl* declared, const cimxml::PropertyModel& property) {
@@ -285,6 +289,20 @@ struct ArgTarget {
     throw CimError(CimStatus::InvalidParameter, "parameter " + name + " must be " + std::string(expected));
 }
 
+// An array of references from a VALUE.REFARRAY (VALUE.NULL elements stay null).
+CMPIArray* buildRefArray(const ArgTarget& target, const cimxml::RefArrayParam& refs) {
+    CMPIArray* array =
+        target.broker->eft->newArray(target.broker, static_cast<CMPICount>(refs.items.size()), CMPI_ref, nullptr);
+    for (std::size_t i = 0; i < refs.items.size(); ++i) {
+        if (refs.items[i]) {
+            CMPIValue element{};
+            element.ref = buildObjectPath(target.broker, target.classes, target.nameSpace, *refs.items[i]);
+            array->ft->setElementAt(array, static_cast<CMPICount>(i), &element, CMPI_ref);
+        }
+    }
+    return array;
+}
+
 // One argument converted from its PARAMVALUE to the declared type.
 void addArgument(CMPIArgs* args, const ArgTarget& target, const std::string& name, const cimxml::ParamValue& value) {
     const CMPIType type = cmpiType(target.decl.type.type);
@@ -295,9 +313,16 @@ void addArgument(CMPIArgs* args, const ArgTarget& target, const std::string& nam
     }
     Converted converted;
     converted.type = type;
-    if (target.decl.type.isArray) {
+    if (target.decl.type.isArray && type == CMPI_ref) {
+        const auto* refs = std::get_if<cimxml::RefArrayParam>(&value);
+        if (refs == nullptr) {
+            wrongKind(name, "an array of references (VALUE.REFARRAY)");
+        }
+        converted.value.array = buildRefArray(target, *refs);
+        converted.type = CMPI_refA;
+    } else if (target.decl.type.isArray) {
         const auto* items = std::get_if<std::vector<std::optional<std::string>>>(&value);
-        if (items == nullptr || type == CMPI_ref) {
+        if (items == nullptr) {
             wrongKind(name, "an array of values");
         }
         converted.value.array = buildArray(target.broker, name, *items, type);
@@ -337,6 +362,7 @@ CMPIArgs* buildArgs(const CMPIBroker* broker, const repository::ClassRepository&
 
 CMPIObjectPath* buildObjectPath(const CMPIBroker* broker, const repository::ClassRepository& classes,
                                 std::string_view nameSpace, const cimxml::ObjectPathModel& model) {
+    checkInstanceName(classes, nameSpace, model);
     const std::string ns = model.nameSpace.empty() ? std::string(nameSpace) : model.nameSpace;
     CMPIStatus rc{CMPI_RC_OK, nullptr};
     CMPIObjectPath* path = broker->eft->newObjectPath(broker, ns.c_str(), model.className.c_str(), &rc);

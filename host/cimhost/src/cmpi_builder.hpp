@@ -16,9 +16,10 @@
 namespace orv::cimhost::detail {
 
 // The path in `nameSpace` (the model's own namespace wins when it has one). Keys take
-// the declared type of the key property; keys of unknown properties take the type
-// their VALUETYPE suggests. Throws CimError(CIM_ERR_INVALID_PARAMETER) for values
-// that do not fit the declared type.
+// the declared type of the key property; keys of classes the repository does not
+// know take the type their VALUETYPE suggests. Throws CimError(CIM_ERR_INVALID_PARAMETER)
+// for keys that do not fit the class (key_check.hpp) and values that do not fit the
+// declared type.
 CMPIObjectPath* buildObjectPath(const CMPIBroker* broker, const repository::ClassRepository& classes,
                                 std::string_view nameSpace, const cimxml::ObjectPathModel& model);
 

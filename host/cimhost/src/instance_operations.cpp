@@ -4,6 +4,7 @@
 #include "cmpi_builder.hpp"
 #include "orv/cimxml/cim_status.hpp"
 #include "orv/cimxml/request_params.hpp"
+#include "orv/host/wql.hpp"
 #include "result_writers.hpp"
 
 namespace orv::cimhost::detail {
@@ -16,6 +17,20 @@ namespace {
 CMPIObjectPath* instancePath(const OperationContext& context, const cimxml::ObjectPathModel& model) {
     requireClass(context, model.className);
     return buildObjectPath(context.core.broker(), context.classes, context.request.nameSpace, model);
+}
+
+// The properties an ExecQuery answer carries: those of the SELECT list alone (the
+// keys are in the instance path); every property for "SELECT *".
+std::optional<std::vector<std::string>> selectList(const std::string& query) {
+    try {
+        const host::WqlQuery parsed = host::WqlQuery::parse(query);
+        if (parsed.selectList().empty()) {
+            return std::nullopt;
+        }
+        return parsed.selectList();
+    } catch (const host::WqlError&) {
+        return std::nullopt;  // the broker core has answered it already
+    }
 }
 
 std::string requiredString(const cimxml::CimRequest& request, const char* name) {
@@ -119,7 +134,7 @@ void execQuery(OperationContext& context) {
     host::Reply reply = context.core.execQuery(nsPath, query.c_str(), language.c_str(),
                                                callOptions(context, true, false, false, {}));
     throwIfFailed(reply);
-    writeObjectsWithPath(context, reply, instanceEncoding(context, false, std::nullopt));
+    writeObjectsWithPath(context, reply, instanceEncoding(context, false, selectList(query)));
 }
 
 }  // namespace orv::cimhost::detail

@@ -42,7 +42,12 @@ void writeKeyBinding(XmlWriter& out, const std::string& name, const CMPIData& ke
     if (key.type == CMPI_ref && !isNullData(key) && key.value.ref != nullptr) {
         writeValueReference(out, key.value.ref);
     } else {
+        // TYPE names the key's CIM type beside the coarse VALUETYPE, so that a
+        // client can tell a uint16 key from a sint64 one.
         out.open("KEYVALUE").attr("VALUETYPE", keyValueType(key.type));
+        if (const std::string_view type = xmlTypeName(key.type); !type.empty()) {
+            out.attr("TYPE", type);
+        }
         out.text(scalarText(key).value_or(""));
         out.close();
     }

@@ -121,6 +121,7 @@ ObjectPathModel readInstanceName(const XmlElement& element) {
     expectName(element, "INSTANCENAME");
     ObjectPathModel path;
     path.className = requireAttribute(element, "CLASSNAME");
+    path.instance = true;
     for (const auto& child : element.children) {
         if (child->name == "KEYBINDING") {
             path.keys.push_back(readKeyBinding(*child));

@@ -27,4 +27,9 @@ ObjectPathModel readObjectPath(const XmlElement& element);
 InstanceModel readInstance(const XmlElement& element);
 std::vector<std::optional<std::string>> readValueArray(const XmlElement& element);
 
+// Parameter values that only some operations take (object_readers.cpp).
+ClassParam readClass(const XmlElement& element);
+QualifierDeclarationParam readQualifierDeclaration(const XmlElement& element);
+RefArrayParam readRefArray(const XmlElement& element);
+
 }  // namespace orv::cimxml::detail

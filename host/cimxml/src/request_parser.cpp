@@ -57,6 +57,15 @@ ParamValue readParamValue(const XmlElement& holder) {
         return NamedInstanceModel{detail::readInstanceName(*value.children[0]),
                                   detail::readInstance(*value.children[1])};
     }
+    if (value.name == "CLASS") {
+        return detail::readClass(value);
+    }
+    if (value.name == "QUALIFIER.DECLARATION") {
+        return detail::readQualifierDeclaration(value);
+    }
+    if (value.name == "VALUE.REFARRAY") {
+        return detail::readRefArray(value);
+    }
     invalid(value, "unexpected parameter value");
 }
 

@@ -20,6 +20,7 @@
 #include "orv/host/broker_core.hpp"
 #include "orv/repository/class_repository.hpp"
 #include "orv/repository/registration.hpp"
+#include "query.hpp"
 #include "result.hpp"
 
 namespace orv::host::detail {
@@ -120,6 +121,9 @@ private:
     Outcome callTargets(const std::vector<Target>& targets, ProviderKind kind, const Request& request,
                         ResultSink& sink);
     Outcome noTarget(std::string_view ns, std::string_view className) const;
+    // CMPI_RC_ERR_INVALID_QUERY unless the query's FROM class exists in `ns` and
+    // declares every property of its SELECT list (query_fallback.cpp).
+    Outcome checkQueryClass(std::string_view ns, const Query& query) const;
     // Logs, once per provider, that it handed object paths to an instance request.
     void warnPathsAsInstances(const Target& target, const Request& request);
     void warn(const std::string& line) const;

@@ -6,7 +6,7 @@
 #include "core.hpp"
 #include "mi_calls.hpp"
 #include "object_path.hpp"
-#include "query.hpp"
+#include "query_fallback.hpp"
 #include "string.hpp"
 
 namespace orv::host::detail {
@@ -103,6 +103,25 @@ const CMPIObjectPath* pathFor(const Request& r, const Target& target) {
     return renamed;
 }
 
+// ExecQuery of a provider that refused it: its enumeration of the class, of which
+// the sink keeps what the query selects (query_fallback.hpp).
+CMPIStatus queryByEnumeration(void* mi, const Request& r, const CMPIContext* ctx, const CMPIResult* rslt,
+                              const CMPIObjectPath* path, ResultSink& sink) {
+    const ParsedQuery parsed = parseExecQuery(r.query, r.lang);
+    if (!parsed.query) {
+        return makeStatus(parsed.rc, parsed.message.c_str());
+    }
+    Request enumeration = r;
+    enumeration.op = Op::EnumerateInstances;
+    enumeration.properties = nullptr;  // the WHERE clause may test any property
+    sink.pathsAsInstances = true;
+    sink.query = &*parsed.query;
+    CMPIStatus status = callInstanceMI(mi, enumeration, ctx, rslt, path);
+    sink.query = nullptr;
+    sink.pathsAsInstances = false;
+    return status;
+}
+
 std::string statusMessage(const CMPIStatus& status) {
     const char* text = stringText(status.msg);
     return text != nullptr ? text : "";
@@ -128,6 +147,9 @@ Outcome CoreServices::callTargets(const std::vector<Target>& targets, ProviderKi
             sink.pathsAsInstances = request.op == Op::EnumerateInstances || request.op == Op::GetInstance;
             const unsigned turnedBefore = sink.pathsTurnedIntoInstances;
             status = callInstanceMI(mi, request, frame.ctx(), rslt, pathFor(request, target));
+            if (request.op == Op::ExecQuery && status.rc == CMPI_RC_ERR_NOT_SUPPORTED) {
+                status = queryByEnumeration(mi, request, frame.ctx(), rslt, pathFor(request, target), sink);
+            }
             if (sink.pathsTurnedIntoInstances != turnedBefore) {
                 warnPathsAsInstances(target, request);
             }
@@ -158,12 +180,14 @@ Outcome CoreServices::dispatch(const Request& request, ResultSink& sink) {
     }
     std::string className = path->className;
     if (request.op == Op::ExecQuery) {
-        std::string error;
-        auto query = request.query != nullptr ? parseQuery(request.query, &error) : std::nullopt;
-        if (!query) {
-            return Outcome{CMPI_RC_ERR_INVALID_QUERY, request.query != nullptr ? error : "no query", 0};
+        ParsedQuery parsed = parseExecQuery(request.query, request.lang);
+        if (!parsed.query) {
+            return Outcome{parsed.rc, parsed.message, 0};
         }
-        className = query->fromClass;
+        if (Outcome refused = checkQueryClass(path->nameSpace, *parsed.query); refused.rc != CMPI_RC_OK) {
+            return refused;
+        }
+        className = parsed.query->fromClass;
     }
     std::vector<Target> found;
     ProviderKind kind = ProviderKind::Instance;

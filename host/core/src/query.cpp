@@ -117,6 +117,17 @@ CMPIPredOp negation(CMPIPredOp op) {
     }
 }
 
+// The operator that compares the other way round (a < b is b > a).
+CMPIPredOp mirrored(CMPIPredOp op) {
+    switch (op) {
+    case CMPI_PredOp_LessThan: return CMPI_PredOp_GreaterThan;
+    case CMPI_PredOp_GreaterThan: return CMPI_PredOp_LessThan;
+    case CMPI_PredOp_LessThanOrEquals: return CMPI_PredOp_GreaterThanOrEquals;
+    case CMPI_PredOp_GreaterThanOrEquals: return CMPI_PredOp_LessThanOrEquals;
+    default: return op;
+    }
+}
+
 class Parser {
 public:
     Parser(std::string_view text, std::string* error) : lexer_(text), error_(error) { advance(); }
@@ -272,6 +283,9 @@ private:
     }
 
     std::optional<Predicate> parsePredicate() {
+        if (current_.kind == Token::Text || current_.kind == Token::Number) {
+            return parseLiteralFirst();
+        }
         if (current_.kind != Token::Word) {
             return fail("a property name");
         }
@@ -297,6 +311,27 @@ private:
         predicate.op = *op;
         advance();
         return parseLiteral(predicate);
+    }
+
+    // literal op prop, read as prop op' literal with the comparison turned round
+    // ('a' < Name is Name > 'a'); LIKE and ISA take the property first.
+    std::optional<Predicate> parseLiteralFirst() {
+        Predicate predicate;
+        predicate.type = current_.kind == Token::Text ? CMPI_charString : CMPI_numericString;
+        predicate.rhs = current_.text;
+        advance();
+        std::optional<CMPIPredOp> op = operatorOf(current_);
+        if (!op || *op == CMPI_PredOp_Like || *op == CMPI_PredOp_Isa) {
+            return fail("a comparison operator");
+        }
+        predicate.op = mirrored(*op);
+        advance();
+        if (current_.kind != Token::Word) {
+            return fail("a property name");
+        }
+        predicate.lhs = current_.text;
+        advance();
+        return predicate;
     }
 
     std::optional<Predicate> parseLiteral(Predicate& predicate) {

@@ -1,8 +1,8 @@
 // A small WQL/CQL reader for select expressions:
 //   SELECT * | prop [, prop ...] FROM Class [WHERE condition]
 // where a condition combines predicates with AND, OR, NOT and parentheses, and
-// pred = prop op literal | prop IS [NOT] NULL | prop ISA Class, with op one of
-// = <> != < <= > >= LIKE. NOT binds tightest, then AND, then OR. The condition
+// pred = prop op literal | literal op prop | prop IS [NOT] NULL | prop ISA Class,
+// with op one of = <> != < <= > >= LIKE (LIKE with the property first). NOT binds tightest, then AND, then OR. The condition
 // is kept in disjunctive normal form (a list of AND-groups) with every NOT pushed
 // into its predicate (= becomes <>, < becomes >=, ISA becomes NOT ISA, ...); a
 // condition whose normal form has more than 256 groups is refused.

@@ -3,6 +3,7 @@
 #include "error.hpp"
 #include "instance.hpp"
 #include "object_path.hpp"
+#include "query_fallback.hpp"
 #include "value.hpp"
 
 namespace orv::host::detail {
@@ -25,6 +26,11 @@ CMPIStatus release(CMPIResult* result) { return releaseAny(result, &kResultFT); 
 CMPIResult* clone(const CMPIResult* /*result*/, CMPIStatus* rc) {
     setRc(rc, CMPI_RC_ERR_NOT_SUPPORTED);  // a result belongs to one MI call
     return nullptr;
+}
+
+// Whether an instance returned to the sink is kept (see ResultSink::query).
+bool admitted(const ResultSink& sink, CMPIInstance* instance) {
+    return sink.query == nullptr || admitForQuery(*sink.query, instance);
 }
 
 // Keeps the item, or hands it to the streaming consumer and frees what was made
@@ -79,6 +85,10 @@ CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance
     if (copy == nullptr) {
         return status(CMPI_RC_ERR_INVALID_HANDLE, "returnInstance with an object that is not a live instance");
     }
+    if (!admitted(*sink, copy)) {
+        sink->out->clearAfter(mark);
+        return okStatus();
+    }
     return append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy, mark);
 }
 
@@ -106,6 +116,10 @@ CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path
     }
     if (asInstance) {
         ++sink->pathsTurnedIntoInstances;
+        if (!admitted(*sink, static_cast<CMPIInstance*>(copy))) {
+            sink->out->clearAfter(mark);
+            return okStatus();
+        }
         return append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy, mark);
     }
     return append(*sink, ReturnedItem::Kind::ObjectPath, CMPI_ref, copy, mark);

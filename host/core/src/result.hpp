@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "object.hpp"
+#include "query.hpp"
 #include "orv/host/broker_core.hpp"
 
 namespace orv::host::detail {
@@ -23,6 +24,9 @@ struct ResultSink {
     bool pathsAsInstances = false;
     // How many paths were turned into instances so.
     unsigned pathsTurnedIntoInstances = 0;
+    // Set while an enumeration answers a query (query_fallback.hpp): only the
+    // instances the query selects are kept, cut down to its SELECT list.
+    const Query* query = nullptr;
     // Set when the caller streams (CallOptions::onItem): instances and paths go to
     // it and are freed at once instead of being kept in `items`.
     const ItemConsumer* consumer = nullptr;

@@ -12,6 +12,13 @@
 #                                                          with ORV_ROOT=$ORV_SFCB_ROOT when that is set
 #                                                          (default: tests/e2e/data/root)
 #   sfcb_broker.sh stop BUILD_DIR SOURCE_DIR RUN_DIR      stop that sfcbd and everything it started
+# start stages more beside the library when the tests name it (space-separated lists):
+#   ORV_SFCB_EXTRA_LIBRARIES      further provider libraries (lib<location>.so)
+#   ORV_SFCB_EXTRA_REGISTRATIONS  their registration files
+#   ORV_SFCB_EXTRA_MOFS           their class files
+#   ORV_SFCB_SCHEMA_MOFS          schema files (relative to the prefix's share/sfcb/CIM) of DMTF
+#                                 classes a provider serves itself: sfcb keeps only the schema
+#                                 classes that a staged file defines or derives from
 # The sfcb sources and scripts are looked up in ORV_SFCB_SOURCE, else next to the repository
 # (../shared/sfcb, ../../shared/sfcb for a worktree). When sfcb is not available, prepare and
 # start write the reason to BUILD_DIR/sfcb/unavailable and exit 0, so that the tests can report
@@ -82,11 +89,20 @@ start)
     [ -f "$run/prefix/log/sfcbd.pid" ] && "$scripts/sfcb-run.sh" stop "$run/prefix"
     rm -rf "$run"; mkdir -p "$run/providers"
     cp -a "$prefix" "$run/prefix"
-    cp "$build/lib/liborvprovider.so" "$run/providers/"
+    read -ra libraries <<< "${ORV_SFCB_EXTRA_LIBRARIES:-}"
+    read -ra registrations <<< "${ORV_SFCB_EXTRA_REGISTRATIONS:-}"
+    read -ra extra_mofs <<< "${ORV_SFCB_EXTRA_MOFS:-}"
+    read -ra schema_mofs <<< "${ORV_SFCB_SCHEMA_MOFS:-}"
+    cp "$build/lib/liborvprovider.so" "${libraries[@]}" "$run/providers/"
     mapfile -t mofs < <(library_mof_files)
+    mofs+=("${extra_mofs[@]}")
+    for mof in "${schema_mofs[@]}"; do mofs+=("$run/prefix/share/sfcb/CIM/$mof"); done
+    # One registration file: the library's blocks, then the further providers'.
+    for reg in "$src/cim/mof/orvprovider.reg" "${registrations[@]}"; do cat "$reg"; echo; done \
+        > "$run/providers.reg"
     port=$(free_port)
     SFCB_PORT=$port "$scripts/sfcb-run.sh" stage "$run/prefix" "$run/providers" \
-        "$src/cim/mof/orvprovider.reg" "${mofs[@]}" > "$run/stage.log" 2>&1 ||
+        "$run/providers.reg" "${mofs[@]}" > "$run/stage.log" 2>&1 ||
         { cat "$run/stage.log" >&2; exit 1; }
     ORV_PLATFORM=sim ORV_SIM_FIXTURE=$fixture ORV_ROOT=${ORV_SFCB_ROOT:-$src/tests/e2e/data/root} SFCB_PORT=$port \
         "$scripts/sfcb-run.sh" start "$run/prefix"

@@ -30,6 +30,7 @@ struct ObjectPathModel {
     std::string nameSpace;  // "root/cimv2"; empty when the path had none
     std::string className;
     std::vector<KeyBindingModel> keys;  // empty for a class path
+    bool instance = false;              // read from an INSTANCENAME (even one without keys)
 };
 
 // One property of an instance sent by the client.
@@ -58,6 +59,25 @@ struct ClassNameParam {
     std::string name;
 };
 
+// A CLASS sent as a parameter (CreateClass, ModifyClass): read for its form only,
+// since this host does not change classes.
+struct ClassParam {
+    std::string name;
+    std::string superClass;
+};
+
+// A QUALIFIER.DECLARATION sent as a parameter (SetQualifier): read for its form only.
+struct QualifierDeclarationParam {
+    std::string name;
+    std::string type;
+    bool isArray = false;
+};
+
+// A VALUE.REFARRAY; nullopt elements are VALUE.NULL.
+struct RefArrayParam {
+    std::vector<std::optional<ObjectPathModel>> items;
+};
+
 // The value of one IPARAMVALUE / PARAMVALUE, by the element it carried.
 using ParamValue = std::variant<std::monostate,                         // no value (null)
                                 std::string,                            // VALUE
@@ -65,7 +85,10 @@ using ParamValue = std::variant<std::monostate,                         // no va
                                 ClassNameParam,                         // CLASSNAME
                                 ObjectPathModel,                        // INSTANCENAME / paths
                                 InstanceModel,                          // INSTANCE
-                                NamedInstanceModel>;                    // VALUE.NAMEDINSTANCE
+                                NamedInstanceModel,                     // VALUE.NAMEDINSTANCE
+                                ClassParam,                             // CLASS
+                                QualifierDeclarationParam,              // QUALIFIER.DECLARATION
+                                RefArrayParam>;                         // VALUE.REFARRAY
 
 struct CimRequest {
     std::string messageId;

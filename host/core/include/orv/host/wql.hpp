@@ -6,7 +6,8 @@
 //
 // Grammar: SELECT * | prop [, prop ...] FROM Class [WHERE condition], where a
 // condition combines predicates with AND, OR, NOT and parentheses; a predicate
-// is prop op literal (op: = <> != < <= > >= LIKE), prop IS [NOT] NULL, or
+// is prop op literal (op: = <> != < <= > >= LIKE), literal op prop (not LIKE),
+// prop IS [NOT] NULL, or
 // prop ISA Class (the property holds an embedded instance of that class or of a
 // subclass). Literals: 'text', "text", numbers, TRUE, FALSE. Keywords and names
 // ignore case. A predicate on a property that is null or missing is false, and
