@@ -149,12 +149,11 @@ protected:
 
     // The first string key in a flattened INSTANCENAME.
     static std::string keyOf(const std::string& name) {
-        const std::string marker = "<KEYVALUE VALUETYPE=string>";
-        const auto at = name.find(marker);
+        const auto at = name.find("<KEYVALUE VALUETYPE=string");
         if (at == std::string::npos) {
             return name;
         }
-        const auto start = at + marker.size();
+        const auto start = name.find('>', at) + 1;
         return name.substr(start, name.find('<', start) - start);
     }
 
