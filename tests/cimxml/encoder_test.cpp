@@ -13,7 +13,36 @@ namespace {
 TEST(XmlWriter, EscapesMarkupAndControlCharacters) {
     XmlWriter out;
     out.open("V").attr("A", "<\"&'>").text("a\tb\x01").close();
-    EXPECT_EQ(out.take(), "<V A=\"&lt;&quot;&amp;&apos;&gt;\">a&#9;b</V>");
+    EXPECT_EQ(out.take(), "<V A=\"&lt;&quot;&amp;&apos;&gt;\">a&#9;b\u2401</V>");
+}
+
+// XML 1.0 cannot carry U+0001..U+001F (but tab, line feed, carriage return), not even
+// as references: each goes out as its control picture, never dropped.
+TEST(XmlWriter, ControlCharactersXmlCannotCarryAreWrittenAsControlPictures) {
+    XmlWriter out;
+    out.open("V").attr("A", "k\x1f").text("\x01\x08\x0b\x0c\x1b\x7f").close();
+    const std::string doc = out.take();
+    EXPECT_EQ(doc, "<V A=\"k\u241f\">\u2401\u2408\u240b\u240c\u241b\x7f</V>");
+    EXPECT_NO_THROW(parseXmlDocument(doc));
+}
+
+// The reader applies the same rule backwards, so a value survives the round trip.
+TEST(XmlTree, ControlPicturesAreReadAsTheControlCharacters) {
+    XmlWriter out;
+    const std::string value = "eth\x01""0 \x1b[1m\tend";
+    out.open("V").attr("A", value).text(value).close();
+    const auto root = parseXmlDocument(out.take());
+    EXPECT_EQ(root->text, value);
+    ASSERT_EQ(root->attributes.size(), 1u);
+    EXPECT_EQ(root->attributes.front().second, value);
+}
+
+// Pictures of characters XML does carry (tab, line feed, carriage return, NUL) and
+// other symbols near them stay as they are.
+TEST(XmlTree, OtherPicturesAndNeighboursStayAsTheyAre) {
+    const std::string text = "\u2400\u2409\u240a\u240d\u2420\u2424\u2380\xe2";
+    const auto root = parseXmlDocument("<V>" + text.substr(0, text.size() - 1) + "</V>");
+    EXPECT_EQ(root->text, text.substr(0, text.size() - 1));
 }
 
 TEST(XmlWriter, KeepsPlainRunsAroundEscapedCharacters) {

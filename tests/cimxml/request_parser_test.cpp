@@ -52,6 +52,17 @@ TEST(RequestParser, ReadsInstanceNameWithTypedAndReferenceKeys) {
     EXPECT_EQ(path.keys[2].reference->nameSpace, "ns");
 }
 
+// A key value a response carried with a control picture names the provider's key again.
+TEST(RequestParser, KeyValuesWithControlPicturesReachTheProviderAsControlCharacters) {
+    const CimRequest request = parseRequest(call(
+        "<IPARAMVALUE NAME=\"InstanceName\"><INSTANCENAME CLASSNAME=\"A\">"
+        "<KEYBINDING NAME=\"Name\"><KEYVALUE VALUETYPE=\"string\">vmnic\u2401x</KEYVALUE></KEYBINDING>"
+        "</INSTANCENAME></IPARAMVALUE>"));
+    const auto& path = std::get<ObjectPathModel>(*request.param("InstanceName"));
+    ASSERT_EQ(path.keys.size(), 1U);
+    EXPECT_EQ(path.keys[0].value, "vmnic\x01x");
+}
+
 TEST(RequestParser, ReadsInstanceWithArrayNullElementsAndNullProperty) {
     const CimRequest request = parseRequest(call(
         "<IPARAMVALUE NAME=\"NewInstance\"><INSTANCE CLASSNAME=\"A\">"

@@ -42,6 +42,20 @@ TEST(CoreConfigTest, MalformedRegistrationStopsTheCoreWithFileAndLine) {
     std::filesystem::remove(reg);
 }
 
+TEST(CoreConfigTest, MofWarningsGoToTheWarningSinkAtStart) {
+    std::filesystem::path mof =
+        writeFile("typechange.mof", "class P {\n  boolean Flag;\n};\nclass C : P {\n  uint16 Flag;\n};\n");
+    CoreConfig config = rawConfig();
+    config.mofPaths.push_back(mof);
+    std::vector<std::string> warnings;
+    config.warningSink = [&warnings](const std::string& line) { warnings.push_back(line); };
+    { BrokerCore core(config); }
+    EXPECT_EQ(warnings, (std::vector<std::string>{
+                            mof.string() + ":5: property C.Flag is uint16 but overrides Flag of P, which is "
+                                           "boolean; an inherited property cannot change its type"}));
+    std::filesystem::remove(mof);
+}
+
 TEST(CoreConfigTest, GoodInputStarts) { EXPECT_EQ(startupError(rawConfig()), "started"); }
 
 }  // namespace

@@ -21,6 +21,32 @@ TEST_F(DateTimeTest, IntervalFormatsWithDaysAndColon) {
     EXPECT_TRUE(dt->ft->isInterval(dt, nullptr));
 }
 
+std::string stringOf(const CMPIBroker* broker, CMPIUint64 micros, bool interval) {
+    CMPIDateTime* dt = broker->eft->newDateTimeFromBinary(broker, micros, interval ? 1 : 0, nullptr);
+    return text(dt->ft->getStringFormat(dt, nullptr));
+}
+
+TEST_F(DateTimeTest, LastMicrosecondOf9999IsWrittenAsIs) {
+    EXPECT_EQ(stringOf(mb(), 253402300799999999ULL, false), "99991231235959.999999+000");
+}
+
+// A build date before 1970 whose arithmetic wrapped below zero lands far beyond
+// year 9999: the string form carries four year digits, so it is the latest
+// timestamp, never a longer string.
+TEST_F(DateTimeTest, PointsBeyondYear9999AreClampedToTheLatestTimestamp) {
+    EXPECT_EQ(stringOf(mb(), 253402300800000000ULL, false), "99991231235959.999999+000");
+    const CMPIUint64 wrappedBuildDate = static_cast<CMPIUint64>(-86400LL * 365) * 1000000ULL;
+    EXPECT_EQ(stringOf(mb(), wrappedBuildDate, false), "99991231235959.999999+000");
+    EXPECT_EQ(stringOf(mb(), ~0ULL, false), "99991231235959.999999+000");
+}
+
+TEST_F(DateTimeTest, IntervalsOfAHundredMillionDaysAreClampedNotWrapped) {
+    const CMPIUint64 lastDay = (99999999ULL * 86400 + 86399) * 1000000ULL + 999999;
+    EXPECT_EQ(stringOf(mb(), lastDay, true), "99999999235959.999999:000");
+    EXPECT_EQ(stringOf(mb(), lastDay + 1, true), "99999999235959.999999:000");
+    EXPECT_EQ(stringOf(mb(), ~0ULL, true), "99999999235959.999999:000");
+}
+
 TEST_F(DateTimeTest, StringFormsParseBackIncludingTheUtcOffset) {
     CMPIDateTime* utc = mb()->eft->newDateTimeFromChars(mb(), "20090213233130.123456+000", nullptr);
     EXPECT_EQ(utc->ft->getBinaryFormat(utc, nullptr), 1234567890123456ULL);

@@ -1,6 +1,6 @@
 #include "host_process.hpp"
 
-
+#include <gtest/gtest.h>
 #include <poll.h>
 #include <signal.h>
 #include <sys/wait.h>
@@ -30,6 +30,21 @@ std::string sourceDir() {
 std::vector<std::string> rawProviderArgs() {
     return {"--provider-dir", buildDir() + "/lib", "--registration", sourceDir() + "/tests/e2e/data/rawhost.reg",
             "--mof", sourceDir() + "/tests/rawprovider/rawprovider.mof", "--host-name", "testhost"};
+}
+
+HostProcess* SharedRawHost::host = nullptr;
+
+void SharedRawHost::start() {
+    auto args = rawProviderArgs();
+    args.insert(args.end(), {"--credentials", sourceDir() + "/tests/e2e/data/credentials"});
+    host = new HostProcess(args);
+    ASSERT_TRUE(host->waitReady()) << host->output();
+}
+
+void SharedRawHost::stop() {
+    EXPECT_EQ(host->stop(SIGTERM), 0);
+    delete host;
+    host = nullptr;
 }
 
 HostProcess::HostProcess(std::vector<std::string> args, bool choosePort) {

@@ -44,6 +44,15 @@ private:
 // The classes a provider registration file names (its "[Class]" sections), in its order.
 std::vector<std::string> registeredClasses(const std::string& registrationFile);
 
+// One orv-cimhost over the raw test provider with the users of
+// tests/e2e/data/credentials, shared by the tests of a suite: start() in
+// SetUpTestSuite, stop() in TearDownTestSuite (expects a clean exit).
+struct SharedRawHost {
+    static HostProcess* host;
+    static void start();
+    static void stop();
+};
+
 // Runs a shell command; its standard output and error, in that order.
 std::string runCommand(const std::string& command);
 

@@ -21,25 +21,13 @@ struct WbemcliCase {
 
 class WbemcliTest : public ::testing::TestWithParam<WbemcliCase> {
 protected:
-    static void SetUpTestSuite() {
-        auto args = rawProviderArgs();
-        args.insert(args.end(), {"--credentials", sourceDir() + "/tests/e2e/data/credentials"});
-        host_ = new HostProcess(args);
-        ASSERT_TRUE(host_->waitReady()) << host_->output();
-    }
-    static void TearDownTestSuite() {
-        EXPECT_EQ(host_->stop(SIGTERM), 0);
-        delete host_;
-        host_ = nullptr;
-    }
-    static HostProcess* host_;
+    static void SetUpTestSuite() { SharedRawHost::start(); }
+    static void TearDownTestSuite() { SharedRawHost::stop(); }
 };
-
-HostProcess* WbemcliTest::host_ = nullptr;
 
 TEST_P(WbemcliTest, OutputMatchesGolden) {
     const WbemcliCase& c = GetParam();
-    const std::string port = std::to_string(host_->port());
+    const std::string port = std::to_string(SharedRawHost::host->port());
     const std::string url = std::string("'http://") + c.user + ":secret@localhost:" + port + "/root/" + c.object + "'";
     std::string output = runCommand(std::string("timeout 20 wbemcli ") + c.command + " " + url + " " + c.extra);
     output = std::regex_replace(output, std::regex("localhost:" + port), "localhost:PORT");

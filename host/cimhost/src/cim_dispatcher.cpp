@@ -6,11 +6,13 @@
 #include <utility>
 
 #include "call_limiter.hpp"
+#include "enumeration_registry.hpp"
 #include "operation_context.hpp"
 #include "operation_errors.hpp"
 #include "streamed_response.hpp"
 #include "orv/cimxml/cim_status.hpp"
 #include "orv/cimxml/response_writer.hpp"
+#include "pull_operations.hpp"
 
 namespace orv::cimhost {
 
@@ -39,6 +41,18 @@ constexpr std::array kOperations = {
     Operation{"AssociatorNames", detail::associatorNames},
     Operation{"References", detail::references},
     Operation{"ReferenceNames", detail::referenceNames},
+    Operation{"OpenEnumerateInstances", detail::openEnumerateInstances},
+    Operation{"OpenEnumerateInstancePaths", detail::openEnumerateInstancePaths},
+    Operation{"OpenAssociatorInstances", detail::openAssociatorInstances},
+    Operation{"OpenAssociatorInstancePaths", detail::openAssociatorInstancePaths},
+    Operation{"OpenReferenceInstances", detail::openReferenceInstances},
+    Operation{"OpenReferenceInstancePaths", detail::openReferenceInstancePaths},
+    Operation{"OpenQueryInstances", detail::openQueryInstances},
+    Operation{"PullInstancesWithPath", detail::pullInstancesWithPath},
+    Operation{"PullInstancePaths", detail::pullInstancePaths},
+    Operation{"PullInstances", detail::pullInstances},
+    Operation{"CloseEnumeration", detail::closeEnumeration},
+    Operation{"EnumerationCount", detail::enumerationCount},
 };
 
 const Operation* findOperation(const std::string& name) {
@@ -60,11 +74,17 @@ CimDispatcher::CimDispatcher(host::BrokerCore& core, const repository::ClassRepo
       classes_(classes),
       hostName_(std::move(hostName)),
       arrayNulls_(arrayNulls),
-      limiter_(std::make_unique<detail::CallLimiter>(callLimit)) {}
+      limiter_(std::make_unique<detail::CallLimiter>(callLimit)),
+      enumerations_(std::make_unique<detail::EnumerationRegistry>()) {}
 
 CimDispatcher::~CimDispatcher() = default;
 
-void CimDispatcher::drain() { limiter_->drain(); }
+void CimDispatcher::drain() {
+    limiter_->drain();
+    enumerations_->shutdown();
+}
+
+std::size_t CimDispatcher::openEnumerations() const { return enumerations_->openCount(); }
 
 std::string CimDispatcher::respond(const cimxml::CimRequest& request, const std::string& principal) const {
     return respondWithin(request, principal, nullptr);
@@ -122,7 +142,7 @@ std::string CimDispatcher::respondNow(const cimxml::CimRequest& request, const s
         host::ObjectScope scope;
         detail::OperationContext context{core_,    classes_,    request, principal,
                                          cimxml::PathDefaults{hostName_, request.nameSpace},
-                                         out,      arrayNulls_, streamed};
+                                         out,      arrayNulls_, streamed, enumerations_.get()};
         handler(context);
     } catch (const CimError& error) {
         if (streamed != nullptr && streamed->begun()) {

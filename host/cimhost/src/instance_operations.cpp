@@ -15,48 +15,9 @@ using cimxml::CimStatus;
 
 namespace {
 
-// The flags every instance read takes. LocalOnly is deprecated for instances by
-// DSP0200 1.3 because servers applied it inconsistently; this host treats it as
-// false whatever the client sends: the value is checked to be a boolean, every
-// property (inherited ones too) is returned, subject to PropertyList and
-// DeepInheritance, and providers never see CMPI_FLAG_LocalOnly.
-struct ReadFlags {
-    bool includeQualifiers;
-    bool includeClassOrigin;
-    std::optional<std::vector<std::string>> propertyList;
-};
-
-ReadFlags readFlags(const cimxml::CimRequest& request) {
-    static_cast<void>(cimxml::boolParam(request, "LocalOnly", false));
-    return ReadFlags{cimxml::boolParam(request, "IncludeQualifiers", false),
-                     cimxml::boolParam(request, "IncludeClassOrigin", false),
-                     cimxml::propertyListParam(request, "PropertyList")};
-}
-
 CMPIObjectPath* instancePath(const OperationContext& context, const cimxml::ObjectPathModel& model) {
     requireClass(context, model.className);
     return buildObjectPath(context.core.broker(), context.classes, context.request.nameSpace, model);
-}
-
-bool contains(const std::vector<std::string>& names, const std::string& name) {
-    for (const auto& candidate : names) {
-        if (strcasecmp(candidate.c_str(), name.c_str()) == 0) {
-            return true;
-        }
-    }
-    return false;
-}
-
-// Without deep inheritance only the requested class's own properties are returned.
-std::optional<std::vector<std::string>> shallowPropertyList(const repository::ClassDecl& cls,
-                                                            const std::optional<std::vector<std::string>>& requested) {
-    std::vector<std::string> names;
-    for (const auto& property : cls.properties) {
-        if (!requested || contains(*requested, property.name)) {
-            names.push_back(property.name);
-        }
-    }
-    return names;
 }
 
 // The properties an ExecQuery answer carries: those of the SELECT list alone (the

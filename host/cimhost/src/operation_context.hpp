@@ -13,6 +13,7 @@
 
 namespace orv::cimhost::detail {
 
+class EnumerationRegistry;
 class StreamedResponse;
 
 struct OperationContext {
@@ -25,6 +26,7 @@ struct OperationContext {
     cimxml::ArrayNullElements arrayNulls;  // how NULL array elements are sent
     // Set when the answer may go out in pieces while the operation runs.
     StreamedResponse* streamed = nullptr;
+    EnumerationRegistry* enumerations = nullptr;  // open enumerations of the pull operations
 };
 
 using OperationHandler = void (*)(OperationContext& context);
@@ -61,6 +63,20 @@ void throwIfFailed(const host::Reply& reply);
 host::CallOptions callOptions(const OperationContext& context, bool deepInheritance,
                               bool includeQualifiers, bool includeClassOrigin,
                               const std::optional<std::vector<std::string>>& propertyList);
+// The flags every instance read takes. LocalOnly is deprecated for instances by
+// DSP0200 1.3 because servers applied it inconsistently; this host treats it as
+// false whatever the client sends: the value is checked to be a boolean, every
+// property (inherited ones too) is returned, subject to PropertyList and
+// DeepInheritance, and providers never see CMPI_FLAG_LocalOnly.
+struct ReadFlags {
+    bool includeQualifiers;
+    bool includeClassOrigin;
+    std::optional<std::vector<std::string>> propertyList;
+};
+ReadFlags readFlags(const cimxml::CimRequest& request);
+// Without deep inheritance only the requested class's own properties are returned.
+std::optional<std::vector<std::string>> shallowPropertyList(const repository::ClassDecl& cls,
+                                                            const std::optional<std::vector<std::string>>& requested);
 // Encoding of returned instances: class origins and property list from the request.
 cimxml::InstanceEncoding instanceEncoding(const OperationContext& context, bool includeClassOrigin,
                                           std::optional<std::vector<std::string>> propertyList);

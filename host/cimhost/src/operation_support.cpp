@@ -1,5 +1,8 @@
 // Helpers shared by the operation handlers.
+#include <strings.h>
+
 #include "orv/cimxml/cim_status.hpp"
+#include "orv/cimxml/request_params.hpp"
 #include "operation_context.hpp"
 
 namespace orv::cimhost::detail {
@@ -31,6 +34,37 @@ host::CallOptions callOptions(const OperationContext& context, bool deepInherita
                     (includeClassOrigin ? CMPI_FLAG_IncludeClassOrigin : 0U);
     options.properties = propertyList;
     return options;
+}
+
+namespace {
+
+bool contains(const std::vector<std::string>& names, const std::string& name) {
+    for (const auto& candidate : names) {
+        if (strcasecmp(candidate.c_str(), name.c_str()) == 0) {
+            return true;
+        }
+    }
+    return false;
+}
+
+}  // namespace
+
+ReadFlags readFlags(const cimxml::CimRequest& request) {
+    static_cast<void>(cimxml::boolParam(request, "LocalOnly", false));
+    return ReadFlags{cimxml::boolParam(request, "IncludeQualifiers", false),
+                     cimxml::boolParam(request, "IncludeClassOrigin", false),
+                     cimxml::propertyListParam(request, "PropertyList")};
+}
+
+std::optional<std::vector<std::string>> shallowPropertyList(const repository::ClassDecl& cls,
+                                                            const std::optional<std::vector<std::string>>& requested) {
+    std::vector<std::string> names;
+    for (const auto& property : cls.properties) {
+        if (!requested || contains(*requested, property.name)) {
+            names.push_back(property.name);
+        }
+    }
+    return names;
 }
 
 cimxml::InstanceEncoding instanceEncoding(const OperationContext& context, bool includeClassOrigin,

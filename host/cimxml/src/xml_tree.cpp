@@ -1,5 +1,7 @@
 #include "orv/cimxml/xml_tree.hpp"
 
+#include "control_pictures.hpp"
+
 #include <expat.h>
 
 #include <climits>
@@ -44,7 +46,7 @@ public:
         element->name = name;
         element->line = static_cast<int>(XML_GetCurrentLineNumber(parser_));
         for (std::size_t i = 0; attrs[i] != nullptr; i += 2) {
-            element->attributes.emplace_back(attrs[i], attrs[i + 1]);
+            element->attributes.emplace_back(attrs[i], fromControlPictures(attrs[i + 1]));
         }
         XmlElement* raw = element.get();
         if (stack_.empty()) {
@@ -58,6 +60,10 @@ public:
     void end() {
         // After a stop expat may still report the end of the element whose start was refused.
         if (error_.empty() && !stack_.empty()) {
+            std::string& text = stack_.back()->text;
+            if (text.find('\xE2') != std::string::npos) {
+                text = fromControlPictures(text);
+            }
             stack_.pop_back();
         }
     }

@@ -3,19 +3,23 @@
 #include <array>
 #include <stdexcept>
 
+#include "control_pictures.hpp"
+
 namespace orv::cimxml {
 
 namespace {
 
-// What each byte becomes in text and attribute values: 0 copied as it is, 1 replaced by an
-// entity or character reference, 2 dropped.
-enum : unsigned char { kCopy = 0, kReplace = 1, kDrop = 2 };
+// What each byte becomes in text and attribute values: copied as it is, replaced by an
+// entity or character reference, sent as its control picture (control_pictures.hpp), or
+// dropped (NUL).
+enum : unsigned char { kCopy = 0, kReplace = 1, kPicture = 2, kDrop = 3 };
 
 constexpr std::array<unsigned char, 256> escapeTable() {
     std::array<unsigned char, 256> table{};
-    for (unsigned c = 0; c < 0x20; ++c) {
-        // Not representable in XML 1.0 even as a reference: dropped.
-        table[c] = kDrop;
+    table[0] = kDrop;
+    for (unsigned c = 1; c < 0x20; ++c) {
+        // Not representable in XML 1.0 even as a reference.
+        table[c] = kPicture;
     }
     for (unsigned char c : {'&', '<', '>', '"', '\'', '\t', '\n', '\r'}) {
         table[c] = kReplace;
@@ -51,6 +55,8 @@ void appendEscapedXml(std::string& out, std::string_view text) {
         out.append(run, static_cast<std::size_t>(p - run));
         if (kind == kReplace) {
             out += replacement(*p);
+        } else if (kind == kPicture) {
+            appendControlPicture(out, static_cast<unsigned char>(*p));
         }
         run = p + 1;
     }

@@ -125,6 +125,9 @@ Reply send(detail::CoreServices& services, Request request, const CallOptions& o
     request.properties = properties.get();
     request.caller = callerOf(opts);
     request.onInstance = opts.onInstance ? &opts.onInstance : nullptr;
+    if (opts.onItem) {
+        state->sink.consumer = &opts.onItem;
+    }
     if (request.op == Op::InvokeMethod) {
         ArenaGuard guard(state->arena);
         state->out = detail::newArgs(detail::Owner::Arena);

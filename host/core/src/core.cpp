@@ -46,6 +46,9 @@ CoreServices::CoreServices(const CoreConfig& config) : broker_(makeBroker(this))
     } catch (const repo::ParseError& error) {
         throw std::runtime_error(error.what());
     }
+    for (const std::string& line : repository_.warnings()) {
+        warn(line);
+    }
     for (const auto& set : registrationSets_) {
         for (const auto& reg : set.all()) {
             registrations_.push_back(&reg);

@@ -119,6 +119,16 @@ std::optional<DateTimeImpl> parseDateTime(std::string_view text) {
     return std::nullopt;
 }
 
+// The string form has four digits for the year and eight for the days of an
+// interval. A binary value beyond them (a point in time after 9999, as a date
+// before 1970 gives when its arithmetic wraps below zero; an interval of 10^8 days
+// or more) is written as the largest value the form can carry, never as a longer
+// or wrapped string.
+constexpr CMPIUint64 kLastSecondOf9999 = 253402300799ULL;  // 9999-12-31 23:59:59 UTC
+constexpr CMPIUint64 kIntervalDayLimit = 100000000ULL;
+constexpr const char* kLatestPoint = "99991231235959.999999+000";
+constexpr const char* kLongestInterval = "99999999235959.999999:000";
+
 std::string formatDateTime(const DateTimeImpl& value) {
     char buffer[80];
     CMPIUint64 seconds = value.micros / kMicrosPerSecond;
@@ -126,12 +136,18 @@ std::string formatDateTime(const DateTimeImpl& value) {
     if (value.interval) {
         CMPIUint64 days = seconds / kSecondsPerDay;
         CMPIUint64 rest = seconds % kSecondsPerDay;
+        if (days >= kIntervalDayLimit) {
+            return kLongestInterval;
+        }
         std::snprintf(buffer, sizeof buffer, "%08llu%02llu%02llu%02llu.%06lu:000",
-                      static_cast<unsigned long long>(days % 100000000ULL),
+                      static_cast<unsigned long long>(days),
                       static_cast<unsigned long long>(rest / 3600),
                       static_cast<unsigned long long>(rest / 60 % 60),
                       static_cast<unsigned long long>(rest % 60), micros);
         return buffer;
+    }
+    if (seconds > kLastSecondOf9999) {
+        return kLatestPoint;
     }
     auto time = static_cast<std::time_t>(seconds);
     std::tm parts{};

@@ -33,16 +33,24 @@ bool admitted(const ResultSink& sink, CMPIInstance* instance) {
     return sink.query == nullptr || admitForQuery(*sink.query, instance);
 }
 
-void append(ResultSink& sink, ReturnedItem::Kind kind, CMPIType type, void* object) {
+// Keeps the item, or hands it to the streaming consumer and frees what was made
+// for it since `mark` (the sink arena's newest object before the copy).
+CMPIStatus append(ResultSink& sink, ReturnedItem::Kind kind, CMPIType type, void* object, const ObjectBase* mark) {
     ReturnedItem item;
     item.kind = kind;
     item.data.type = type;
     item.data.state = CMPI_goodValue;
     item.data.value.inst = static_cast<CMPIInstance*>(object);
-    sink.items.push_back(item);
+    if (sink.consumer == nullptr) {
+        sink.items.push_back(item);
+        return okStatus();
+    }
+    const bool taken = (*sink.consumer)(item);
+    sink.out->clearAfter(mark);
+    return taken ? okStatus() : status(CMPI_RC_ERR_FAILED, "the client no longer takes results of this request");
 }
 
-// An instance for a listening caller: handed on as it is, nothing kept.
+// An instance for a listening caller (ResultSink::onInstance): handed on as it is.
 CMPIStatus forward(const ResultSink& sink, const CMPIInstance* instance) {
     if (!(*sink.onInstance)(instance)) {
         return status(CMPI_RC_ERR_FAILED, "the instance could not be sent: the request was given up");
@@ -77,17 +85,22 @@ CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance
         return status(CMPI_RC_ERR_INVALID_PARAMETER, "returnInstance with a NULL instance");
     }
     if (sink->onInstance != nullptr && sink->query == nullptr && instanceImpl(instance) != nullptr) {
-        return forward(*sink, instance);
+        return forward(*sink, instance);  // no copy: the listener is done with it when it returns
     }
-    ArenaGuard guard(*sink->out);
-    CMPIInstance* copy = cloneInstance(instance, Owner::Arena);
+    const ObjectBase* mark = sink->out->top();
+    CMPIInstance* copy = nullptr;
+    {
+        ArenaGuard guard(*sink->out);
+        copy = cloneInstance(instance, Owner::Arena);
+    }
     if (copy == nullptr) {
         return status(CMPI_RC_ERR_INVALID_HANDLE, "returnInstance with an object that is not a live instance");
     }
-    if (admitted(*sink, copy)) {
-        append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy);
+    if (!admitted(*sink, copy)) {
+        sink->out->clearAfter(mark);
+        return okStatus();
     }
-    return okStatus();
+    return append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy, mark);
 }
 
 CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path) {
@@ -98,27 +111,34 @@ CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path
     if (path == nullptr) {
         return status(CMPI_RC_ERR_INVALID_PARAMETER, "returnObjectPath with a NULL path");
     }
-    ArenaGuard guard(*sink->out);
-    if (sink->pathsAsInstances) {
-        CMPIInstance* instance = objectPathImpl(path) != nullptr ? newInstance(path, Owner::Arena) : nullptr;
-        if (instance == nullptr) {
-            return status(CMPI_RC_ERR_INVALID_HANDLE, "returnObjectPath with an object that is not a live object path");
+    const ObjectBase* mark = sink->out->top();
+    const bool asInstance = sink->pathsAsInstances;
+    void* copy = nullptr;
+    {
+        ArenaGuard guard(*sink->out);
+        if (asInstance) {
+            copy = objectPathImpl(path) != nullptr ? newInstance(path, Owner::Arena) : nullptr;
+        } else {
+            copy = cloneObjectPath(path, Owner::Arena);
         }
-        ++sink->pathsTurnedIntoInstances;
-        if (sink->onInstance != nullptr && sink->query == nullptr) {
-            return forward(*sink, instance);
-        }
-        if (admitted(*sink, instance)) {
-            append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, instance);
-        }
-        return okStatus();
     }
-    CMPIObjectPath* copy = cloneObjectPath(path, Owner::Arena);
     if (copy == nullptr) {
         return status(CMPI_RC_ERR_INVALID_HANDLE, "returnObjectPath with an object that is not a live object path");
     }
-    append(*sink, ReturnedItem::Kind::ObjectPath, CMPI_ref, copy);
-    return okStatus();
+    if (asInstance) {
+        ++sink->pathsTurnedIntoInstances;
+        if (sink->onInstance != nullptr && sink->query == nullptr) {
+            const CMPIStatus sent = forward(*sink, static_cast<CMPIInstance*>(copy));
+            sink->out->clearAfter(mark);
+            return sent;
+        }
+        if (!admitted(*sink, static_cast<CMPIInstance*>(copy))) {
+            sink->out->clearAfter(mark);
+            return okStatus();
+        }
+        return append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy, mark);
+    }
+    return append(*sink, ReturnedItem::Kind::ObjectPath, CMPI_ref, copy, mark);
 }
 
 CMPIStatus returnDone(const CMPIResult* result) {

@@ -30,6 +30,9 @@ struct ResultSink {
     // Instance requests of a caller that takes each instance as it arrives: returned
     // instances go here instead of into `items` (not while a query filters them).
     const InstanceListener* onInstance = nullptr;
+    // Set when the caller streams (CallOptions::onItem): instances and paths go to
+    // it and are freed at once instead of being kept in `items`.
+    const ItemConsumer* consumer = nullptr;
 };
 
 // A caller-owned result feeding `sink`; free it with disposeObject.

@@ -10,8 +10,9 @@ namespace {
 
 class Builder {
 public:
-    Builder(const ClassSyntax& syntax, const NamespaceState& ns, const std::string& file)
-        : syntax_(syntax), ns_(ns), file_(file) {}
+    Builder(const ClassSyntax& syntax, const NamespaceState& ns, const std::string& file,
+            std::vector<std::string>& warnings)
+        : syntax_(syntax), ns_(ns), file_(file), warnings_(warnings) {}
 
     ClassDecl run() {
         if (const ClassDecl* existing = ns_.findClass(syntax_.name)) {
@@ -186,6 +187,9 @@ private:
         }
         for (Decl& existing : effective) {
             if (existing.propagated && text::iequals(existing.name, target)) {
+                if constexpr (std::is_same_v<Decl, PropertyDecl>) {
+                    checkSameType(existing, own, line);
+                }
                 existing = overriding(existing, own);
                 return;
             }
@@ -195,6 +199,26 @@ private:
                            own.name + " names no " + kind + " of " + syntax_.superClass);
         }
         effective.push_back(own);
+    }
+
+    static std::string typeText(const DataType& type) {
+        std::string text = type.type == CimType::Reference ? type.referenceClass + " REF"
+                                                           : std::string(cimTypeName(type.type));
+        return type.isArray ? text + "[]" : text;
+    }
+
+    // An inherited property keeps its type in a subclass (a reference may name a
+    // subclass of its class); the repository takes the new type as declared, since
+    // providers serve it, but says so, because a parent-class enumeration then
+    // carries values of a type the parent class does not declare.
+    void checkSameType(const PropertyDecl& inheritedDecl, const PropertyDecl& own, int line) const {
+        if (inheritedDecl.type.type == own.type.type && inheritedDecl.type.isArray == own.type.isArray) {
+            return;
+        }
+        warnings_.push_back(file_ + ":" + std::to_string(line) + ": property " + syntax_.name + "." +
+                            own.name + " is " + typeText(own.type) + " but overrides " + inheritedDecl.name +
+                            " of " + inheritedDecl.classOrigin + ", which is " + typeText(inheritedDecl.type) +
+                            "; an inherited property cannot change its type");
     }
 
     template <typename Decl>
@@ -213,12 +237,14 @@ private:
     const ClassSyntax& syntax_;
     const NamespaceState& ns_;
     const std::string& file_;
+    std::vector<std::string>& warnings_;
 };
 
 }  // namespace
 
-ClassDecl buildClass(const ClassSyntax& syntax, const NamespaceState& ns, const std::string& file) {
-    return Builder(syntax, ns, file).run();
+ClassDecl buildClass(const ClassSyntax& syntax, const NamespaceState& ns, const std::string& file,
+                     std::vector<std::string>& warnings) {
+    return Builder(syntax, ns, file, warnings).run();
 }
 
 QualifierDeclaration buildQualifierDeclaration(const QualifierDeclSyntax& syntax,

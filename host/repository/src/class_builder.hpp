@@ -3,6 +3,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "mof_syntax.hpp"
 #include "namespace_state.hpp"
@@ -14,7 +15,10 @@ namespace orv::repository::mof {
 // Throws MofError for an unknown superclass or referenced class, a duplicate
 // class or property, an unknown qualifier (when the namespace declares
 // qualifiers), a value that does not fit its type, or an Override naming nothing.
-ClassDecl buildClass(const ClassSyntax& syntax, const NamespaceState& ns, const std::string& file);
+// Appends to `warnings` ("file:line: message") what is accepted but breaks a
+// schema rule: a property declared again with another type than the one it inherits.
+ClassDecl buildClass(const ClassSyntax& syntax, const NamespaceState& ns, const std::string& file,
+                     std::vector<std::string>& warnings);
 
 QualifierDeclaration buildQualifierDeclaration(const QualifierDeclSyntax& syntax,
                                                const std::string& file);

@@ -24,6 +24,8 @@ void ClassRepository::loadText(std::string_view text, std::string_view fileName,
     state_ = std::move(next);
 }
 
+const std::vector<std::string>& ClassRepository::warnings() const noexcept { return state_->warnings; }
+
 std::vector<std::string> ClassRepository::namespaces() const {
     std::vector<std::string> out;
     for (const auto& ns : state_->namespaces) {

@@ -87,7 +87,7 @@ private:
 
     void handle(const mof::ClassSyntax& syntax, const std::string& fileName) {
         NamespaceState& ns = state_.obtain(namespace_);
-        ns.addClass(std::make_shared<const ClassDecl>(mof::buildClass(syntax, ns, fileName)));
+        ns.addClass(std::make_shared<const ClassDecl>(mof::buildClass(syntax, ns, fileName, state_.warnings)));
     }
 
     void handle(const mof::QualifierDeclSyntax& syntax, const std::string& fileName) {

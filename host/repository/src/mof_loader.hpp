@@ -16,6 +16,8 @@ namespace orv::repository {
 struct RepositoryState {
     std::vector<NamespaceState> namespaces;
     std::unordered_map<std::string, std::size_t> index;
+    // "file:line: message" for what the MOF may declare but should not, in load order.
+    std::vector<std::string> warnings;
 
     static std::string normalize(std::string_view ns);
     const NamespaceState* find(std::string_view ns) const;

@@ -179,3 +179,20 @@ TEST_F(PortInstanceTest, TransceiverAndPhyAddressComeFromTheRecord) {
 
 }  // namespace
 }  // namespace ethernet
+
+namespace {
+
+// The known deviation: CIM_NetworkPort declares AutoSense boolean; the provider
+// serves a uint16, and the class repository says so once, when it loads the MOF.
+TEST(AutoSenseTypeChange, TheRepositoryWarnsOfItOnceAtLoad) {
+    orv::providertest::ProviderCore core;
+    const std::vector<std::string> warnings = core.warnings();
+    ASSERT_EQ(warnings.size(), 1u);
+    EXPECT_NE(warnings.front().find("EthernetPort.mof:24: property Orvane_EthernetPort.AutoSense is uint16 but "
+                                    "overrides AutoSense of CIM_NetworkPort, which is boolean; an inherited property "
+                                    "cannot change its type"),
+              std::string::npos)
+        << warnings.front();
+}
+
+}  // namespace

@@ -3,9 +3,16 @@
 #include <cmpift.h>
 
 #include <cstdlib>
+#include <mutex>
 #include <stdexcept>
 
 namespace orv::providertest {
+
+struct ProviderCore::WarningLog {
+    mutable std::mutex mutex;
+    std::vector<std::string> lines;
+};
+
 namespace {
 
 // The variable's value, or else the folder of the build that compiled this file.
@@ -14,8 +21,13 @@ std::filesystem::path fromEnvironment(const char* name, const char* builtIn) {
     return value != nullptr && *value != '\0' ? value : builtIn;
 }
 
-orv::host::CoreConfig configFor(const ProviderCoreOptions& options) {
+orv::host::CoreConfig configFor(const ProviderCoreOptions& options,
+                                const std::shared_ptr<ProviderCore::WarningLog>& warnings) {
     orv::host::CoreConfig config;
+    config.warningSink = [warnings](const std::string& line) {
+        std::lock_guard<std::mutex> lock(warnings->mutex);
+        warnings->lines.push_back(line);
+    };
     config.providerDirs = options.providerDirs;
     config.providerDirs.push_back(ProviderCore::providerDir());
     config.mofPaths = {ProviderCore::mofFile()};
@@ -43,7 +55,13 @@ std::filesystem::path ProviderCore::mofFile() { return sourceDir() / "cim/mof/or
 std::filesystem::path ProviderCore::providerDir() { return buildDir() / "lib"; }
 
 ProviderCore::ProviderCore(const ProviderCoreOptions& options)
-    : core_(std::make_unique<orv::host::BrokerCore>(configFor(options))) {}
+    : warnings_(std::make_shared<WarningLog>()),
+      core_(std::make_unique<orv::host::BrokerCore>(configFor(options, warnings_))) {}
+
+std::vector<std::string> ProviderCore::warnings() const {
+    std::lock_guard<std::mutex> lock(warnings_->mutex);
+    return warnings_->lines;
+}
 
 ProviderCore::~ProviderCore() = default;
 

@@ -16,6 +16,7 @@ namespace orv::cimhost {
 
 namespace detail {
 class CallLimiter;
+class EnumerationRegistry;
 class StreamedResponse;
 }
 
@@ -42,9 +43,12 @@ public:
     // then sent and the returned text is empty (see streamed_response.hpp).
     std::string respond(const cimxml::CimRequest& request, const std::string& principal,
                         http::ResponseStream& stream, const http::Response& head) const;
-    // Waits for every provider call still running (overrunning ones included); the
-    // host calls it after the server stopped and before the providers are cleaned up.
+    // Waits for every provider call still running (overrunning ones included), then
+    // closes the open enumerations of the pull operations and joins their producers;
+    // the host calls it after the server stopped and before the providers are cleaned up.
     void drain();
+    // How many enumerations of the pull operations are open now.
+    std::size_t openEnumerations() const;
 
 private:
     std::string respondNow(const cimxml::CimRequest& request, const std::string& principal,
@@ -57,6 +61,7 @@ private:
     std::string hostName_;
     cimxml::ArrayNullElements arrayNulls_;
     std::unique_ptr<detail::CallLimiter> limiter_;
+    std::unique_ptr<detail::EnumerationRegistry> enumerations_;
 };
 
 }  // namespace orv::cimhost

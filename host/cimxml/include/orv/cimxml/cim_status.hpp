@@ -27,6 +27,15 @@ enum class CimStatus : int {
     InvalidQuery = 15,
     MethodNotAvailable = 16,
     MethodNotFound = 17,
+    // The pull operations' codes (DSP0200 1.3).
+    InvalidEnumerationContext = 21,
+    InvalidOperationTimeout = 22,
+    PullHasBeenAbandoned = 23,
+    PullCannotBeAbandoned = 24,
+    FilteredEnumerationNotSupported = 25,
+    ContinuationOnErrorNotSupported = 26,
+    ServerLimitsExceeded = 27,
+    ServerIsShuttingDown = 28,
 };
 
 // "CIM_ERR_NOT_SUPPORTED" and so on; "CIM_ERR_FAILED" for codes it does not know.

@@ -7,9 +7,10 @@
 
 namespace orv::cimxml {
 
-// Text with &, <, >, " and ' replaced by entity references, and characters that XML 1.0
-// cannot carry (control characters other than tab, line feed and carriage return)
-// written as character references so that a parser rejects nothing we send.
+// Text with &, <, >, " and ' replaced by entity references, tab, line feed and carriage
+// return as character references, and the control characters XML 1.0 cannot carry at
+// all written as their Unicode control pictures (U+2401..U+241F), which the host's
+// reader turns back into them (src/control_pictures.hpp).
 std::string escapeXml(std::string_view text);
 // The same, appended to `out`.
 void appendEscapedXml(std::string& out, std::string_view text);

@@ -52,7 +52,7 @@ struct CoreConfig {
     std::string mofNamespace = "root/cimv2";
     // Receives the core's warnings, one line each without line end (such as the
     // one logged once per provider that hands object paths to instance
-    // requests). Unset: they go to standard error.
+    // requests, and the class repository's warnings about the MOF at start). Unset: they go to standard error.
     std::function<void(const std::string&)> warningSink;
 };
 
@@ -61,6 +61,10 @@ struct CoreConfig {
 // (the client is gone, say) makes returnInstance fail with CMPI_RC_ERR_FAILED, so the
 // provider can stop early. Must not throw: it runs inside the provider's call.
 using InstanceListener = std::function<bool(const CMPIInstance* instance)>;
+
+struct ReturnedItem;
+// Receives returned objects one at a time (see CallOptions::onItem).
+using ItemConsumer = std::function<bool(const ReturnedItem&)>;
 
 // Per-request settings that reach the provider through its context.
 struct CallOptions {
@@ -75,6 +79,13 @@ struct CallOptions {
     // it as it arrives instead of being copied into the Reply, so that a front end
     // can send each one on while the provider builds the next.
     InstanceListener onInstance;
+    // Any request (the pull operations): when set, every instance and object path a provider returns is
+    // handed to it at once, on the provider's thread, and freed when it returns
+    // (valid only during the call; clone to keep), instead of being kept in the
+    // Reply, so a request costs the memory of one object whatever the provider
+    // returns. Answering false refuses the object: the provider's return call gets
+    // CMPI_RC_ERR_FAILED, which tells it to stop.
+    ItemConsumer onItem;
 };
 
 // One thing a provider returned, in the order it arrived.

@@ -43,6 +43,11 @@ public:
     void loadText(std::string_view text, std::string_view fileName,
                   std::string_view ns = kDefaultNamespace);
 
+    // What the loaded MOF declares against a schema rule the repository does not
+    // enforce, one "file:line: message" line each, in load order (a property
+    // declared again with another type than the one it inherits).
+    const std::vector<std::string>& warnings() const noexcept;
+
     // Namespaces that hold at least one class or qualifier declaration, as first spelled.
     std::vector<std::string> namespaces() const;
     bool hasNamespace(std::string_view ns) const noexcept;

@@ -60,6 +60,10 @@ public:
     ProviderCore& operator=(const ProviderCore&) = delete;
 
     orv::host::BrokerCore& core() { return *core_; }
+    // The core's warnings so far, one line each (at start, the class repository's
+    // about the MOF, such as the known AutoSense type change); kept here rather than
+    // written to standard error, which the tests of provider output capture.
+    std::vector<std::string> warnings() const;
     const CMPIBroker* broker() const { return core_->broker(); }
 
     // A path of the class (no keys), or of an instance with string keys.
@@ -71,7 +75,10 @@ public:
     orv::host::Reply getInstance(std::string_view className, const StringKeys& keys,
                                  const PropertyList& properties = std::nullopt);
 
+    struct WarningLog;
+
 private:
+    std::shared_ptr<WarningLog> warnings_;
     std::unique_ptr<orv::host::BrokerCore> core_;
     // Declared after the core: destroyed first, as the core requires.
     orv::host::ObjectScope scope_;
