@@ -45,10 +45,10 @@ TEST(XmlTree, OtherPicturesAndNeighboursStayAsTheyAre) {
     EXPECT_EQ(root->text, text.substr(0, text.size() - 1));
 }
 
-TEST(XmlWriter, KeepsPlainRunsAroundEscapedCharacters) {
+TEST(XmlWriter, KeepsPlainRunsAroundEscapedCharactersAndControlPictures) {
     XmlWriter out;
     out.open("OUTER").open("V").attr("A", "x\ny\rz").text("plain <mid> end\x1f").close().leaf("L", "a&b").close();
-    EXPECT_EQ(out.take(), "<OUTER><V A=\"x&#10;y&#13;z\">plain &lt;mid&gt; end</V><L>a&amp;b</L></OUTER>");
+    EXPECT_EQ(out.take(), "<OUTER><V A=\"x&#10;y&#13;z\">plain &lt;mid&gt; end\xE2\x90\x9F</V><L>a&amp;b</L></OUTER>");
     EXPECT_EQ(out.depth(), 0U);
 }
 
