@@ -33,7 +33,7 @@ TEST(LatchedHealthE2eTest, OrvCimhostLatchesEscalatesAndKeepsTheWorstStateOfEver
     EXPECT_EQ(host->stop(SIGTERM), 0) << host->output();
 }
 
-TEST(KernelIpChangeE2eTest, OrvCimhostDeliversTheIndicationWhenTheFixtureReplacesAnInterfaceAddress) {
+TEST(KernelIpChangeE2eTest, OrvCimhostSendsTheIndicationWhenTheFixtureReplacesAnInterfaceAddress) {
     HealthFixture fixture("ipchange");
     fixture.write(5, 5);
     ListenerProcess listener({"--port", "0"});
