@@ -76,6 +76,10 @@ port=$(sed -n 's/.*listening on [^ ]*:\([0-9]*\).*/\1/p' "$work/host.log")
 [ -n "$port" ] || { cat "$work/host.log"; fail "the installed host did not start"; }
 answer=$(wbemcli ein "http://localhost:$port/root/cimv2:Orvane_EthernetPort")
 grep -q 'Orvane_EthernetPort.*DeviceID="vmnic0"' <<<"$answer" || fail "wbemcli through the installed host: $answer"
+# The companion library is served by default: the computer system every path names.
+answer=$(wbemcli ein "http://localhost:$port/root/cimv2:OMC_UnitaryComputerSystem")
+grep -q 'OMC_UnitaryComputerSystem.*CreationClassName="OMC_UnitaryComputerSystem"' <<<"$answer" ||
+    fail "no computer system through the installed host: $answer"
 kill -TERM "$host_pid"
 wait "$host_pid" || fail "the installed host did not stop cleanly"
 host_pid=""
@@ -107,15 +111,20 @@ grep -Eq '^providerDirs:.* /usr/lib/[^ ]+/cmpi$' "$sfcb_prefix/etc/sfcb/sfcb.cfg
 ORV_PLATFORM=sim ORV_SIM_FIXTURE=/usr/share/doc/orv-cimhost/examples/host.json SFCB_PORT=$sfcb_port \
     "$sfcb_scripts/sfcb-run.sh" start "$sfcb_prefix"
 answer=$(wbemcli ein "http://localhost:$sfcb_port/root/cimv2:Orvane_EthernetPort" 2>&1 || true)
+system=$(wbemcli ein "http://localhost:$sfcb_port/root/cimv2:OMC_UnitaryComputerSystem" 2>&1 || true)
 "$sfcb_scripts/sfcb-run.sh" stop "$sfcb_prefix"
 grep -q 'Orvane_EthernetPort.*DeviceID="vmnic0"' <<<"$answer" || fail "wbemcli through sfcb: $answer"
+grep -q 'OMC_UnitaryComputerSystem.*CreationClassName="OMC_UnitaryComputerSystem"' <<<"$system" ||
+    fail "no computer system through sfcb: $system"
 
 echo "== unregistering"
 /usr/sbin/orv-sfcb-register --prefix "$sfcb_prefix" unregister
 # sfcbrepos keeps the previous repository beside the new one (*.previous): only the new counts.
 for file in registration/providerRegister registration/repository/root/cimv2/classSchemas; do
-    [ -f "$sfcb_prefix/var/lib/sfcb/$file" ] && grep -q "Orvane_EthernetPort" "$sfcb_prefix/var/lib/sfcb/$file" &&
-        fail "Orvane_EthernetPort is still in $file"
+    for class in Orvane_EthernetPort Orvane_DiskDrive; do
+        [ -f "$sfcb_prefix/var/lib/sfcb/$file" ] && grep -q "$class" "$sfcb_prefix/var/lib/sfcb/$file" &&
+            fail "$class is still in $file"
+    done
 done
 [ -e "$sfcb_prefix/var/lib/sfcb/stage/mofs/root/cimv2/EthernetPort.mof" ] && fail "the class files are still staged"
 sfcb_prefix=""

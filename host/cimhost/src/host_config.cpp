@@ -34,10 +34,14 @@ bool runsFromBuildTree() {
 HostConfig defaultConfig() {
     const bool buildTree = runsFromBuildTree();
     const fs::path mofDir = buildTree ? ORV_DEFAULT_MOF_DIR : ORV_INSTALLED_DATA_DIR;
+    // The companion library (the computer system and the watched hardware classes) is
+    // served beside the project's: without it the latched health state has nothing to watch.
+    const fs::path companionDir = buildTree ? ORV_DEFAULT_COMPANION_MOF_DIR : ORV_INSTALLED_DATA_DIR;
     HostConfig config;
     config.providerDirs = {fs::path(buildTree ? ORV_DEFAULT_PROVIDER_DIR : ORV_INSTALLED_PROVIDER_DIR)};
-    config.registrationFiles = {mofDir / "orvprovider.reg"};
-    config.mofFiles = {mofDir / "orvprovider.mof"};
+    config.registrationFiles = {mofDir / "orvprovider.reg", companionDir / "orvhwhealth.reg"};
+    // The companion's classes derive from the project's: read after them.
+    config.mofFiles = {mofDir / "orvprovider.mof", companionDir / "orvhwhealth.mof"};
     config.interopMof = mofDir / "interop" / "interop.mof";
     config.stateDir = fs::path(buildTree ? ORV_DEFAULT_STATE_DIR : ORV_INSTALLED_STATE_DIR);
     return config;
