@@ -33,6 +33,20 @@ TEST_F(StreamingTest, EveryInstanceReachesTheConsumerInOrderAndTheReplyKeepsNone
     EXPECT_EQ(names, keptNames);
 }
 
+TEST_F(StreamingTest, PathsHandedToAnInstanceRequestReachTheConsumerAsInstances) {
+    std::vector<std::string> names;
+    CallOptions opts = as("paths");
+    opts.onItem = [&names](const ReturnedItem& item) {
+        EXPECT_EQ(item.kind, ReturnedItem::Kind::Instance);
+        names.push_back(nameOf(item));
+        return true;
+    };
+    Reply reply = core_->getInstance(path("Raw_Element", "wanted"), opts);
+    ASSERT_EQ(reply.rc(), CMPI_RC_OK) << reply.message();
+    EXPECT_EQ(names, (std::vector<std::string>{"path-0", "path-1"}));
+    EXPECT_TRUE(reply.items().empty());
+}
+
 TEST_F(StreamingTest, ObjectPathsStreamToo) {
     std::vector<std::string> classes;
     CallOptions opts = as("");

@@ -44,12 +44,12 @@ std::string requiredString(const cimxml::CimRequest& request, const char* name) 
 
 // Each instance is written as the provider returns it and the document sent on in pieces;
 // the instance's own broker objects (property names read by the encoder) go with it.
-host::InstanceListener streamInstances(OperationContext& context, const cimxml::InstanceEncoding& encoding,
-                                       std::exception_ptr& failure) {
-    return [&context, &encoding, &failure](const CMPIInstance* instance) {
+host::ItemConsumer streamInstances(OperationContext& context, const cimxml::InstanceEncoding& encoding,
+                                   std::exception_ptr& failure) {
+    return [&context, &encoding, &failure](const host::ReturnedItem& item) {
         try {
             host::ObjectScope scope;
-            writeNamedInstance(context, instance, encoding);
+            writeNamedInstance(context, item.data.value.inst, encoding);
             return context.streamed->sendIfLarge(context.out);
         } catch (...) {
             failure = std::current_exception();
@@ -73,14 +73,14 @@ void getInstance(OperationContext& context) {
     // copy kept), and used only once the provider has answered OK.
     std::optional<std::string> answer;
     std::exception_ptr failure;
-    options.onInstance = [&answer, &encoding, &failure](const CMPIInstance* instance) {
+    options.onItem = [&answer, &encoding, &failure](const host::ReturnedItem& item) {
         if (answer) {
             return true;
         }
         try {
             host::ObjectScope scope;
             cimxml::XmlWriter text;
-            cimxml::writeInstance(text, instance, encoding);
+            cimxml::writeInstance(text, item.data.value.inst, encoding);
             answer = text.take();
             return true;
         } catch (...) {
@@ -113,7 +113,7 @@ void enumerateInstances(OperationContext& context) {
         callOptions(context, deep, flags.includeQualifiers, flags.includeClassOrigin, flags.propertyList);
     std::exception_ptr failure;
     if (context.streamed != nullptr) {
-        options.onInstance = streamInstances(context, encoding, failure);
+        options.onItem = streamInstances(context, encoding, failure);
     }
     host::Reply reply = context.core.enumerateInstances(classPath(context, cls.name), options);
     if (failure) {

@@ -124,7 +124,6 @@ Reply send(detail::CoreServices& services, Request request, const CallOptions& o
     PropertyList properties(opts);
     request.properties = properties.get();
     request.caller = callerOf(opts);
-    request.onInstance = opts.onInstance ? &opts.onInstance : nullptr;
     if (opts.onItem) {
         state->sink.consumer = &opts.onItem;
     }

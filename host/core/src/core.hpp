@@ -63,8 +63,6 @@ struct Request {
     const CMPIArgs* in = nullptr;
     CMPIArgs* out = nullptr;
     Caller caller;
-    // Instance requests whose caller takes each instance as it arrives.
-    const InstanceListener* onInstance = nullptr;
 };
 
 struct Outcome {

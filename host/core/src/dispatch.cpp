@@ -145,7 +145,6 @@ Outcome CoreServices::callTargets(const std::vector<Target>& targets, ProviderKi
         CMPIStatus status{CMPI_RC_OK, nullptr};
         if (kind == ProviderKind::Instance) {
             sink.pathsAsInstances = request.op == Op::EnumerateInstances || request.op == Op::GetInstance;
-            sink.onInstance = sink.pathsAsInstances ? request.onInstance : nullptr;
             const unsigned turnedBefore = sink.pathsTurnedIntoInstances;
             status = callInstanceMI(mi, request, frame.ctx(), rslt, pathFor(request, target));
             if (request.op == Op::ExecQuery && status.rc == CMPI_RC_ERR_NOT_SUPPORTED) {

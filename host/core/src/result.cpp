@@ -33,29 +33,33 @@ bool admitted(const ResultSink& sink, CMPIInstance* instance) {
     return sink.query == nullptr || admitForQuery(*sink.query, instance);
 }
 
-// Keeps the item, or hands it to the streaming consumer and frees what was made
-// for it since `mark` (the sink arena's newest object before the copy).
-CMPIStatus append(ResultSink& sink, ReturnedItem::Kind kind, CMPIType type, void* object, const ObjectBase* mark) {
+ReturnedItem itemOf(ReturnedItem::Kind kind, CMPIType type, void* object) {
     ReturnedItem item;
     item.kind = kind;
     item.data.type = type;
     item.data.state = CMPI_goodValue;
     item.data.value.inst = static_cast<CMPIInstance*>(object);
-    if (sink.consumer == nullptr) {
-        sink.items.push_back(item);
-        return okStatus();
-    }
-    const bool taken = (*sink.consumer)(item);
-    sink.out->clearAfter(mark);
-    return taken ? okStatus() : status(CMPI_RC_ERR_FAILED, "the client no longer takes results of this request");
+    return item;
 }
 
-// An instance for a listening caller (ResultSink::onInstance): handed on as it is.
-CMPIStatus forward(const ResultSink& sink, const CMPIInstance* instance) {
-    if (!(*sink.onInstance)(instance)) {
-        return status(CMPI_RC_ERR_FAILED, "the instance could not be sent: the request was given up");
+// Hands an object to the streaming consumer (ResultSink::consumer).
+CMPIStatus consume(const ResultSink& sink, ReturnedItem::Kind kind, CMPIType type, void* object) {
+    if (!(*sink.consumer)(itemOf(kind, type, object))) {
+        return status(CMPI_RC_ERR_FAILED, "the client no longer takes results of this request");
     }
     return okStatus();
+}
+
+// Keeps the item, or hands it to the streaming consumer and frees what was made
+// for it since `mark` (the sink arena's newest object before the copy).
+CMPIStatus append(ResultSink& sink, ReturnedItem::Kind kind, CMPIType type, void* object, const ObjectBase* mark) {
+    if (sink.consumer == nullptr) {
+        sink.items.push_back(itemOf(kind, type, object));
+        return okStatus();
+    }
+    const CMPIStatus consumed = consume(sink, kind, type, object);
+    sink.out->clearAfter(mark);
+    return consumed;
 }
 
 CMPIStatus returnData(const CMPIResult* result, const CMPIValue* value, CMPIType type) {
@@ -84,8 +88,9 @@ CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance
     if (instance == nullptr) {
         return status(CMPI_RC_ERR_INVALID_PARAMETER, "returnInstance with a NULL instance");
     }
-    if (sink->onInstance != nullptr && sink->query == nullptr && instanceImpl(instance) != nullptr) {
-        return forward(*sink, instance);  // no copy: the listener is done with it when it returns
+    if (sink->consumer != nullptr && sink->query == nullptr && instanceImpl(instance) != nullptr) {
+        // No copy: the consumer is done with the provider's instance when it returns.
+        return consume(*sink, ReturnedItem::Kind::Instance, CMPI_instance, const_cast<CMPIInstance*>(instance));
     }
     const ObjectBase* mark = sink->out->top();
     CMPIInstance* copy = nullptr;
@@ -127,11 +132,6 @@ CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path
     }
     if (asInstance) {
         ++sink->pathsTurnedIntoInstances;
-        if (sink->onInstance != nullptr && sink->query == nullptr) {
-            const CMPIStatus sent = forward(*sink, static_cast<CMPIInstance*>(copy));
-            sink->out->clearAfter(mark);
-            return sent;
-        }
         if (!admitted(*sink, static_cast<CMPIInstance*>(copy))) {
             sink->out->clearAfter(mark);
             return okStatus();

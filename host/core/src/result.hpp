@@ -27,9 +27,6 @@ struct ResultSink {
     // Set while an enumeration answers a query (query_fallback.hpp): only the
     // instances the query selects are kept, cut down to its SELECT list.
     const Query* query = nullptr;
-    // Instance requests of a caller that takes each instance as it arrives: returned
-    // instances go here instead of into `items` (not while a query filters them).
-    const InstanceListener* onInstance = nullptr;
     // Set when the caller streams (CallOptions::onItem): instances and paths go to
     // it and are freed at once instead of being kept in `items`.
     const ItemConsumer* consumer = nullptr;

@@ -56,12 +56,6 @@ struct CoreConfig {
     std::function<void(const std::string&)> warningSink;
 };
 
-// Receives an instance a provider returns, while the provider's returnInstance runs;
-// the instance is the provider's own and valid only during the call. Answering false
-// (the client is gone, say) makes returnInstance fail with CMPI_RC_ERR_FAILED, so the
-// provider can stop early. Must not throw: it runs inside the provider's call.
-using InstanceListener = std::function<bool(const CMPIInstance* instance)>;
-
 struct ReturnedItem;
 // Receives returned objects one at a time (see CallOptions::onItem).
 using ItemConsumer = std::function<bool(const ReturnedItem&)>;
@@ -75,16 +69,14 @@ struct CallOptions {
     // Property list handed to the provider; std::nullopt means "all properties"
     // (a NULL list), an empty vector means "no properties".
     std::optional<std::vector<std::string>> properties;
-    // EnumerateInstances and GetInstance: when set, every returned instance goes to
-    // it as it arrives instead of being copied into the Reply, so that a front end
-    // can send each one on while the provider builds the next.
-    InstanceListener onInstance;
-    // Any request (the pull operations): when set, every instance and object path a provider returns is
-    // handed to it at once, on the provider's thread, and freed when it returns
-    // (valid only during the call; clone to keep), instead of being kept in the
-    // Reply, so a request costs the memory of one object whatever the provider
-    // returns. Answering false refuses the object: the provider's return call gets
-    // CMPI_RC_ERR_FAILED, which tells it to stop.
+    // Streaming: when set, every instance and object path a provider returns is
+    // handed to it at once, on the provider's thread, instead of being kept in the
+    // Reply, so that a front end can send each one on while the provider builds the
+    // next and a request costs the memory of one object whatever the provider
+    // returns. The object is valid only during the call (an instance the provider
+    // returned is its own, handed on without a copy; clone to keep). Answering false
+    // refuses the object: the provider's return call gets CMPI_RC_ERR_FAILED, which
+    // tells it to stop. Must not throw: it runs inside the provider's call.
     ItemConsumer onItem;
 };
 
