@@ -33,13 +33,10 @@ TEST(HeartbeatSfcbTest, SfcbDeliversIncreasingStampsOneIntervalApartAndStaysUp) 
         GTEST_SKIP() << sfcb.reason();
     }
     ListenerProcess listener({"--port", "0"});
-    const int listenerPort = listener.waitListening();
-    ASSERT_GT(listenerPort, 0) << listener.errorText();
-
-    const std::string failed =
-        subscribeOnSfcb(sfcb.port(), "heartbeat", "SELECT * FROM Orvane_CIMHeartbeat",
-                        "http://127.0.0.1:" + std::to_string(listenerPort), base.string());
-    ASSERT_EQ(failed, "");
+    ASSERT_EQ(subscribeLocalListenerOnSfcb(sfcb.port(), listener.waitListening(), "heartbeat",
+                                           "SELECT * FROM Orvane_CIMHeartbeat", base.string()),
+              "")
+        << listener.errorText();
     const std::time_t subscribed = std::time(nullptr);
 
     const std::vector<std::string> lines = listener.waitLines(2, std::chrono::seconds(45));

@@ -47,13 +47,10 @@ TEST(KernelIpChangeSfcbTest, SfcbDeliversTheIndicationWhenTheFixtureReplacesAnIn
         GTEST_SKIP() << sfcb.reason();
     }
     ListenerProcess listener({"--port", "0"});
-    const int listenerPort = listener.waitListening();
-    ASSERT_GT(listenerPort, 0) << listener.errorText();
-
-    const std::string failed =
-        subscribeOnSfcb(sfcb.port(), "ipchange", "SELECT * FROM Orvane_KernelIPChangedIndication",
-                        "http://127.0.0.1:" + std::to_string(listenerPort), fixture.folder());
-    ASSERT_EQ(failed, "");
+    ASSERT_EQ(subscribeLocalListenerOnSfcb(sfcb.port(), listener.waitListening(), "ipchange",
+                                           "SELECT * FROM Orvane_KernelIPChangedIndication", fixture.folder()),
+              "")
+        << listener.errorText();
     fixture.write(5, 5, "10.0.0.11");
 
     const std::vector<std::string> lines = waitForIpChange(listener);

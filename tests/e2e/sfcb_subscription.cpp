@@ -70,4 +70,12 @@ std::string subscribeOnSfcb(int port, const std::string& name, const std::string
     return failed;
 }
 
+std::string subscribeLocalListenerOnSfcb(int port, int listenerPort, const std::string& name,
+                                         const std::string& query, const std::string& scratchDir) {
+    if (listenerPort <= 0) {
+        return "the listener did not start";
+    }
+    return subscribeOnSfcb(port, name, query, "http://127.0.0.1:" + std::to_string(listenerPort), scratchDir);
+}
+
 }  // namespace orv::e2e

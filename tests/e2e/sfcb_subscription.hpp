@@ -17,4 +17,9 @@ namespace orv::e2e {
 std::string subscribeOnSfcb(int port, const std::string& name, const std::string& query,
                             const std::string& destination, const std::string& scratchDir);
 
+// The same for a listener on this machine's loopback at `listenerPort` (as a
+// started listener answers it: not positive when it did not start).
+std::string subscribeLocalListenerOnSfcb(int port, int listenerPort, const std::string& name,
+                                         const std::string& query, const std::string& scratchDir);
+
 }  // namespace orv::e2e
