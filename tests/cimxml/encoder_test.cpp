@@ -52,6 +52,77 @@ TEST(XmlWriter, KeepsPlainRunsAroundEscapedCharactersAndControlPictures) {
     EXPECT_EQ(out.depth(), 0U);
 }
 
+// What one byte becomes, written out by hand.
+std::string escapedByte(unsigned char c) {
+    switch (c) {
+        case 0: return "";
+        case '&': return "&amp;";
+        case '<': return "&lt;";
+        case '>': return "&gt;";
+        case '"': return "&quot;";
+        case '\'': return "&apos;";
+        case '\t': return "&#9;";
+        case '\n': return "&#10;";
+        case '\r': return "&#13;";
+        default: break;
+    }
+    if (c < 0x20) {
+        return std::string{'\xE2', '\x90', static_cast<char>(0x80 + c)};
+    }
+    return std::string(1, static_cast<char>(c));
+}
+
+// Every byte value at every place of texts longer and shorter than the blocks the
+// escaping reads at once, alone and in runs, among plain text of every length.
+TEST(XmlWriter, EveryByteIsEscapedAlikeWhereverItStands) {
+    for (unsigned value = 0; value < 256; ++value) {
+        const auto c = static_cast<unsigned char>(value);
+        for (std::size_t length : {1U, 7U, 15U, 16U, 17U, 31U, 33U, 70U}) {
+            for (std::size_t at = 0; at < length; ++at) {
+                std::string text(length, 'a');
+                text[at] = static_cast<char>(c);
+                if (at + 2 < length) {
+                    text[at + 2] = static_cast<char>(c);
+                }
+                std::string expected;
+                for (char t : text) {
+                    expected += escapedByte(static_cast<unsigned char>(t));
+                }
+                ASSERT_EQ(escapeXml(text), expected) << "byte " << value << " at " << at << " of " << length;
+            }
+        }
+    }
+}
+
+TEST(XmlWriter, LongTextWithManyEscapesIsWrittenWhole) {
+    std::string text;
+    std::string expected;
+    for (int i = 0; i < 5000; ++i) {
+        text += "\"x<";
+        expected += "&quot;x&lt;";
+    }
+    XmlWriter out;
+    out.open("V").text(text).close();
+    EXPECT_EQ(out.take(), "<V>" + expected + "</V>");
+    std::string appended = "head";
+    appendEscapedXml(appended, text);
+    EXPECT_EQ(appended, "head" + expected);
+}
+
+TEST(XmlWriter, DrainHandsOverTheTextAndStaysInsideTheOpenElements) {
+    XmlWriter out;
+    out.open("A").open("B").text("one");
+    EXPECT_EQ(out.size(), 9U);
+    EXPECT_EQ(out.drain(), "<A><B>one");
+    EXPECT_EQ(out.size(), 0U);
+    EXPECT_EQ(out.str(), "");
+    out.close().raw("<C></C>").close();
+    EXPECT_EQ(out.str(), "</B><C></C></A>");
+    EXPECT_EQ(out.take(), "</B><C></C></A>");
+    EXPECT_EQ(out.depth(), 0U);
+    EXPECT_EQ(out.take(), "");
+}
+
 TEST(ResponseWriter, ErrorResponseCarriesCodeAndDescription) {
     const std::string doc = errorResponse("9", "GetInstance", true, 7, "not here");
     EXPECT_NE(doc.find("<IMETHODRESPONSE NAME=\"GetInstance\"><ERROR CODE=\"7\" DESCRIPTION=\"not here\"></ERROR>"),

@@ -1,6 +1,7 @@
-// A small streaming XML writer: elements, attributes and escaped text into a string.
+// A small streaming XML writer: elements, attributes and escaped text into a buffer.
 #pragma once
 
+#include <cstring>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -20,26 +21,59 @@ public:
     // Starts <name ...>; attributes may follow until content or close().
     XmlWriter& open(std::string_view name);
     XmlWriter& attr(std::string_view name, std::string_view value);
-    XmlWriter& text(std::string_view value);
+    XmlWriter& text(std::string_view value) {
+        finishStartTag();
+        appendEscaped(value);
+        return *this;
+    }
     // Closes the innermost open element with an end tag.
     XmlWriter& close();
     // An element holding only text: <name>text</name>.
     XmlWriter& leaf(std::string_view name, std::string_view value);
-    // Markup that is already well formed, copied as it is.
-    XmlWriter& raw(std::string_view markup);
+    // Markup that is already well formed, copied as it is (encoders write whole elements
+    // of a fixed shape so, piece by piece).
+    XmlWriter& raw(std::string_view markup) {
+        finishStartTag();
+        append(markup);
+        return *this;
+    }
 
     std::size_t depth() const noexcept { return openStarts_.size(); }
-    const std::string& str() const noexcept { return out_; }
+    std::size_t size() const noexcept { return used_; }
+    std::string_view str() const noexcept { return {buffer_.data(), used_}; }
     std::string take();
     // The text written so far, leaving the writer inside the same open elements: what
     // follows continues the document (a response sent in pieces).
     std::string drain();
 
 private:
-    void finishStartTag();
+    void finishStartTag() {
+        if (startTagPending_) {
+            append(">");
+            startTagPending_ = false;
+        }
+    }
+    // Makes room for `bytes` more bytes after the text.
+    void reserveMore(std::size_t bytes) {
+        if (buffer_.size() - used_ < bytes) {
+            grow(bytes);
+        }
+    }
+    void grow(std::size_t bytes);
+    void append(std::string_view markup) {
+        if (markup.empty()) {
+            return;  // its data() may be null, which memcpy must not see
+        }
+        reserveMore(markup.size());
+        std::memcpy(buffer_.data() + used_, markup.data(), markup.size());
+        used_ += markup.size();
+    }
+    void appendEscaped(std::string_view text);
     void popName();
 
-    std::string out_;
+    // The document is the first used_ bytes; the rest is room to write into.
+    std::string buffer_;
+    std::size_t used_ = 0;
     // The names of the open elements, one after the other, and where each starts: no
     // allocation per element once the writer has grown.
     std::string openNames_;
