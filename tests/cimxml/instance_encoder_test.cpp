@@ -87,20 +87,11 @@ protected:
         return out.take();
     }
     // Reads property declarations from the core's repository, in the namespace given.
-    InstanceEncoding declared(bool classOrigin, const char* nameSpace = "root/cimv2") const {
+    InstanceEncoding declared(bool classOrigin, const char* nameSpace = "root/cimv2",
+                              std::string_view expectedClass = {}) const {
         InstanceEncoding encoding;
         encoding.includeClassOrigin = classOrigin;
-        const repository::ClassRepository& classes = core.classes();
-        const std::string ns = nameSpace;
-        encoding.lookup = [&classes, ns](std::string_view className,
-                                         std::string_view property) -> std::optional<PropertyInfo> {
-            const repository::ClassDecl* cls = classes.getClass(ns, className);
-            const repository::PropertyDecl* decl = cls == nullptr ? nullptr : cls->findProperty(property);
-            if (decl == nullptr) {
-                return std::nullopt;
-            }
-            return PropertyInfo{decl->classOrigin, decl->type.referenceClass, false};
-        };
+        encoding.declarations = ClassDeclarations(core.classes(), nameSpace, expectedClass);
         return encoding;
     }
 
@@ -298,6 +289,41 @@ TEST_F(InstanceEncoderTest, ClassOriginsComeFromTheDeclarationFoundInAnyCase) {
               "<PROPERTY NAME=\"name\" TYPE=\"string\"><VALUE>p0</VALUE></PROPERTY>"
               "<PROPERTY NAME=\"TEXT\" TYPE=\"string\"><VALUE>t</VALUE></PROPERTY>"
               "</INSTANCE>");
+}
+
+// The class looked up ahead serves its instances; an instance of another class (a
+// subclass of an enumerated class) is looked up by its own name.
+TEST_F(InstanceEncoderTest, ClassLookedUpAheadAndOtherClassesAreBothDeclared) {
+    const InstanceEncoding encoding = declared(true, "root/cimv2", "test_base");
+    CMPIInstance* port = instance("Test_Port");
+    setText(port, "Text", "t");
+    EXPECT_EQ(encoded(port, encoding),
+              "<INSTANCE CLASSNAME=\"Test_Port\">"
+              "<PROPERTY NAME=\"Text\" TYPE=\"string\" CLASSORIGIN=\"Test_Port\"><VALUE>t</VALUE></PROPERTY>"
+              "</INSTANCE>");
+    EXPECT_EQ(encoded(base("b"), encoding),
+              "<INSTANCE CLASSNAME=\"Test_Base\">"
+              "<PROPERTY NAME=\"Name\" TYPE=\"string\" CLASSORIGIN=\"Test_Base\"><VALUE>b</VALUE></PROPERTY>"
+              "</INSTANCE>");
+    // An expected class the namespace does not have changes nothing.
+    EXPECT_EQ(encoded(port, declared(true, "root/cimv2", "Test_Nothing")), encoded(port, encoding));
+}
+
+TEST_F(InstanceEncoderTest, NamedInstanceAndInstanceWithPathWrapTheNameAndTheInstance) {
+    CMPIInstance* inst = base("b<0>");
+    XmlWriter out;
+    writeNamedInstance(out, inst, InstanceEncoding{});
+    const std::string name =
+        "<INSTANCENAME CLASSNAME=\"Test_Base\"><KEYBINDING NAME=\"Name\">"
+        "<KEYVALUE VALUETYPE=\"string\" TYPE=\"string\">b&lt;0&gt;</KEYVALUE></KEYBINDING></INSTANCENAME>";
+    const std::string body = "<INSTANCE CLASSNAME=\"Test_Base\"><PROPERTY NAME=\"Name\" TYPE=\"string\">"
+                             "<VALUE>b&lt;0&gt;</VALUE></PROPERTY></INSTANCE>";
+    EXPECT_EQ(out.take(), "<VALUE.NAMEDINSTANCE>" + name + body + "</VALUE.NAMEDINSTANCE>");
+    writeInstanceWithPath(out, "VALUE.OBJECTWITHPATH", inst, PathDefaults{"h0", "root/unused"}, InstanceEncoding{});
+    EXPECT_EQ(out.take(), "<VALUE.OBJECTWITHPATH><INSTANCEPATH><NAMESPACEPATH><HOST>h0</HOST><LOCALNAMESPACEPATH>"
+                          "<NAMESPACE NAME=\"root\"></NAMESPACE><NAMESPACE NAME=\"cimv2\"></NAMESPACE>"
+                          "</LOCALNAMESPACEPATH></NAMESPACEPATH>" + name + "</INSTANCEPATH>" + body +
+                          "</VALUE.OBJECTWITHPATH>");
 }
 
 TEST_F(InstanceEncoderTest, PropertyTheClassDoesNotDeclareHasNoClassOrigin) {

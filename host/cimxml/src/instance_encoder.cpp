@@ -1,5 +1,6 @@
 // INSTANCE elements: properties of every CIM type, arrays with null elements,
-// references and embedded instances.
+// references and embedded instances. Each property element is written whole, piece by
+// piece, straight into the writer's buffer.
 #include <strings.h>
 
 #include "orv/cimxml/cmpi_value.hpp"
@@ -9,6 +10,9 @@
 namespace orv::cimxml {
 
 namespace {
+
+using repository::ClassDecl;
+using repository::PropertyDecl;
 
 bool selected(const std::optional<std::vector<std::string>>& propertyList, std::string_view name) {
     if (!propertyList) {
@@ -22,134 +26,151 @@ bool selected(const std::optional<std::vector<std::string>>& propertyList, std::
     return false;
 }
 
-struct PropertyHeader {
-    const char* element;
-    std::string_view name;
-    const std::optional<PropertyInfo>& info;
-    bool includeClassOrigin;
+// The three property elements: the start of the start tag up to the name's value, and
+// the end tag.
+struct PropertyElement {
+    std::string_view start;
+    std::string_view end;
 };
+constexpr PropertyElement kScalar{"<PROPERTY NAME=\"", "</PROPERTY>"};
+constexpr PropertyElement kArray{"<PROPERTY.ARRAY NAME=\"", "</PROPERTY.ARRAY>"};
+constexpr PropertyElement kReference{"<PROPERTY.REFERENCE NAME=\"", "</PROPERTY.REFERENCE>"};
+
+// ` NAME="value"` for an attribute after the first.
+void writeAttribute(XmlWriter& out, std::string_view nameWithQuote, std::string_view value) {
+    out.raw(nameWithQuote).text(value).raw("\"");
+}
+
+// The start tag: NAME, then REFERENCECLASS (references) or TYPE, CLASSORIGIN when asked
+// for, and the mark of embedded instances. `type` is that of one element.
+void writeStartTag(XmlWriter& out, const PropertyElement& element, std::string_view name, CMPIType type,
+                   const PropertyDecl* declaration, bool includeClassOrigin) {
+    out.raw(element.start).text(name).raw("\"");
+    if (type == CMPI_ref) {
+        if (declaration != nullptr && !declaration->type.referenceClass.empty()) {
+            writeAttribute(out, " REFERENCECLASS=\"", declaration->type.referenceClass);
+        }
+    } else {
+        out.raw(" TYPE=\"").raw(xmlTypeName(type)).raw("\"");
+    }
+    if (includeClassOrigin && declaration != nullptr && !declaration->classOrigin.empty()) {
+        writeAttribute(out, " CLASSORIGIN=\"", declaration->classOrigin);
+    }
+    if (type == CMPI_instance) {
+        out.raw(" EmbeddedObject=\"instance\"");
+    }
+    out.raw(">");
+}
+
+void writeProperty(XmlWriter& out, std::string_view name, const CMPIData& data, const PropertyDecl* declaration,
+                   const InstanceEncoding& encoding) {
+    const CMPIType element = data.type & ~CMPI_ARRAY;
+    if (xmlTypeName(element).empty()) {
+        return;  // pointers, arguments and the like have no CIM-XML form
+    }
+    if ((data.type & CMPI_ARRAY) != 0) {
+        if (element == CMPI_ref) {
+            return;  // properties cannot hold arrays of references
+        }
+        writeStartTag(out, kArray, name, element, declaration, encoding.includeClassOrigin);
+        if (!isNullData(data) && data.value.array != nullptr) {
+            writeValueArray(out, data.value.array, encoding.arrayNullElements);
+        }
+        out.raw(kArray.end);
+    } else if (data.type == CMPI_ref) {
+        writeStartTag(out, kReference, name, data.type, declaration, encoding.includeClassOrigin);
+        if (!isNullData(data) && data.value.ref != nullptr) {
+            writeValueReference(out, data.value.ref);
+        }
+        out.raw(kReference.end);
+    } else {
+        writeStartTag(out, kScalar, name, data.type, declaration, encoding.includeClassOrigin);
+        writeValue(out, data);
+        out.raw(kScalar.end);
+    }
+}
 
 // The declaration is needed only for what it adds to the property's start tag: the
 // reference class of a reference, the class origin when asked for.
 bool needsDeclaration(const InstanceEncoding& encoding, CMPIType type) {
-    return encoding.lookup && (encoding.includeClassOrigin || type == CMPI_ref);
+    return encoding.declarations && (encoding.includeClassOrigin || type == CMPI_ref);
 }
 
-std::string_view charsOf(const CMPIString* text) {
-    if (text == nullptr || text->ft == nullptr) {
-        return {};
-    }
-    const char* chars = text->ft->getCharPtr(text, nullptr);
-    return chars == nullptr ? std::string_view() : std::string_view(chars);
-}
+// The class of the instance, looked up the first time a property needs it.
+class LazyClass {
+public:
+    LazyClass(const ClassDeclarations& declarations, std::string_view className)
+        : declarations_(declarations), className_(className) {}
 
-// A VALUE element for one item; false when the item has no text (NULL).
-bool writeItem(XmlWriter& out, const CMPIData& item) {
-    if (item.type == CMPI_string && !isNullData(item) && item.value.string != nullptr) {
-        out.leaf("VALUE", charsOf(item.value.string));  // the common case, without a copy
-        return true;
+    const PropertyDecl* property(std::string_view name) {
+        if (!resolved_) {
+            class_ = declarations_.find(className_);
+            resolved_ = true;
+        }
+        return class_ == nullptr ? nullptr : class_->findProperty(name);
     }
-    std::optional<std::string> text = itemText(item);
-    if (text) {
-        out.leaf("VALUE", *text);
-    }
-    return text.has_value();
-}
 
-void openProperty(XmlWriter& out, const PropertyHeader& header, CMPIType type) {
-    out.open(header.element).attr("NAME", header.name);
-    if (type == CMPI_ref) {
-        if (header.info && !header.info->referenceClass.empty()) {
-            out.attr("REFERENCECLASS", header.info->referenceClass);
-        }
-    } else {
-        out.attr("TYPE", xmlTypeName(type));
-    }
-    if (header.includeClassOrigin && header.info && !header.info->classOrigin.empty()) {
-        out.attr("CLASSORIGIN", header.info->classOrigin);
-    }
-    if (header.info && header.info->propagated) {
-        out.attr("PROPAGATED", "true");
-    }
-    if ((type & ~CMPI_ARRAY) == CMPI_instance) {
-        out.attr("EmbeddedObject", "instance");
-    }
-}
-
-void writeProperty(XmlWriter& out, const PropertyHeader& header, const CMPIData& data, ArrayNullElements nulls) {
-    const bool isArray = (data.type & CMPI_ARRAY) != 0;
-    if (xmlTypeName(data.type).empty()) {
-        return;  // pointers, arguments and the like have no CIM-XML form
-    }
-    if (isArray) {
-        if ((data.type & ~CMPI_ARRAY) == CMPI_ref) {
-            return;  // properties cannot hold arrays of references
-        }
-        PropertyHeader arrayHeader{"PROPERTY.ARRAY", header.name, header.info, header.includeClassOrigin};
-        openProperty(out, arrayHeader, data.type & ~CMPI_ARRAY);
-        if (!isNullData(data) && data.value.array != nullptr) {
-            writeValueArray(out, data.value.array, nulls);
-        }
-        out.close();
-        return;
-    }
-    if (data.type == CMPI_ref) {
-        PropertyHeader refHeader{"PROPERTY.REFERENCE", header.name, header.info, header.includeClassOrigin};
-        openProperty(out, refHeader, data.type);
-        if (!isNullData(data) && data.value.ref != nullptr) {
-            writeValueReference(out, data.value.ref);
-        }
-        out.close();
-        return;
-    }
-    openProperty(out, header, data.type);
-    writeItem(out, data);
-    out.close();
-}
+private:
+    const ClassDeclarations& declarations_;
+    std::string_view className_;
+    const ClassDecl* class_ = nullptr;
+    bool resolved_ = false;
+};
 
 }  // namespace
 
-// The text a VALUE carries for one item: scalars, or the markup of an embedded instance.
-std::optional<std::string> itemText(const CMPIData& item) {
-    if (item.type == CMPI_instance) {
-        if (isNullData(item) || item.value.inst == nullptr) {
-            return std::nullopt;
-        }
-        return instanceText(item.value.inst);
+ClassDeclarations::ClassDeclarations(const repository::ClassRepository& classes, std::string nameSpace,
+                                     std::string_view expectedClass)
+    : classes_(&classes), nameSpace_(std::move(nameSpace)) {
+    if (!expectedClass.empty()) {
+        expected_ = classes.getClass(nameSpace_, expectedClass);
     }
-    return scalarText(item);
 }
 
-void writeValueArray(XmlWriter& out, const CMPIArray* array, ArrayNullElements nulls) {
-    out.open("VALUE.ARRAY");
-    const CMPICount size = array->ft->getSize(array, nullptr);
-    for (CMPICount i = 0; i < size; ++i) {
-        const CMPIData item = array->ft->getElementAt(array, i, nullptr);
-        if (!writeItem(out, item) && nulls == ArrayNullElements::ValueNull) {
-            out.open("VALUE.NULL").close();
-        }
+const ClassDecl* ClassDeclarations::find(std::string_view className) const noexcept {
+    if (expected_ != nullptr && expected_->name == className) {
+        return expected_;
     }
-    out.close();
+    return classes_ == nullptr ? nullptr : classes_->getClass(nameSpace_, className);
 }
 
-void writeInstance(XmlWriter& out, const CMPIInstance* instance, const InstanceEncoding& encoding) {
-    const std::string className = instanceClassName(instance);
-    out.open("INSTANCE").attr("CLASSNAME", className);
+void writeInstance(XmlWriter& out, const CMPIInstance* instance, std::string_view className,
+                   const InstanceEncoding& encoding) {
+    writeAttribute(out, "<INSTANCE CLASSNAME=\"", className);
+    out.raw(">");
+    LazyClass cls(encoding.declarations, className);
     const CMPICount count = instance->ft->getPropertyCount(instance, nullptr);
     for (CMPICount i = 0; i < count; ++i) {
         CMPIString* nameString = nullptr;
         const CMPIData data = instance->ft->getPropertyAt(instance, i, &nameString, nullptr);
-        const std::string_view name = charsOf(nameString);
+        const std::string_view name = cmpiChars(nameString);
         if (!selected(encoding.propertyList, name)) {
             continue;
         }
-        std::optional<PropertyInfo> info;
-        if (needsDeclaration(encoding, data.type)) {
-            info = encoding.lookup(className, name);
-        }
-        writeProperty(out, PropertyHeader{"PROPERTY", name, info, encoding.includeClassOrigin}, data,
-                      encoding.arrayNullElements);
+        const PropertyDecl* declaration = needsDeclaration(encoding, data.type) ? cls.property(name) : nullptr;
+        writeProperty(out, name, data, declaration, encoding);
     }
+    out.raw("</INSTANCE>");
+}
+
+void writeInstance(XmlWriter& out, const CMPIInstance* instance, const InstanceEncoding& encoding) {
+    writeInstance(out, instance, instanceClassName(instance), encoding);
+}
+
+void writeNamedInstance(XmlWriter& out, const CMPIInstance* instance, const InstanceEncoding& encoding) {
+    const CMPIObjectPath* path = instance->ft->getObjectPath(instance, nullptr);
+    out.raw("<VALUE.NAMEDINSTANCE>");
+    writeInstanceName(out, path);
+    writeInstance(out, instance, pathClassChars(path), encoding);
+    out.raw("</VALUE.NAMEDINSTANCE>");
+}
+
+void writeInstanceWithPath(XmlWriter& out, std::string_view element, const CMPIInstance* instance,
+                           const PathDefaults& defaults, const InstanceEncoding& encoding) {
+    const CMPIObjectPath* path = instance->ft->getObjectPath(instance, nullptr);
+    out.open(element);
+    writeInstancePath(out, path, defaults);
+    writeInstance(out, instance, pathClassChars(path), encoding);
     out.close();
 }
 

@@ -24,6 +24,23 @@ std::string_view xmlTypeName(CMPIType type) noexcept;
 // instances and types without a text form.
 std::optional<std::string> scalarText(const CMPIData& data);
 
+// Room for the text of a number, a boolean or a char16.
+struct ScalarBuffer {
+    char chars[64];
+};
+// The same text without a copy: a view of the item's own characters (strings, chars,
+// datetimes) or of `buffer`. `plain` is true where the text can hold nothing XML escapes
+// (numbers and booleans).
+struct ScalarChars {
+    std::string_view text;
+    bool plain = false;
+};
+std::optional<ScalarChars> scalarChars(const CMPIData& data, ScalarBuffer& buffer);
+
+// The characters of a CMPI string without a copy; "" for a NULL string. Valid while the
+// string is.
+std::string_view cmpiChars(const CMPIString* text) noexcept;
+
 // The VALUETYPE of a key of this type: "string", "boolean" or "numeric".
 std::string_view keyValueType(CMPIType type) noexcept;
 
