@@ -77,7 +77,7 @@ std::string escapedByte(unsigned char c) {
 TEST(XmlWriter, EveryByteIsEscapedAlikeWhereverItStands) {
     for (unsigned value = 0; value < 256; ++value) {
         const auto c = static_cast<unsigned char>(value);
-        for (std::size_t length : {1U, 7U, 15U, 16U, 17U, 31U, 33U, 70U}) {
+        for (std::size_t length : {1U, 2U, 3U, 4U, 5U, 7U, 8U, 9U, 12U, 15U, 16U, 17U, 20U, 24U, 31U, 33U, 70U}) {
             for (std::size_t at = 0; at < length; ++at) {
                 std::string text(length, 'a');
                 text[at] = static_cast<char>(c);

@@ -5,14 +5,6 @@
 
 namespace orv::cimxml {
 
-std::string_view cmpiChars(const CMPIString* text) noexcept {
-    if (text == nullptr || text->ft == nullptr) {
-        return {};
-    }
-    const char* chars = text->ft->getCharPtr(text, nullptr);
-    return chars == nullptr ? std::string_view() : std::string_view(chars);
-}
-
 std::string cmpiString(const CMPIString* text) {
     return std::string(cmpiChars(text));
 }
@@ -50,10 +42,6 @@ std::string_view keyValueType(CMPIType type) noexcept {
         return "numeric";
     }
     return "string";
-}
-
-bool isNullData(const CMPIData& data) noexcept {
-    return (data.state & (CMPI_nullValue | CMPI_notFound | CMPI_badValue)) != 0;
 }
 
 namespace {

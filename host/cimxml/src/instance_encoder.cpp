@@ -3,8 +3,12 @@
 // piece, straight into the writer's buffer.
 #include <strings.h>
 
+#include <array>
+#include <cstring>
+
 #include "orv/cimxml/cmpi_value.hpp"
 #include "orv/cimxml/object_encoder.hpp"
+#include "markup.hpp"
 #include "value_encoding.hpp"
 
 namespace orv::cimxml {
@@ -27,66 +31,128 @@ bool selected(const std::optional<std::vector<std::string>>& propertyList, std::
 }
 
 // The three property elements: the start of the start tag up to the name's value, and
-// the end tag.
-struct PropertyElement {
-    std::string_view start;
-    std::string_view end;
+// the end tag (compile-time constants: each copy is a few moves).
+struct ScalarProperty {
+    static constexpr std::string_view start = "<PROPERTY NAME=\"";
+    static constexpr std::string_view end = "</PROPERTY>";
 };
-constexpr PropertyElement kScalar{"<PROPERTY NAME=\"", "</PROPERTY>"};
-constexpr PropertyElement kArray{"<PROPERTY.ARRAY NAME=\"", "</PROPERTY.ARRAY>"};
-constexpr PropertyElement kReference{"<PROPERTY.REFERENCE NAME=\"", "</PROPERTY.REFERENCE>"};
+struct ArrayProperty {
+    static constexpr std::string_view start = "<PROPERTY.ARRAY NAME=\"";
+    static constexpr std::string_view end = "</PROPERTY.ARRAY>";
+};
+struct ReferenceProperty {
+    static constexpr std::string_view start = "<PROPERTY.REFERENCE NAME=\"";
+    static constexpr std::string_view end = "</PROPERTY.REFERENCE>";
+};
 
-// ` NAME="value"` for an attribute after the first.
-void writeAttribute(XmlWriter& out, std::string_view nameWithQuote, std::string_view value) {
-    out.raw(nameWithQuote).text(value).raw("\"");
+constexpr std::string_view kReferenceClass = "\" REFERENCECLASS=\"";
+constexpr std::string_view kClassOrigin = "\" CLASSORIGIN=\"";
+constexpr std::string_view kEmbeddedObject = "\" EmbeddedObject=\"instance";
+
+// `" TYPE="name` for each type, in a fixed-size buffer so that it is copied in one move
+// of kTypeAttributeRoom bytes; `size` 0 for the types CIM-XML cannot carry.
+constexpr std::size_t kTypeAttributeRoom = 32;
+struct TypeAttribute {
+    char text[kTypeAttributeRoom] = {};
+    std::size_t size = 0;
+};
+
+// The simple types are below 256, the encoded ones multiples of 256 from CMPI_instance
+// (16 << 8) on.
+constexpr std::size_t kTypeIndexes = 256 + 16;
+std::size_t typeIndex(CMPIType type) noexcept {
+    return type < 256 ? type : 256 + (((type >> 8) - 16) & 15);
+}
+
+std::array<TypeAttribute, kTypeIndexes> typeAttributeTable() {
+    std::array<TypeAttribute, kTypeIndexes> attributes{};
+    const auto fill = [&attributes](unsigned value) {
+        const auto type = static_cast<CMPIType>(value);
+        const std::string_view name = xmlTypeName(type);
+        if (name.empty()) {
+            return;
+        }
+        TypeAttribute& attribute = attributes[typeIndex(type)];
+        const std::string text = "\" TYPE=\"" + std::string(name);
+        std::memcpy(attribute.text, text.data(), text.size());
+        attribute.size = text.size();
+    };
+    for (unsigned simple = 0; simple < 256; ++simple) {
+        fill(simple);
+    }
+    for (unsigned encoded = 16; encoded < 32; ++encoded) {
+        fill(encoded << 8);
+    }
+    return attributes;
+}
+
+const std::array<TypeAttribute, kTypeIndexes> kTypeAttributes = typeAttributeTable();
+
+const TypeAttribute& typeAttribute(CMPIType type) noexcept {
+    return kTypeAttributes[typeIndex(type)];
 }
 
 // The start tag: NAME, then REFERENCECLASS (references) or TYPE, CLASSORIGIN when asked
-// for, and the mark of embedded instances. `type` is that of one element.
-void writeStartTag(XmlWriter& out, const PropertyElement& element, std::string_view name, CMPIType type,
-                   const PropertyDecl* declaration, bool includeClassOrigin) {
-    out.raw(element.start).text(name).raw("\"");
-    if (type == CMPI_ref) {
-        if (declaration != nullptr && !declaration->type.referenceClass.empty()) {
-            writeAttribute(out, " REFERENCECLASS=\"", declaration->type.referenceClass);
+// for, and the mark of embedded instances; in one claim of room. `type` is that of one
+// element.
+template <typename Element>
+void writeStartTag(XmlWriter& out, std::string_view name, CMPIType type, const PropertyDecl* declaration,
+                   bool includeClassOrigin) {
+    std::string_view referenceClass;
+    std::string_view classOrigin;
+    if (declaration != nullptr) {
+        if (type == CMPI_ref) {
+            referenceClass = declaration->type.referenceClass;
         }
-    } else {
-        out.raw(" TYPE=\"").raw(xmlTypeName(type)).raw("\"");
+        if (includeClassOrigin) {
+            classOrigin = declaration->classOrigin;
+        }
     }
-    if (includeClassOrigin && declaration != nullptr && !declaration->classOrigin.empty()) {
-        writeAttribute(out, " CLASSORIGIN=\"", declaration->classOrigin);
+    char* at = out.claim(Element::start.size() + escapedRoom(name) + kReferenceClass.size() +
+                         escapedRoom(referenceClass) + kTypeAttributeRoom + kClassOrigin.size() +
+                         escapedRoom(classOrigin) + kEmbeddedObject.size() + 2);
+    at = putEscaped(put(at, Element::start), name);
+    if (!referenceClass.empty()) {
+        at = putEscaped(put(at, kReferenceClass), referenceClass);
+    } else if (type != CMPI_ref) {
+        const TypeAttribute& attribute = typeAttribute(type);
+        std::memcpy(at, attribute.text, kTypeAttributeRoom);
+        at += attribute.size;
+    }
+    if (!classOrigin.empty()) {
+        at = putEscaped(put(at, kClassOrigin), classOrigin);
     }
     if (type == CMPI_instance) {
-        out.raw(" EmbeddedObject=\"instance\"");
+        at = put(at, kEmbeddedObject);
     }
-    out.raw(">");
+    out.commit(put(at, "\">"));
 }
 
 void writeProperty(XmlWriter& out, std::string_view name, const CMPIData& data, const PropertyDecl* declaration,
                    const InstanceEncoding& encoding) {
     const CMPIType element = data.type & ~CMPI_ARRAY;
-    if (xmlTypeName(element).empty()) {
+    if (typeAttribute(element).size == 0) {
         return;  // pointers, arguments and the like have no CIM-XML form
     }
     if ((data.type & CMPI_ARRAY) != 0) {
         if (element == CMPI_ref) {
             return;  // properties cannot hold arrays of references
         }
-        writeStartTag(out, kArray, name, element, declaration, encoding.includeClassOrigin);
+        writeStartTag<ArrayProperty>(out, name, element, declaration, encoding.includeClassOrigin);
         if (!isNullData(data) && data.value.array != nullptr) {
             writeValueArray(out, data.value.array, encoding.arrayNullElements);
         }
-        out.raw(kArray.end);
+        out.raw(ArrayProperty::end);
     } else if (data.type == CMPI_ref) {
-        writeStartTag(out, kReference, name, data.type, declaration, encoding.includeClassOrigin);
+        writeStartTag<ReferenceProperty>(out, name, data.type, declaration, encoding.includeClassOrigin);
         if (!isNullData(data) && data.value.ref != nullptr) {
             writeValueReference(out, data.value.ref);
         }
-        out.raw(kReference.end);
+        out.raw(ReferenceProperty::end);
     } else {
-        writeStartTag(out, kScalar, name, data.type, declaration, encoding.includeClassOrigin);
+        writeStartTag<ScalarProperty>(out, name, data.type, declaration, encoding.includeClassOrigin);
         writeValue(out, data);
-        out.raw(kScalar.end);
+        out.raw(ScalarProperty::end);
     }
 }
 
@@ -136,8 +202,7 @@ const ClassDecl* ClassDeclarations::find(std::string_view className) const noexc
 
 void writeInstance(XmlWriter& out, const CMPIInstance* instance, std::string_view className,
                    const InstanceEncoding& encoding) {
-    writeAttribute(out, "<INSTANCE CLASSNAME=\"", className);
-    out.raw(">");
+    out.raw("<INSTANCE CLASSNAME=\"").text(className).raw("\">");
     LazyClass cls(encoding.declarations, className);
     const CMPICount count = instance->ft->getPropertyCount(instance, nullptr);
     for (CMPICount i = 0; i < count; ++i) {

@@ -1,17 +1,34 @@
 // VALUE and VALUE.ARRAY elements written straight from CMPI data.
 #include "orv/cimxml/cmpi_value.hpp"
+#include "markup.hpp"
 #include "value_encoding.hpp"
 
 namespace orv::cimxml {
 
 namespace {
 
+constexpr std::string_view kValueStart = "<VALUE>";
+constexpr std::string_view kValueEnd = "</VALUE>";
+
+// Text needing no escape (numbers, booleans) is short and copied as it is; other text is
+// escaped, and where it is long, in pieces.
 void writeChars(XmlWriter& out, const ScalarChars& chars) {
     if (chars.plain) {
         out.raw(chars.text);
     } else {
         out.text(chars.text);
     }
+}
+
+// <VALUE>text</VALUE> in one claim of room for short text.
+void writeValueElement(XmlWriter& out, const ScalarChars& chars) {
+    if (!chars.plain && chars.text.size() > detail::kEscapePiece) {
+        out.raw(kValueStart).text(chars.text).raw(kValueEnd);
+        return;
+    }
+    char* at = put(out.claim(kValueStart.size() + escapedRoom(chars.text) + kValueEnd.size()), kValueStart);
+    at = chars.plain ? put(at, chars.text) : putEscaped(at, chars.text);
+    out.commit(put(at, kValueEnd));
 }
 
 }  // namespace
@@ -26,19 +43,21 @@ bool writeScalarText(XmlWriter& out, const CMPIData& item) {
 }
 
 bool writeValue(XmlWriter& out, const CMPIData& item) {
+    if (item.type == CMPI_string && !isNullData(item) && item.value.string != nullptr) {
+        writeValueElement(out, ScalarChars{cmpiChars(item.value.string), false});  // the common case, directly
+        return true;
+    }
     if (item.type == CMPI_instance) {
         if (isNullData(item) || item.value.inst == nullptr) {
             return false;
         }
-        out.raw("<VALUE>").text(instanceText(item.value.inst)).raw("</VALUE>");
+        out.raw(kValueStart).text(instanceText(item.value.inst)).raw(kValueEnd);
         return true;
     }
     ScalarBuffer buffer;
     const std::optional<ScalarChars> chars = scalarChars(item, buffer);
     if (chars) {
-        out.raw("<VALUE>");
-        writeChars(out, *chars);
-        out.raw("</VALUE>");
+        writeValueElement(out, *chars);
     }
     return chars.has_value();
 }

@@ -1,6 +1,8 @@
-#include "xml_escape.hpp"
+#include "orv/cimxml/xml_writer.hpp"
 
 #include <array>
+#include <cstddef>
+#include <cstdint>
 #include <cstring>
 
 #if defined(__SSE2__)
@@ -9,7 +11,7 @@
 
 #include "control_pictures.hpp"
 
-namespace orv::cimxml {
+namespace orv::cimxml::detail {
 
 namespace {
 
@@ -75,13 +77,70 @@ unsigned specialBytes(__m128i block) noexcept {
 
 }  // namespace
 
+#if defined(__SSE2__)
+namespace {
+
+std::uint64_t load8(const char* in) noexcept {
+    std::uint64_t word;
+    std::memcpy(&word, in, sizeof word);
+    return word;
+}
+
+std::uint32_t load4(const char* in) noexcept {
+    std::uint32_t word;
+    std::memcpy(&word, in, sizeof word);
+    return word;
+}
+
+// The last `rest` (1 to 15) bytes of a text, written as they are when none of them needs
+// escaping; false, writing nothing, otherwise (the bytes are then taken one by one).
+// Reads only inside the text: the last sixteen bytes of a longer text whose bytes before
+// the rest were copied as they are (to `out - (16 - rest)` on), else two words that
+// overlap in the middle.
+bool copyPlainTail(char*& out, const char* in, std::size_t rest, bool sixteenBefore) noexcept {
+    if (sixteenBefore) {
+        const std::size_t back = 16 - rest;
+        const __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i*>(in - back));
+        if ((specialBytes(block) >> back) != 0) {
+            return false;
+        }
+        _mm_storeu_si128(reinterpret_cast<__m128i*>(out - back), block);
+    } else if (rest >= 8) {
+        const std::uint64_t head = load8(in);
+        const std::uint64_t tail = load8(in + rest - 8);
+        if (specialBytes(_mm_set_epi64x(static_cast<long long>(tail), static_cast<long long>(head))) != 0) {
+            return false;
+        }
+        std::memcpy(out, &head, 8);
+        std::memcpy(out + rest - 8, &tail, 8);
+    } else if (rest >= 4) {
+        const std::uint32_t head = load4(in);
+        const std::uint32_t tail = load4(in + rest - 4);
+        const auto h = static_cast<int>(head);
+        const auto t = static_cast<int>(tail);
+        if (specialBytes(_mm_set_epi32(t, h, t, h)) != 0) {
+            return false;
+        }
+        std::memcpy(out, &head, 4);
+        std::memcpy(out + rest - 4, &tail, 4);
+    } else {
+        return false;
+    }
+    out += rest;
+    return true;
+}
+
+}  // namespace
+#endif
+
 char* escapeInto(char* out, std::string_view text) noexcept {
     const char* in = text.data();
     const char* const end = in + text.size();
 #if defined(__SSE2__)
     // Sixteen bytes at a time while as many remain: the block is stored as it is, and
     // where it holds a byte to escape, the bytes before it are kept and the rest is
-    // read again after it.
+    // read again after it. `plainFrom` is where the bytes copied as they are begin.
+    const char* plainFrom = in;
     while (end - in >= 16) {
         const __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i*>(in));
         _mm_storeu_si128(reinterpret_cast<__m128i*>(out), block);
@@ -94,6 +153,11 @@ char* escapeInto(char* out, std::string_view text) noexcept {
         const auto plain = static_cast<unsigned>(__builtin_ctz(special));
         out = escapeByte(out + plain, static_cast<unsigned char>(in[plain]));
         in += plain + 1;
+        plainFrom = in;
+    }
+    const auto rest = static_cast<std::size_t>(end - in);
+    if (rest == 0 || copyPlainTail(out, in, rest, in - plainFrom >= static_cast<std::ptrdiff_t>(16 - rest))) {
+        return out;
     }
 #endif
     for (; in != end; ++in) {
@@ -107,4 +171,4 @@ char* escapeInto(char* out, std::string_view text) noexcept {
     return out;
 }
 
-}  // namespace orv::cimxml
+}  // namespace orv::cimxml::detail

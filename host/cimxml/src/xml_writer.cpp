@@ -3,17 +3,12 @@
 #include <algorithm>
 #include <stdexcept>
 
-#include "xml_escape.hpp"
 
 namespace orv::cimxml {
 
-namespace {
-
-// Long text is escaped in pieces of this many bytes, so that the room made for the
-// worst case stays small.
-constexpr std::size_t kEscapePiece = 4096;
-
-}  // namespace
+using detail::escapeInto;
+using detail::kEscapePiece;
+using detail::kMaxEscapedBytesPerByte;
 
 void appendEscapedXml(std::string& out, std::string_view text) {
     const std::size_t start = out.size();
@@ -31,12 +26,10 @@ void XmlWriter::grow(std::size_t bytes) {
     buffer_.resize(std::max({buffer_.size() * 2, used_ + bytes, std::size_t{256}}));
 }
 
-void XmlWriter::appendEscaped(std::string_view text) {
+void XmlWriter::appendEscapedInPieces(std::string_view text) {
     while (!text.empty()) {
         const std::string_view piece = text.substr(0, kEscapePiece);
-        reserveMore(piece.size() * kMaxEscapedBytesPerByte);
-        char* const start = buffer_.data() + used_;
-        used_ += static_cast<std::size_t>(escapeInto(start, piece) - start);
+        appendEscaped(piece);
         text.remove_prefix(piece.size());
     }
 }

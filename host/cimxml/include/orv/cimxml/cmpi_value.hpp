@@ -39,13 +39,21 @@ std::optional<ScalarChars> scalarChars(const CMPIData& data, ScalarBuffer& buffe
 
 // The characters of a CMPI string without a copy; "" for a NULL string. Valid while the
 // string is.
-std::string_view cmpiChars(const CMPIString* text) noexcept;
+inline std::string_view cmpiChars(const CMPIString* text) noexcept {
+    if (text == nullptr || text->ft == nullptr) {
+        return {};
+    }
+    const char* chars = text->ft->getCharPtr(text, nullptr);
+    return chars == nullptr ? std::string_view() : std::string_view(chars);
+}
 
 // The VALUETYPE of a key of this type: "string", "boolean" or "numeric".
 std::string_view keyValueType(CMPIType type) noexcept;
 
 // True for the NULL states (null value, not found).
-bool isNullData(const CMPIData& data) noexcept;
+inline bool isNullData(const CMPIData& data) noexcept {
+    return (data.state & (CMPI_nullValue | CMPI_notFound | CMPI_badValue)) != 0;
+}
 
 // A UTF-16 code unit as UTF-8 (a lone surrogate becomes U+FFFD).
 std::string char16ToUtf8(CMPIChar16 unit);

@@ -8,6 +8,17 @@
 
 namespace orv::cimxml {
 
+namespace detail {
+// The most one byte becomes when escaped ("&quot;").
+inline constexpr std::size_t kMaxEscapedBytesPerByte = 6;
+// Text longer than this is escaped in pieces, so that the room made for the worst case
+// stays small.
+inline constexpr std::size_t kEscapePiece = 4096;
+// Writes `text` escaped (as escapeXml) to `out`, which has room for
+// kMaxEscapedBytesPerByte bytes per byte of it; returns the end of what it wrote.
+char* escapeInto(char* out, std::string_view text) noexcept;
+}  // namespace detail
+
 // Text with &, <, >, " and ' replaced by entity references, tab, line feed and carriage
 // return as character references, and the control characters XML 1.0 cannot carry at
 // all written as their Unicode control pictures (U+2401..U+241F), which the host's
@@ -37,6 +48,16 @@ public:
         append(markup);
         return *this;
     }
+
+    // Room for at most `bytes` more bytes of well-formed markup after a pending start tag
+    // is finished: the encoders of fixed shapes write through the pointer without a check
+    // per piece and hand the end of what they wrote back with commit().
+    char* claim(std::size_t bytes) {
+        finishStartTag();
+        reserveMore(bytes);
+        return buffer_.data() + used_;
+    }
+    void commit(const char* end) noexcept { used_ = static_cast<std::size_t>(end - buffer_.data()); }
 
     std::size_t depth() const noexcept { return openStarts_.size(); }
     std::size_t size() const noexcept { return used_; }
@@ -68,7 +89,16 @@ private:
         std::memcpy(buffer_.data() + used_, markup.data(), markup.size());
         used_ += markup.size();
     }
-    void appendEscaped(std::string_view text);
+    void appendEscaped(std::string_view text) {
+        if (text.size() > detail::kEscapePiece) {
+            appendEscapedInPieces(text);
+            return;
+        }
+        reserveMore(text.size() * detail::kMaxEscapedBytesPerByte);
+        char* const start = buffer_.data() + used_;
+        used_ += static_cast<std::size_t>(detail::escapeInto(start, text) - start);
+    }
+    void appendEscapedInPieces(std::string_view text);
     void popName();
 
     // The document is the first used_ bytes; the rest is room to write into.
