@@ -1,5 +1,7 @@
 #include "orv/repository/class_decl.hpp"
 
+#include <cstring>
+
 #include "text.hpp"
 
 namespace orv::repository {
@@ -15,9 +17,19 @@ const Item* findByName(const std::vector<Item>& items, std::string_view name) no
     return nullptr;
 }
 
-// A cheap hash of a name as spelled: the slot table is small and every hit is checked.
+// A cheap hash of a name as spelled (the slot table is small and every hit is checked):
+// of a long name its length and its first and last eight bytes.
 std::size_t exactHash(std::string_view name) noexcept {
-    std::size_t hash = name.size();
+    const std::size_t size = name.size();
+    if (size >= 8) {
+        std::uint64_t head;
+        std::uint64_t tail;
+        std::memcpy(&head, name.data(), sizeof head);
+        std::memcpy(&tail, name.data() + size - 8, sizeof tail);
+        const std::uint64_t mixed = head * 0x9E3779B97F4A7C15ULL ^ (tail + size) * 0xC2B2AE3D27D4EB4FULL;
+        return static_cast<std::size_t>(mixed ^ (mixed >> 29));
+    }
+    std::size_t hash = size;
     for (const char c : name) {
         hash = hash * 31 + static_cast<unsigned char>(c);
     }
