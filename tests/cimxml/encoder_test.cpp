@@ -1,6 +1,8 @@
 // CIM-XML output: escaping, the response envelope and class encoding from MOF.
 #include <gtest/gtest.h>
 
+#include <map>
+
 #include "orv/cimxml/class_encoder.hpp"
 #include "orv/cimxml/cmpi_value.hpp"
 #include "orv/cimxml/response_writer.hpp"
@@ -52,19 +54,17 @@ TEST(XmlWriter, KeepsPlainRunsAroundEscapedCharactersAndControlPictures) {
     EXPECT_EQ(out.depth(), 0U);
 }
 
-// What one byte becomes, written out by hand.
+// What one byte becomes, written out by hand: NUL dropped, markup and white space as
+// references, other control characters as their pictures.
 std::string escapedByte(unsigned char c) {
-    switch (c) {
-        case 0: return "";
-        case '&': return "&amp;";
-        case '<': return "&lt;";
-        case '>': return "&gt;";
-        case '"': return "&quot;";
-        case '\'': return "&apos;";
-        case '\t': return "&#9;";
-        case '\n': return "&#10;";
-        case '\r': return "&#13;";
-        default: break;
+    static const std::map<unsigned char, std::string> kReferences = {
+        {'&', "&amp;"}, {'<', "&lt;"}, {'>', "&gt;"},  {'"', "&quot;"},
+        {'\'', "&apos;"}, {'\t', "&#9;"}, {'\n', "&#10;"}, {'\r', "&#13;"}};
+    if (const auto found = kReferences.find(c); found != kReferences.end()) {
+        return found->second;
+    }
+    if (c == 0) {
+        return "";
     }
     if (c < 0x20) {
         return std::string{'\xE2', '\x90', static_cast<char>(0x80 + c)};

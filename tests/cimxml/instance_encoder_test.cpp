@@ -70,11 +70,14 @@ protected:
         }
         return array;
     }
-    CMPIInstance* base(const char* name) {
-        CMPIInstance* inst = instance("Test_Base");
+    // An instance of `className` with its Name.
+    CMPIInstance* withName(const char* name, const char* className = "Test_Base") {
+        CMPIInstance* inst = instance(className);
         setText(inst, "Name", name);
         return inst;
     }
+    CMPIInstance* base(const char* name) { return withName(name); }
+    CMPIInstance* port(const char* name) { return withName(name, "Test_Port"); }
 
     static std::string encoded(const CMPIInstance* inst, const InstanceEncoding& encoding = {}) {
         XmlWriter out;
@@ -235,8 +238,7 @@ TEST_F(InstanceEncoderTest, EmbeddedInstancesAreEscapedMarkupMarkedAsEmbeddedObj
 }
 
 TEST_F(InstanceEncoderTest, ReferencesTakeThePathFormTheirHostAndNamespaceAllow) {
-    CMPIInstance* inst = instance("Test_Port");
-    setText(inst, "Name", "p0");
+    CMPIInstance* inst = port("p0");
     CMPIObjectPath* owner = path("Test_Base");
     CMPIValue key{};
     key.string = text("b0");
@@ -327,8 +329,7 @@ TEST_F(InstanceEncoderTest, NamedInstanceAndInstanceWithPathWrapTheNameAndTheIns
 }
 
 TEST_F(InstanceEncoderTest, PropertyTheClassDoesNotDeclareHasNoClassOrigin) {
-    CMPIInstance* inst = instance("Test_Port");
-    setText(inst, "Name", "p0");
+    CMPIInstance* inst = port("p0");
     CMPIValue v{};
     v.uint32 = 7;
     set(inst, "Undeclared", v, CMPI_uint32);
@@ -340,8 +341,7 @@ TEST_F(InstanceEncoderTest, PropertyTheClassDoesNotDeclareHasNoClassOrigin) {
 }
 
 TEST_F(InstanceEncoderTest, ClassUnknownToTheRepositoryIsWrittenFromTheValuesAlone) {
-    CMPIInstance* inst = instance("Test_Port");
-    setText(inst, "Name", "p0");
+    CMPIInstance* inst = port("p0");
     CMPIValue v{};
     v.ref = path("Test_Base");
     set(inst, "Owner", v, CMPI_ref);
