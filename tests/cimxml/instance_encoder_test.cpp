@@ -170,6 +170,19 @@ TEST_F(InstanceEncoderTest, MarkupAndControlCharactersInValuesAreEscaped) {
               "0123456789abcdef&lt;0123456789abcdef&gt;</VALUE></PROPERTY></INSTANCE>");
 }
 
+// Values longer than what is escaped in one piece, with escapes across the joins.
+TEST_F(InstanceEncoderTest, LongValuesAreWrittenWhole) {
+    std::string value;
+    std::string escaped;
+    for (int i = 0; i < 3000; ++i) {
+        value += "ab<\x01";
+        escaped += "ab&lt;\xE2\x90\x81";
+    }
+    CMPIInstance* inst = base(value.c_str());
+    EXPECT_EQ(encoded(inst), "<INSTANCE CLASSNAME=\"Test_Base\"><PROPERTY NAME=\"Name\" TYPE=\"string\"><VALUE>" +
+                                 escaped + "</VALUE></PROPERTY></INSTANCE>");
+}
+
 TEST_F(InstanceEncoderTest, ArrayNullElementsAreDroppedOrWrittenAsValueNull) {
     CMPIInstance* inst = base("p0");
     CMPIValue v{};
