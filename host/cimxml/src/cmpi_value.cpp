@@ -71,6 +71,14 @@ ScalarChars numberChars(Number value, ScalarBuffer& buffer) noexcept {
     return ScalarChars{std::string_view(buffer.chars, static_cast<std::size_t>(result.ptr - buffer.chars)), true};
 }
 
+// Padded to kPlainTextRoom like the numbers in a ScalarBuffer.
+constexpr char kTrue[kPlainTextRoom] = "TRUE";
+constexpr char kFalse[kPlainTextRoom] = "FALSE";
+
+ScalarChars booleanChars(bool value) noexcept {
+    return value ? ScalarChars{std::string_view(kTrue, 4), true} : ScalarChars{std::string_view(kFalse, 5), true};
+}
+
 std::optional<ScalarChars> charsOf(const char* chars) noexcept {
     return chars == nullptr ? std::nullopt : std::optional<ScalarChars>(ScalarChars{chars, false});
 }
@@ -99,7 +107,7 @@ std::optional<ScalarChars> scalarChars(const CMPIData& data, ScalarBuffer& buffe
     }
     const CMPIValue& v = data.value;
     switch (data.type) {
-        case CMPI_boolean: return ScalarChars{v.boolean != 0 ? "TRUE" : "FALSE", true};
+        case CMPI_boolean: return booleanChars(v.boolean != 0);
         case CMPI_char16:
             return ScalarChars{std::string_view(buffer.chars,
                                                 static_cast<std::size_t>(writeUtf8(buffer.chars, v.char16) - buffer.chars)),

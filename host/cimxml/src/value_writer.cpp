@@ -1,4 +1,6 @@
 // VALUE and VALUE.ARRAY elements written straight from CMPI data.
+#include <cstring>
+
 #include "orv/cimxml/cmpi_value.hpp"
 #include "markup.hpp"
 #include "value_encoding.hpp"
@@ -26,8 +28,14 @@ void writeValueElement(XmlWriter& out, const ScalarChars& chars) {
         out.raw(kValueStart).text(chars.text).raw(kValueEnd);
         return;
     }
-    char* at = put(out.claim(kValueStart.size() + escapedRoom(chars.text) + kValueEnd.size()), kValueStart);
-    at = chars.plain ? put(at, chars.text) : putEscaped(at, chars.text);
+    char* at = put(out.claim(kValueStart.size() + escapedRoom(chars.text) + kPlainTextRoom + kValueEnd.size()),
+                   kValueStart);
+    if (chars.plain) {
+        std::memcpy(at, chars.text.data(), kPlainTextRoom);
+        at += chars.text.size();
+    } else {
+        at = putEscaped(at, chars.text);
+    }
     out.commit(put(at, kValueEnd));
 }
 
@@ -54,7 +62,7 @@ bool writeValue(XmlWriter& out, const CMPIData& item) {
         out.raw(kValueStart).text(instanceText(item.value.inst)).raw(kValueEnd);
         return true;
     }
-    ScalarBuffer buffer;
+    ScalarBuffer buffer{};  // all of it defined: plain text is copied kPlainTextRoom bytes at a time
     const std::optional<ScalarChars> chars = scalarChars(item, buffer);
     if (chars) {
         writeValueElement(out, *chars);

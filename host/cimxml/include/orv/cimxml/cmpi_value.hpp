@@ -28,9 +28,13 @@ std::optional<std::string> scalarText(const CMPIData& data);
 struct ScalarBuffer {
     char chars[64];
 };
+// How many bytes from the start of plain text may be read (at least its size): it is
+// copied in one move of that many bytes.
+inline constexpr std::size_t kPlainTextRoom = 32;
+static_assert(sizeof(ScalarBuffer::chars) >= kPlainTextRoom);
 // The same text without a copy: a view of the item's own characters (strings, chars,
 // datetimes) or of `buffer`. `plain` is true where the text can hold nothing XML escapes
-// (numbers and booleans).
+// (numbers and booleans); kPlainTextRoom bytes may then be read from its start.
 struct ScalarChars {
     std::string_view text;
     bool plain = false;
