@@ -1,6 +1,8 @@
 #include "orv/cimxml/xml_writer.hpp"
 
 #include <algorithm>
+#include <cstring>
+#include <memory>
 #include <stdexcept>
 
 
@@ -23,7 +25,13 @@ std::string escapeXml(std::string_view text) {
 }
 
 void XmlWriter::grow(std::size_t bytes) {
-    buffer_.resize(std::max({buffer_.size() * 2, used_ + bytes, std::size_t{256}}));
+    const std::size_t capacity = std::max({capacity_ * 2, used_ + bytes, std::size_t{256}});
+    auto larger = std::make_unique_for_overwrite<char[]>(capacity);
+    if (used_ != 0) {
+        std::memcpy(larger.get(), buffer_.get(), used_);
+    }
+    buffer_ = std::move(larger);
+    capacity_ = capacity;
 }
 
 void XmlWriter::appendEscapedInPieces(std::string_view text) {
@@ -82,9 +90,7 @@ XmlWriter& XmlWriter::leaf(std::string_view name, std::string_view value) {
 }
 
 std::string XmlWriter::take() {
-    buffer_.resize(used_);
-    std::string result = std::move(buffer_);
-    buffer_ = std::string();
+    std::string result(str());
     used_ = 0;
     openNames_.clear();
     openStarts_.clear();
@@ -93,7 +99,7 @@ std::string XmlWriter::take() {
 }
 
 std::string XmlWriter::drain() {
-    std::string text(buffer_.data(), used_);
+    std::string text(str());
     used_ = 0;
     return text;
 }

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstring>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -55,13 +56,13 @@ public:
     char* claim(std::size_t bytes) {
         finishStartTag();
         reserveMore(bytes);
-        return buffer_.data() + used_;
+        return buffer_.get() + used_;
     }
-    void commit(const char* end) noexcept { used_ = static_cast<std::size_t>(end - buffer_.data()); }
+    void commit(const char* end) noexcept { used_ = static_cast<std::size_t>(end - buffer_.get()); }
 
     std::size_t depth() const noexcept { return openStarts_.size(); }
     std::size_t size() const noexcept { return used_; }
-    std::string_view str() const noexcept { return {buffer_.data(), used_}; }
+    std::string_view str() const noexcept { return {buffer_.get(), used_}; }
     std::string take();
     // The text written so far, leaving the writer inside the same open elements: what
     // follows continues the document (a response sent in pieces).
@@ -76,7 +77,7 @@ private:
     }
     // Makes room for `bytes` more bytes after the text.
     void reserveMore(std::size_t bytes) {
-        if (buffer_.size() - used_ < bytes) {
+        if (capacity_ - used_ < bytes) {
             grow(bytes);
         }
     }
@@ -86,7 +87,7 @@ private:
             return;  // its data() may be null, which memcpy must not see
         }
         reserveMore(markup.size());
-        std::memcpy(buffer_.data() + used_, markup.data(), markup.size());
+        std::memcpy(buffer_.get() + used_, markup.data(), markup.size());
         used_ += markup.size();
     }
     void appendEscaped(std::string_view text) {
@@ -95,14 +96,16 @@ private:
             return;
         }
         reserveMore(text.size() * detail::kMaxEscapedBytesPerByte);
-        char* const start = buffer_.data() + used_;
+        char* const start = buffer_.get() + used_;
         used_ += static_cast<std::size_t>(detail::escapeInto(start, text) - start);
     }
     void appendEscapedInPieces(std::string_view text);
     void popName();
 
-    // The document is the first used_ bytes; the rest is room to write into.
-    std::string buffer_;
+    // The document is the first used_ bytes; the rest of the capacity_ bytes is room to
+    // write into, never read (and never filled in advance).
+    std::unique_ptr<char[]> buffer_;
+    std::size_t capacity_ = 0;
     std::size_t used_ = 0;
     // The names of the open elements, one after the other, and where each starts: no
     // allocation per element once the writer has grown.
