@@ -396,6 +396,46 @@ TEST_F(InstanceEncoderTest, ValuesWithoutCimXmlFormAreLeftOut) {
               "<PROPERTY NAME=\"Name\" TYPE=\"string\"><VALUE>p0</VALUE></PROPERTY></INSTANCE>");
 }
 
+// An instance whose properties are read from a list, with the types a provider's own
+// instance might report (the broker core's refuses values of types it does not know).
+struct ListedInstance {
+    struct Property {
+        CMPIString* name;
+        CMPIData data;
+    };
+    static CMPICount count(const CMPIInstance* inst, CMPIStatus*) {
+        return static_cast<CMPICount>(static_cast<const ListedInstance*>(inst->hdl)->properties.size());
+    }
+    static CMPIData at(const CMPIInstance* inst, CMPICount index, CMPIString** name, CMPIStatus*) {
+        const Property& property = static_cast<const ListedInstance*>(inst->hdl)->properties.at(index);
+        *name = property.name;
+        return property.data;
+    }
+    std::vector<Property> properties;
+    CMPIInstanceFT ft{};
+    CMPIInstance instance{};
+    ListedInstance() {
+        ft.getPropertyCount = count;
+        ft.getPropertyAt = at;
+        instance.hdl = this;
+        instance.ft = &ft;
+    }
+};
+
+TEST_F(InstanceEncoderTest, PropertiesOfTypesWithoutCimXmlFormAreLeftOut) {
+    ListedInstance listed;
+    for (const int type : {0x0100, 0x4100, CMPI_ref + 1, 5, CMPI_uint8}) {
+        CMPIData data{};
+        data.type = static_cast<CMPIType>(type);
+        data.value.uint8 = 7;
+        listed.properties.push_back({text("P"), data});
+    }
+    XmlWriter out;
+    writeInstance(out, &listed.instance, "Test_Base", InstanceEncoding{});
+    EXPECT_EQ(out.take(), "<INSTANCE CLASSNAME=\"Test_Base\">"
+                          "<PROPERTY NAME=\"P\" TYPE=\"uint8\"><VALUE>7</VALUE></PROPERTY></INSTANCE>");
+}
+
 TEST_F(InstanceEncoderTest, InstanceNameCarriesEveryKeyWithItsValueType) {
     CMPIObjectPath* name = path("Test_Keyed");
     CMPIValue v{};

@@ -58,10 +58,14 @@ struct TypeAttribute {
 };
 
 // The simple types are below 256, the encoded ones multiples of 256 from CMPI_instance
-// (16 << 8) on.
+// (16 << 8) on; any other value has the index of CMPI_null, which has no form.
 constexpr std::size_t kTypeIndexes = 256 + 16;
 std::size_t typeIndex(CMPIType type) noexcept {
-    return type < 256 ? type : 256 + (((type >> 8) - 16) & 15);
+    if (type < 256) {
+        return type;
+    }
+    const unsigned encoded = type >> 8U;
+    return (type & 0xFFU) == 0 && encoded >= 16 && encoded < 32 ? 256 + (encoded - 16) : CMPI_null;
 }
 
 std::array<TypeAttribute, kTypeIndexes> typeAttributeTable() {
