@@ -26,7 +26,7 @@ public:
     // are built each time they are asked for, so a look-up stays short.
     static constexpr std::size_t kCapacity = 32;
 
-    ArrayMemo() = default;
+    ArrayMemo();
     ArrayMemo(const ArrayMemo&) = delete;
     ArrayMemo& operator=(const ArrayMemo&) = delete;
 
@@ -36,7 +36,6 @@ public:
         key_.clear();
         return key_;
     }
-
     const std::vector<std::int64_t>& currentKey() const { return key_; }
 
     // The array of the key just made; build() makes it the first time.
@@ -46,24 +45,26 @@ public:
             return *known;
         }
         CmpiArray made = build();
-        if (entries_.size() < kCapacity) {
-            entries_.push_back(Entry{tag_, key_, made});
-        }
+        keep(made);
         return made;
     }
 
     std::size_t size() const { return entries_.size(); }
 
 private:
+    // The key of an entry is its stretch of keys_.
     struct Entry {
         ArrayTag tag;
-        std::vector<std::int64_t> key;
+        std::size_t keyStart;
+        std::size_t keySize;
         CmpiArray array;
     };
 
     const CmpiArray* lookUp() const;
+    void keep(const CmpiArray& array);
 
     std::vector<Entry> entries_;
+    std::vector<std::int64_t> keys_;
     ArrayTag tag_ = ArrayTag::Uint16Values;
     std::vector<std::int64_t> key_;
 };
