@@ -63,9 +63,11 @@ public:
     {
         std::shared_ptr<const HostModel> host = hostOrThrow(source_);
         throwIfInjected(*host, "GetPnics");
+        const std::vector<NicModel>& nics = nicsOrThrow(*host);
         std::vector<NodeMgr::Network::Pnic*> pnics;
+        pnics.reserve(nics.size());
         try {
-            for (const NicModel& nic : nicsOrThrow(*host)) {
+            for (const NicModel& nic : nics) {
                 pnics.push_back(makeSimPnic(host, nic));
             }
         } catch (...) {
