@@ -3,7 +3,9 @@
 // pause and ring settings, and the associations from a port to those objects.
 //
 // One object serves the instance and the association interfaces. It keeps no
-// state: every request asks the host-management library afresh.
+// state: every request asks the host-management library afresh. What the
+// ports of one request have in common (the system name, arrays with the same
+// elements) is made once for that request (EthernetPort-Request.h).
 #ifndef ORV_ETHERNETPORT_PROVIDER_H
 #define ORV_ETHERNETPORT_PROVIDER_H
 
