@@ -155,7 +155,8 @@ void setPciIdentity(CmpiInstance& instance, Pnic* pnic, ArrayMemo& memo) {
 CmpiArray linkModeArray(ArrayMemo& memo, const std::vector<LinkMode>& modes) {
     std::vector<std::int64_t>& key = memo.key(ArrayTag::LinkModes);
     for (const LinkMode& mode : modes) {
-        key.push_back(static_cast<std::int64_t>(mode.first) * (std::int64_t{1} << 32) + mode.second);
+        key.push_back(mode.first);
+        key.push_back(mode.second);
     }
     return memo.find([&] {
         return convertedArray(modes, CMPI_string, [](const LinkMode& mode) {
