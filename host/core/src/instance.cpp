@@ -96,12 +96,13 @@ CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
     CMPIObjectPath* path = newObjectPath(inst->nameSpace, inst->className, inst->classes, Owner::Arena);
     ObjectPathImpl* p = objectPathImpl(path);
     p->host = inst->host;
+    MemberHome members(p->keys.home());
     for (const std::string& key : keyNamesOf(*inst)) {
         const NamedValue* property = inst->properties.find(key);
         if (property != nullptr && property->data.state == CMPI_goodValue) {
             CMPIData copy{};
             copyValue(copy, property->data);
-            p->keys.setStored(property->name, copy);
+            p->keys.setStored(*property, copy);
         }
     }
     setRc(rc, CMPI_RC_OK);
@@ -129,7 +130,7 @@ CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** propertyList, 
         allowed.push_back(std::move(key));
     }
     inst->filter = std::move(allowed);
-    inst->properties.keepIf([inst](const std::string& name) { return passesFilter(*inst, name); });
+    inst->properties.keepIf([inst](std::string_view name) { return passesFilter(*inst, name); });
     return okStatus();
 }
 
@@ -143,12 +144,13 @@ CMPIStatus setObjectPath(CMPIInstance* instance, const CMPIObjectPath* op) {
     inst->host = path->host;
     inst->className = path->className;
     inst->pathKeys.clear();
+    MemberHome members(inst->properties.home());
     for (std::size_t i = 0; i < path->keys.size(); ++i) {
         const NamedValue& key = path->keys[i];
         CMPIData copy{};
         copyValue(copy, key.data);
-        inst->properties.setStored(key.name, copy);
-        inst->pathKeys.push_back(key.name);
+        inst->properties.setStored(key, copy);
+        inst->pathKeys.emplace_back(key.name());
     }
     return okStatus();
 }
@@ -193,7 +195,9 @@ std::string instanceText(const InstanceImpl& instance) {
     std::string text = "instance of " + instance.className + " {\n";
     for (std::size_t i = 0; i < instance.properties.size(); ++i) {
         const NamedValue& property = instance.properties[i];
-        text += " " + property.name + " = " + keyText(property.data) + ";\n";
+        text += " ";
+        text += property.name();
+        text += " = " + keyText(property.data) + ";\n";
     }
     return text + "};\n";
 }

@@ -11,6 +11,13 @@
 // release() drops the object's contents at once but keeps its 16-byte shell
 // alive in the current arena, so that a second release is answered with an
 // error status instead of touching freed memory.
+//
+// Where the memory comes from is a separate matter (ObjectBase::home): objects
+// an arena owns, and everything inside them, are carved from that arena's pool,
+// which gives them back all at once when the arena is cleared; caller-owned
+// objects and their contents come from the heap and are freed one by one. So a
+// request that builds thousands of values costs a few pool chunks, not a
+// malloc and a free per value.
 #pragma once
 
 #include <cstddef>
@@ -27,14 +34,48 @@ struct ObjectBase {
     const void* ft = nullptr;  // mirrors the CMPI struct's ft
     ObjectBase* prev = nullptr;
     ObjectBase* next = nullptr;
-    Arena* arena = nullptr;
+    Arena* arena = nullptr;  // the arena whose list holds the object, if any
+    Arena* home = nullptr;   // the arena whose pool holds its memory; nullptr: the heap
     void (*destroy)(ObjectBase*) noexcept = nullptr;  // deletes the whole object
     void (*drop)(ObjectBase*) noexcept = nullptr;     // frees the contents only
     Owner owner = Owner::Caller;
     bool released = false;
 };
 
-// A list of objects freed together.
+// Bump allocation from chunks that are given back all at once. Chunks of the
+// usual size are kept per thread for the next pool, so that a request's pool
+// costs no malloc once the thread has served one before.
+class Pool {
+public:
+    struct Chunk;
+
+    Pool() = default;
+    ~Pool() { release(); }
+    Pool(const Pool&) = delete;
+    Pool& operator=(const Pool&) = delete;
+
+    // 16-byte aligned memory valid until release().
+    void* allocate(std::size_t size) {
+        size = (size + 15) & ~static_cast<std::size_t>(15);
+        if (static_cast<std::size_t>(end_ - cursor_) < size) {
+            return grow(size);
+        }
+        void* memory = cursor_;
+        cursor_ += size;
+        return memory;
+    }
+    // Gives back every chunk.
+    void release() noexcept;
+
+private:
+    void* grow(std::size_t size);
+
+    char* cursor_ = nullptr;
+    char* end_ = nullptr;
+    Chunk* chunks_ = nullptr;
+};
+
+// A list of objects freed together, and the pool their memory comes from.
 class Arena {
 public:
     Arena() = default;
@@ -44,16 +85,20 @@ public:
 
     void adopt(ObjectBase* object) noexcept;
     void unlink(ObjectBase* object) noexcept;
-    // Frees every object, newest first.
+    // Frees every object, newest first, then gives the pool back.
     void clear() noexcept;
-    // Frees the objects adopted after `mark` (a value from top()).
+    // Frees the objects adopted after `mark` (a value from top()). Their pool
+    // memory stays until clear(): objects made before the mark may hold values
+    // carved from the pool after it.
     void clearAfter(const ObjectBase* mark) noexcept;
+    void* allocate(std::size_t size) { return pool_.allocate(size); }
     const ObjectBase* top() const noexcept { return head_; }
     std::size_t size() const noexcept { return count_; }
 
 private:
     ObjectBase* head_ = nullptr;  // newest
     std::size_t count_ = 0;
+    Pool pool_;
 };
 
 // The arena new broker objects of the calling thread go to: the innermost open
@@ -74,8 +119,33 @@ private:
     Arena* previous_;
 };
 
-// Places a new object under `owner`: Arena -> the current arena.
-void placeObject(ObjectBase* object, Owner owner) noexcept;
+// The arena whose pool new objects placed under `owner` are carved from:
+// Arena -> the current arena, Parent -> the parent's home (memberHome()),
+// Caller -> none (the heap).
+Arena* homeFor(Owner owner) noexcept;
+// Memory for an object of `size` bytes from `home`'s pool, or the heap.
+void* allocateObject(Arena* home, std::size_t size);
+// Gives back the memory of an object whose destructor has run (heap only: pool
+// memory goes back with its arena).
+void freeObjectMemory(void* memory, Arena* home) noexcept;
+
+// The home of the values a parent object being built or changed holds: new
+// Parent-owned objects are carved from it. MemberHome makes it current.
+Arena* memberHome() noexcept;
+class MemberHome {
+public:
+    explicit MemberHome(Arena* home) noexcept;
+    ~MemberHome();
+    MemberHome(const MemberHome&) = delete;
+    MemberHome& operator=(const MemberHome&) = delete;
+
+private:
+    Arena* previous_;
+};
+
+// Places a new object under `owner`: Arena -> the current arena. `home` is
+// where its memory came from (homeFor(owner) when it was allocated).
+void placeObject(ObjectBase* object, Owner owner, Arena* home) noexcept;
 
 // The generic release: Caller objects drop their contents and leave the shell
 // to the current arena; Arena objects drop their contents; Parent objects are

@@ -225,7 +225,8 @@ std::string objectPathText(const ObjectPathImpl& path) {
     text += path.className;
     for (std::size_t i = 0; i < path.keys.size(); ++i) {
         text += i == 0 ? "." : ",";
-        text += path.keys[i].name + "=" + keyText(path.keys[i].data);
+        text += path.keys[i].name();
+        text += "=" + keyText(path.keys[i].data);
     }
     return text;
 }

@@ -15,8 +15,9 @@ struct StringObject : ObjectBase {
 
     static void destroyFn(ObjectBase* base) noexcept {
         auto* object = static_cast<StringObject*>(base);
+        Arena* home = object->home;
         object->~StringObject();
-        ::operator delete(object);
+        freeObjectMemory(object, home);
     }
     static void dropFn(ObjectBase* /*base*/) noexcept {}
 };
@@ -51,7 +52,8 @@ char* getCharPtr(const CMPIString* string, CMPIStatus* rc) {
 const CMPIStringFT kStringFT = {1, release, clone, getCharPtr};
 
 CMPIString* newString(std::string_view text, Owner owner) {
-    void* memory = ::operator new(sizeof(StringObject) + text.size() + 1);
+    Arena* home = homeFor(owner);
+    void* memory = allocateObject(home, sizeof(StringObject) + text.size() + 1);
     auto* object = new (memory) StringObject();
     char* chars = object->text();
     if (!text.empty()) {
@@ -62,7 +64,7 @@ CMPIString* newString(std::string_view text, Owner owner) {
     object->ft = &kStringFT;
     object->destroy = &StringObject::destroyFn;
     object->drop = &StringObject::dropFn;
-    placeObject(object, owner);
+    placeObject(object, owner, home);
     return reinterpret_cast<CMPIString*>(static_cast<ObjectBase*>(object));
 }
 

@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "array.hpp"
+#include "memory.hpp"
 #include "args.hpp"
 #include "datetime.hpp"
 #include "enumeration.hpp"
@@ -193,24 +194,63 @@ void retireValue(CMPIData& data) noexcept {
     data.value.inst = nullptr;
 }
 
+namespace {
+
+// A Parent-owned string holding an entry's name, carved from the list's home.
+CMPIString* nameStringOf(std::string_view name, Arena* home) {
+    MemberHome members(home);
+    return newString(name, Owner::Parent);
+}
+
+}  // namespace
+
+ValueList::ValueList() noexcept : home_(memberHome()) {}
+
 ValueList::~ValueList() {
-    for (NamedValue& item : items_) {
-        freeValue(item.data);
+    for (std::uint32_t i = 0; i < size_; ++i) {
+        freeEntry(items_[i]);
+    }
+    freeObjectMemory(items_, home_);
+}
+
+// Names carved from the same pool are shared: that memory stays until the
+// pool goes, whichever list goes first. Values are always copied.
+ValueList::ValueList(const ValueList& other) : home_(memberHome()) {
+    for (std::uint32_t i = 0; i < other.size_; ++i) {
+        const NamedValue& item = other.items_[i];
+        CMPIData copy{};
+        copyValue(copy, item.data);
+        setStored(item, copy);
     }
 }
 
-ValueList::ValueList(const ValueList& other) {
-    items_.reserve(other.items_.size());
-    for (const NamedValue& item : other.items_) {
-        NamedValue copy{item.name, item.hash, {}};
-        copyValue(copy.data, item.data);
-        items_.push_back(std::move(copy));
+void ValueList::freeEntry(NamedValue& item) noexcept {
+    freeValue(item.data);
+    if (home_ == nullptr) {
+        ObjectBase* name = baseOf(item.nameString);
+        name->destroy(name);
     }
 }
 
-const NamedValue* ValueList::findHashed(std::string_view name, std::uint32_t hash) const noexcept {
-    for (const NamedValue& item : items_) {
-        if (item.hash == hash && equalsNoCase(item.name, name)) {
+NamedValue& ValueList::append() {
+    if (size_ == capacity_) {
+        const std::uint32_t grown = capacity_ == 0 ? 8 : capacity_ * 2;
+        auto* items = static_cast<NamedValue*>(allocateObject(home_, grown * sizeof(NamedValue)));
+        for (std::uint32_t i = 0; i < size_; ++i) {
+            items[i] = items_[i];
+        }
+        freeObjectMemory(items_, home_);
+        items_ = items;
+        capacity_ = grown;
+    }
+    items_[size_] = NamedValue{};
+    return items_[size_++];
+}
+
+NamedValue* ValueList::findHashed(std::string_view name, std::uint32_t hash) const noexcept {
+    for (std::uint32_t i = 0; i < size_; ++i) {
+        NamedValue& item = items_[i];
+        if (item.hash == hash && equalsNoCase(item.name(), name)) {
             return &item;
         }
     }
@@ -221,23 +261,43 @@ const NamedValue* ValueList::find(std::string_view name) const noexcept { return
 
 CMPIrc ValueList::set(std::string_view name, const CMPIValue* value, CMPIType type) {
     CMPIData stored{};
-    CMPIrc rc = storeValue(stored, value, type);
+    CMPIrc rc = CMPI_RC_OK;
+    {
+        MemberHome members(home_);
+        rc = storeValue(stored, value, type);
+    }
     if (rc == CMPI_RC_OK) {
         setStored(name, stored);
     }
     return rc;
 }
 
-// The name is hashed once, for the lookup and for the new entry.
-void ValueList::setStored(std::string_view name, CMPIData stored) {
-    std::uint32_t hash = hashNoCase(name);
-    if (const NamedValue* found = findHashed(name, hash); found != nullptr) {
-        NamedValue& existing = items_[static_cast<std::size_t>(found - items_.data())];
-        retireValue(existing.data);
-        existing.data = stored;
+template <class MakeName>
+void ValueList::put(NamedValue* found, std::uint32_t hash, std::uint32_t length, MakeName makeName, CMPIData stored) {
+    if (found != nullptr) {
+        retireValue(found->data);
+        found->data = stored;
         return;
     }
-    items_.push_back(NamedValue{std::string(name), hash, stored});
+    CMPIString* name = makeName();
+    NamedValue& item = append();
+    item.nameString = name;
+    item.hash = hash;
+    item.length = length;
+    item.data = stored;
+}
+
+// The name is hashed once, for the lookup and for the new entry.
+void ValueList::setStored(std::string_view name, CMPIData stored) {
+    const std::uint32_t hash = hashNoCase(name);
+    put(findHashed(name, hash), hash, static_cast<std::uint32_t>(name.size()),
+        [&] { return nameStringOf(name, home_); }, stored);
+}
+
+void ValueList::setStored(const NamedValue& source, CMPIData stored) {
+    const bool shared = home_ != nullptr && baseOf(source.nameString)->home == home_;
+    put(findHashed(source.name(), source.hash), source.hash, source.length,
+        [&] { return shared ? source.nameString : nameStringOf(source.name(), home_); }, stored);
 }
 
 CMPIData ValueList::get(std::string_view name, CMPIStatus* rc, CMPIValueState missing) const {
@@ -250,9 +310,11 @@ CMPIData ValueList::get(std::string_view name, CMPIStatus* rc, CMPIValueState mi
     return item->data;
 }
 
-CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc,
-                       CMPIValueState missing) const {
-    if (index >= items_.size()) {
+// A name carved from a pool is handed out as it is (it lasts as long as the
+// pool, at least the invocation); a list on the heap hands out a copy that
+// belongs to the current arena, since the list may be released first.
+CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const {
+    if (index >= size_) {
         setRc(rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
         if (name != nullptr) {
             *name = nullptr;
@@ -261,7 +323,7 @@ CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc,
     }
     const NamedValue& item = items_[index];
     if (name != nullptr) {
-        *name = newString(item.name, Owner::Arena);
+        *name = home_ != nullptr ? item.nameString : newString(item.name(), Owner::Arena);
     }
     setRc(rc, CMPI_RC_OK);
     return item.data;
@@ -271,11 +333,13 @@ CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc,
 
 namespace orv::host::detail {
 
+// A member carved from a pool joins that pool's arena, which it must not
+// outlive; one from the heap joins `arena`.
 void handOverValue(CMPIData& data, Arena& arena) noexcept {
     if (ownsMember(data.type) && data.value.inst != nullptr && data.state == CMPI_goodValue) {
         ObjectBase* member = baseOf(data.value.inst);
         member->owner = Owner::Arena;
-        arena.adopt(member);
+        (member->home != nullptr ? *member->home : arena).adopt(member);
     }
 }
 
