@@ -1,5 +1,6 @@
 #include "instance.hpp"
 
+#include "name_table.hpp"
 #include "names.hpp"
 #include "object_path.hpp"
 #include "string.hpp"
@@ -14,12 +15,22 @@ constexpr CMPIStatus kInvalid{CMPI_RC_ERR_INVALID_HANDLE, nullptr};
 InstanceImpl* impl(const CMPIInstance* instance) { return instanceImpl(instance); }
 
 const std::vector<std::string>& keyNamesOf(const InstanceImpl& inst) {
-    if (inst.classes != nullptr) {
-        if (const auto* names = inst.classes->keyNames(inst.nameSpace, inst.className); names != nullptr) {
-            return *names;
+    return inst.classNames != nullptr ? inst.classNames->keyNames() : inst.pathKeys;
+}
+
+// The key properties of the instance, in the order of its key names.
+template <class Visit>
+void forEachKey(const InstanceImpl& inst, Visit visit) {
+    if (inst.classNames != nullptr && inst.properties.nameTable() == inst.classNames &&
+        inst.classNames->keySlots().size() == inst.classNames->keyNames().size()) {
+        for (std::uint32_t slot : inst.classNames->keySlots()) {
+            visit(inst.properties.atSlot(slot));
         }
+        return;
     }
-    return inst.pathKeys;
+    for (const std::string& key : keyNamesOf(inst)) {
+        visit(inst.properties.find(key));
+    }
 }
 
 bool contains(const std::vector<std::string>& names, std::string_view name) {
@@ -97,14 +108,13 @@ CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
     ObjectPathImpl* p = objectPathImpl(path);
     p->host = inst->host;
     MemberHome members(p->keys.home());
-    for (const std::string& key : keyNamesOf(*inst)) {
-        const NamedValue* property = inst->properties.find(key);
+    forEachKey(*inst, [p](const NamedValue* property) {
         if (property != nullptr && property->data.state == CMPI_goodValue) {
             CMPIData copy{};
             copyValue(copy, property->data);
             p->keys.setStored(*property, copy);
         }
-    }
+    });
     setRc(rc, CMPI_RC_OK);
     return path;
 }
@@ -143,6 +153,7 @@ CMPIStatus setObjectPath(CMPIInstance* instance, const CMPIObjectPath* op) {
     inst->nameSpace = path->nameSpace;
     inst->host = path->host;
     inst->className = path->className;
+    inst->classNames = inst->classes != nullptr ? inst->classes->nameTable(inst->nameSpace, inst->className) : nullptr;
     inst->pathKeys.clear();
     MemberHome members(inst->properties.home());
     for (std::size_t i = 0; i < path->keys.size(); ++i) {
@@ -177,7 +188,11 @@ CMPIInstance* newInstance(const CMPIObjectPath* path, Owner owner) {
         return nullptr;
     }
     CMPIInstance* instance = makeObject<CMPIInstance, InstanceImpl>(&kInstanceFT, owner);
-    instanceImpl(instance)->classes = p->classes;
+    InstanceImpl* inst = instanceImpl(instance);
+    inst->classes = p->classes;
+    if (p->classes != nullptr) {
+        inst->properties.useNameTable(p->classes->nameTable(p->nameSpace, p->className));
+    }
     setObjectPath(instance, path);
     return instance;
 }

@@ -25,6 +25,8 @@ struct InstanceImpl {
     // Set by setPropertyFilter: only these names (and keys) are kept.
     std::optional<std::vector<std::string>> filter;
     const ClassSource* classes = nullptr;
+    // The names of className as the class source has them, or nullptr.
+    const NameTable* classNames = nullptr;
 };
 
 // A new instance of the path's class whose properties start as the path's keys.

@@ -8,6 +8,7 @@
 #include "datetime.hpp"
 #include "enumeration.hpp"
 #include "instance.hpp"
+#include "name_table.hpp"
 #include "names.hpp"
 #include "object_path.hpp"
 #include "object.hpp"
@@ -211,17 +212,49 @@ ValueList::~ValueList() {
         freeEntry(items_[i]);
     }
     freeObjectMemory(items_, home_);
+    freeObjectMemory(positions_, home_);
 }
 
 // Names carved from the same pool are shared: that memory stays until the
 // pool goes, whichever list goes first. Values are always copied.
 ValueList::ValueList(const ValueList& other) : home_(memberHome()) {
+    useNameTable(other.table_);
     for (std::uint32_t i = 0; i < other.size_; ++i) {
         const NamedValue& item = other.items_[i];
         CMPIData copy{};
         copyValue(copy, item.data);
         setStored(item, copy);
     }
+}
+
+void ValueList::useNameTable(const NameTable* table) {
+    if (home_ == nullptr || table == nullptr || size_ != 0) {
+        return;
+    }
+    table_ = table;
+    positions_ = static_cast<std::int32_t*>(allocateObject(home_, sizeof(std::int32_t) * table->size()));
+    indexSlots();
+}
+
+void ValueList::indexSlots() noexcept {
+    if (table_ == nullptr) {
+        return;
+    }
+    for (std::uint32_t slot = 0; slot < table_->size(); ++slot) {
+        positions_[slot] = -1;
+    }
+    for (std::uint32_t i = 0; i < size_; ++i) {
+        if (items_[i].slot != NameTable::kNone) {
+            positions_[items_[i].slot] = static_cast<std::int32_t>(i);
+        }
+    }
+}
+
+const NamedValue* ValueList::atSlot(std::uint32_t slot) const noexcept {
+    if (table_ == nullptr || slot >= table_->size() || positions_[slot] < 0) {
+        return nullptr;
+    }
+    return &items_[positions_[slot]];
 }
 
 void ValueList::freeEntry(NamedValue& item) noexcept {
@@ -257,7 +290,15 @@ NamedValue* ValueList::findHashed(std::string_view name, std::uint32_t hash) con
     return nullptr;
 }
 
-const NamedValue* ValueList::find(std::string_view name) const noexcept { return findHashed(name, hashNoCase(name)); }
+const NamedValue* ValueList::find(std::string_view name) const noexcept {
+    const std::uint32_t hash = hashNoCase(name);
+    if (table_ != nullptr) {
+        if (const std::uint32_t slot = table_->find(name, hash); slot != NameTable::kNone) {
+            return atSlot(slot);
+        }
+    }
+    return findHashed(name, hash);
+}
 
 CMPIrc ValueList::set(std::string_view name, const CMPIValue* value, CMPIType type) {
     CMPIData stored{};
@@ -267,37 +308,68 @@ CMPIrc ValueList::set(std::string_view name, const CMPIValue* value, CMPIType ty
         rc = storeValue(stored, value, type);
     }
     if (rc == CMPI_RC_OK) {
-        setStored(name, stored);
+        put(name, nullptr, stored);
     }
     return rc;
 }
 
-template <class MakeName>
-void ValueList::put(NamedValue* found, std::uint32_t hash, std::uint32_t length, MakeName makeName, CMPIData stored) {
+void ValueList::setStored(std::string_view name, CMPIData stored) { put(name, nullptr, stored); }
+
+void ValueList::setStored(const NamedValue& source, CMPIData stored) { put(source.name(), &source, stored); }
+
+// Names are mostly set in the same order on every instance of a class: the
+// name set in this place last time is tried first, by its exact spelling.
+std::uint32_t ValueList::slotOf(std::string_view name, const NamedValue* source) {
+    const std::uint32_t place = sets_++;
+    std::uint32_t slot = table_->guess(place);
+    if (slot != NameTable::kNone && table_->spelledAs(slot, name)) {
+        return slot;
+    }
+    slot = table_->find(name, source != nullptr ? source->hash : hashNoCase(name));
+    if (slot != NameTable::kNone) {
+        table_->learn(place, slot);
+    }
+    return slot;
+}
+
+// The name string of a new entry: the table's when spelled the same, the
+// source's when it comes from the same pool, else a copy.
+CMPIString* ValueList::nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot) {
+    if (slot != NameTable::kNone && table_->spelledAs(slot, name)) {
+        return table_->nameString(slot);
+    }
+    if (source != nullptr && home_ != nullptr && baseOf(source->nameString)->home == home_) {
+        return source->nameString;
+    }
+    return nameStringOf(name, home_);
+}
+
+void ValueList::put(std::string_view name, const NamedValue* source, CMPIData stored) {
+    std::uint32_t slot = NameTable::kNone;
+    NamedValue* found = nullptr;
+    std::uint32_t hash = 0;
+    if (table_ != nullptr && (slot = slotOf(name, source)) != NameTable::kNone) {
+        hash = table_->hash(slot);
+        found = positions_[slot] >= 0 ? &items_[positions_[slot]] : nullptr;
+    } else {
+        hash = source != nullptr ? source->hash : hashNoCase(name);
+        found = findHashed(name, hash);
+    }
     if (found != nullptr) {
         retireValue(found->data);
         found->data = stored;
         return;
     }
-    CMPIString* name = makeName();
+    CMPIString* nameString = nameFor(name, source, slot);
     NamedValue& item = append();
-    item.nameString = name;
+    item.nameString = nameString;
     item.hash = hash;
-    item.length = length;
+    item.length = static_cast<std::uint32_t>(name.size());
+    item.slot = slot;
     item.data = stored;
-}
-
-// The name is hashed once, for the lookup and for the new entry.
-void ValueList::setStored(std::string_view name, CMPIData stored) {
-    const std::uint32_t hash = hashNoCase(name);
-    put(findHashed(name, hash), hash, static_cast<std::uint32_t>(name.size()),
-        [&] { return nameStringOf(name, home_); }, stored);
-}
-
-void ValueList::setStored(const NamedValue& source, CMPIData stored) {
-    const bool shared = home_ != nullptr && baseOf(source.nameString)->home == home_;
-    put(findHashed(source.name(), source.hash), source.hash, source.length,
-        [&] { return shared ? source.nameString : nameStringOf(source.name(), home_); }, stored);
+    if (slot != NameTable::kNone) {
+        positions_[slot] = static_cast<std::int32_t>(size_ - 1);
+    }
 }
 
 CMPIData ValueList::get(std::string_view name, CMPIStatus* rc, CMPIValueState missing) const {

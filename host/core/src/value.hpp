@@ -18,6 +18,7 @@
 namespace orv::host::detail {
 
 class Arena;
+class NameTable;
 
 // Converts setter input into an owned value, whose member is carved from
 // memberHome(). Null `value` (or a NULL object
@@ -53,6 +54,7 @@ struct NamedValue {
     CMPIString* nameString = nullptr;
     std::uint32_t hash = 0;    // hashNoCase of the name
     std::uint32_t length = 0;  // of the name
+    std::uint32_t slot = 0;    // in the list's name table, NameTable::kNone when not there
     CMPIData data{};
 
     std::string_view name() const noexcept {
@@ -63,6 +65,11 @@ struct NamedValue {
 // An ordered list of named values with case-insensitive lookup. Its entries,
 // names and values live where the list's owner lives (memberHome() when the
 // list is made): in an arena's pool, or on the heap.
+//
+// A list in a pool may use a class's NameTable (an instance's properties): an
+// entry of a declared name then carries the table's name string when spelled
+// the same, and setting a name is mostly a comparison with the name set in the
+// same place last time instead of a hash and a scan.
 class ValueList {
 public:
     ValueList() noexcept;
@@ -91,9 +98,16 @@ public:
             }
         }
         size_ = kept;
+        indexSlots();
     }
     // The arena whose pool holds the entries, nullptr for the heap.
     Arena* home() const noexcept { return home_; }
+    // Uses `table` for the names from now on (ignored for a list on the heap).
+    // The list must be empty.
+    void useNameTable(const NameTable* table);
+    const NameTable* nameTable() const noexcept { return table_; }
+    // The entry of a slot of the name table, or null.
+    const NamedValue* atSlot(std::uint32_t slot) const noexcept;
 
     // Getter helpers: the value, or rc CMPI_RC_ERR_NO_SUCH_PROPERTY and a null
     // CMPIData with state CMPI_notFound (entries: CMPI_nullValue).
@@ -103,16 +117,23 @@ public:
 private:
     // The entry named `name`, whose hashNoCase is `hash`, or null.
     NamedValue* findHashed(std::string_view name, std::uint32_t hash) const noexcept;
-    // Replaces the value of `found`, or appends an entry named by makeName().
-    template <class MakeName>
-    void put(NamedValue* found, std::uint32_t hash, std::uint32_t length, MakeName makeName, CMPIData stored);
+    // Stores `stored` under `name` (source: an entry of another list with that
+    // name, whose name string may be shared).
+    void put(std::string_view name, const NamedValue* source, CMPIData stored);
+    // The slot of `name` in the name table, or NameTable::kNone.
+    std::uint32_t slotOf(std::string_view name, const NamedValue* source);
     NamedValue& append();
+    CMPIString* nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot);
     void freeEntry(NamedValue& item) noexcept;
+    void indexSlots() noexcept;
 
     Arena* home_;
     NamedValue* items_ = nullptr;
     std::uint32_t size_ = 0;
     std::uint32_t capacity_ = 0;
+    const NameTable* table_ = nullptr;
+    std::int32_t* positions_ = nullptr;  // per slot of table_: index in items_, or -1
+    std::uint32_t sets_ = 0;             // names set so far: the place of the next one
 };
 
 }  // namespace orv::host::detail
