@@ -5,6 +5,9 @@
 
 namespace orv::host::detail {
 
+constinit thread_local Arena* tlsCurrentArena = nullptr;
+constinit thread_local Arena* tlsMemberHome = nullptr;
+
 struct Pool::Chunk {
     Chunk* next;
     std::size_t size;  // usable bytes after the header
@@ -94,8 +97,6 @@ Arena& ownArena() noexcept {
     return arena;
 }
 
-thread_local Arena* tlsCurrent = nullptr;
-thread_local Arena* tlsMemberHome = nullptr;
 
 }  // namespace
 
@@ -140,36 +141,6 @@ void Arena::clearAfter(const ObjectBase* mark) noexcept {
 }
 
 Arena& threadArena() noexcept { return ownArena(); }
-
-Arena& currentArena() noexcept { return tlsCurrent != nullptr ? *tlsCurrent : ownArena(); }
-
-ArenaGuard::ArenaGuard(Arena& arena) noexcept : previous_(tlsCurrent) { tlsCurrent = &arena; }
-
-ArenaGuard::~ArenaGuard() { tlsCurrent = previous_; }
-
-Arena* homeFor(Owner owner) noexcept {
-    switch (owner) {
-    case Owner::Arena: return &currentArena();
-    case Owner::Parent: return tlsMemberHome;
-    default: return nullptr;
-    }
-}
-
-void* allocateObject(Arena* home, std::size_t size) {
-    return home != nullptr ? home->allocate(size) : ::operator new(size);
-}
-
-void freeObjectMemory(void* memory, Arena* home) noexcept {
-    if (home == nullptr) {
-        ::operator delete(memory);
-    }
-}
-
-Arena* memberHome() noexcept { return tlsMemberHome; }
-
-MemberHome::MemberHome(Arena* home) noexcept : previous_(tlsMemberHome) { tlsMemberHome = home; }
-
-MemberHome::~MemberHome() { tlsMemberHome = previous_; }
 
 void placeObject(ObjectBase* object, Owner owner, Arena* home) noexcept {
     object->owner = owner;

@@ -22,6 +22,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <new>
 
 namespace orv::host::detail {
 
@@ -101,17 +102,30 @@ private:
     Pool pool_;
 };
 
+extern constinit thread_local Arena* tlsCurrentArena;
+extern constinit thread_local Arena* tlsMemberHome;
+
 // The arena new broker objects of the calling thread go to: the innermost open
 // invocation or scope, else the thread's own arena.
-Arena& currentArena() noexcept;
+inline Arena& currentArena() noexcept;
 // The calling thread's own arena (attached provider threads, clients without a scope).
 Arena& threadArena() noexcept;
+
+inline Arena& currentArena() noexcept { return tlsCurrentArena != nullptr ? *tlsCurrentArena : threadArena(); }
+
+inline Arena* homeFor(Owner owner) noexcept {
+    switch (owner) {
+    case Owner::Arena: return &currentArena();
+    case Owner::Parent: return tlsMemberHome;
+    default: return nullptr;
+    }
+}
 
 // Makes `arena` current for the calling thread while alive.
 class ArenaGuard {
 public:
-    explicit ArenaGuard(Arena& arena) noexcept;
-    ~ArenaGuard();
+    explicit ArenaGuard(Arena& arena) noexcept : previous_(tlsCurrentArena) { tlsCurrentArena = &arena; }
+    ~ArenaGuard() { tlsCurrentArena = previous_; }
     ArenaGuard(const ArenaGuard&) = delete;
     ArenaGuard& operator=(const ArenaGuard&) = delete;
 
@@ -122,20 +136,26 @@ private:
 // The arena whose pool new objects placed under `owner` are carved from:
 // Arena -> the current arena, Parent -> the parent's home (memberHome()),
 // Caller -> none (the heap).
-Arena* homeFor(Owner owner) noexcept;
+inline Arena* homeFor(Owner owner) noexcept;
 // Memory for an object of `size` bytes from `home`'s pool, or the heap.
-void* allocateObject(Arena* home, std::size_t size);
+inline void* allocateObject(Arena* home, std::size_t size) {
+    return home != nullptr ? home->allocate(size) : ::operator new(size);
+}
 // Gives back the memory of an object whose destructor has run (heap only: pool
 // memory goes back with its arena).
-void freeObjectMemory(void* memory, Arena* home) noexcept;
+inline void freeObjectMemory(void* memory, Arena* home) noexcept {
+    if (home == nullptr) {
+        ::operator delete(memory);
+    }
+}
 
 // The home of the values a parent object being built or changed holds: new
 // Parent-owned objects are carved from it. MemberHome makes it current.
-Arena* memberHome() noexcept;
+inline Arena* memberHome() noexcept { return tlsMemberHome; }
 class MemberHome {
 public:
-    explicit MemberHome(Arena* home) noexcept;
-    ~MemberHome();
+    explicit MemberHome(Arena* home) noexcept : previous_(tlsMemberHome) { tlsMemberHome = home; }
+    ~MemberHome() { tlsMemberHome = previous_; }
     MemberHome(const MemberHome&) = delete;
     MemberHome& operator=(const MemberHome&) = delete;
 
