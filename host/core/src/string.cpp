@@ -11,6 +11,7 @@ namespace {
 // characters cannot be freed apart from the shell, so a released string keeps them until
 // its arena is cleared, like the shell of any released object.
 struct StringObject : ObjectBase {
+    std::size_t length = 0;
     char* text() noexcept { return reinterpret_cast<char*>(this + 1); }
 
     static void destroyFn(ObjectBase* base) noexcept {
@@ -60,12 +61,32 @@ CMPIString* newString(std::string_view text, Owner owner) {
         std::memcpy(chars, text.data(), text.size());
     }
     chars[text.size()] = '\0';
+    object->length = text.size();
     object->hdl = chars;
     object->ft = &kStringFT;
     object->destroy = &StringObject::destroyFn;
     object->drop = &StringObject::dropFn;
     placeObject(object, owner, home);
     return reinterpret_cast<CMPIString*>(static_cast<ObjectBase*>(object));
+}
+
+// A string a parent owns is never released or changed, and its pool memory
+// lasts as long as the pool: another value of the same pool may refer to it.
+CMPIString* memberString(const CMPIString* string) {
+    StringObject* object = stringObject(string);
+    if (object == nullptr) {
+        return nullptr;
+    }
+    Arena* home = memberHome();
+    if (home != nullptr && object->home == home && object->owner == Owner::Parent) {
+        return const_cast<CMPIString*>(string);
+    }
+    return newString(std::string_view(object->text(), object->length), Owner::Parent);
+}
+
+bool isPoolString(const void* object) noexcept {
+    const auto* base = static_cast<const ObjectBase*>(object);
+    return base->ft == &kStringFT && base->home != nullptr;
 }
 
 const char* stringText(const CMPIString* string) noexcept {

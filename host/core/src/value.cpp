@@ -82,10 +82,8 @@ void* copyMember(CMPIType type, const void* object) {
         return cloneSelectExp(static_cast<const CMPISelectExp*>(object), Owner::Parent);
     case CMPI_enumeration:
         return cloneEnumeration(static_cast<const CMPIEnumeration*>(object), Owner::Parent);
-    case CMPI_string: {
-        const char* text = stringText(static_cast<const CMPIString*>(object));
-        return text != nullptr ? newString(text, Owner::Parent) : nullptr;
-    }
+    case CMPI_string:
+        return memberString(static_cast<const CMPIString*>(object));
     case CMPI_dateTime:
         return cloneDateTime(static_cast<const CMPIDateTime*>(object), Owner::Parent);
     default:
@@ -183,7 +181,8 @@ void copyValue(CMPIData& out, const CMPIData& in) {
 }
 
 void freeValue(CMPIData& data) noexcept {
-    if (ownsMember(data.type) && data.value.inst != nullptr && data.state == CMPI_goodValue) {
+    if (ownsMember(data.type) && data.value.inst != nullptr && data.state == CMPI_goodValue &&
+        !isPoolString(data.value.inst)) {
         ObjectBase* member = baseOf(data.value.inst);
         member->destroy(member);
     }
@@ -319,23 +318,26 @@ void ValueList::setStored(const NamedValue& source, CMPIData stored) { put(sourc
 
 // Names are mostly set in the same order on every instance of a class: the
 // name set in this place last time is tried first, by its exact spelling.
-std::uint32_t ValueList::slotOf(std::string_view name, const NamedValue* source) {
+std::uint32_t ValueList::slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike) {
     const std::uint32_t place = sets_++;
     std::uint32_t slot = table_->guess(place);
     if (slot != NameTable::kNone && table_->spelledAs(slot, name)) {
+        spelledAlike = true;
         return slot;
     }
     slot = table_->find(name, source != nullptr ? source->hash : hashNoCase(name));
     if (slot != NameTable::kNone) {
         table_->learn(place, slot);
+        spelledAlike = table_->spelledAs(slot, name);
     }
     return slot;
 }
 
 // The name string of a new entry: the table's when spelled the same, the
 // source's when it comes from the same pool, else a copy.
-CMPIString* ValueList::nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot) {
-    if (slot != NameTable::kNone && table_->spelledAs(slot, name)) {
+CMPIString* ValueList::nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot,
+                               bool spelledAlike) {
+    if (spelledAlike) {
         return table_->nameString(slot);
     }
     if (source != nullptr && home_ != nullptr && baseOf(source->nameString)->home == home_) {
@@ -346,9 +348,10 @@ CMPIString* ValueList::nameFor(std::string_view name, const NamedValue* source, 
 
 void ValueList::put(std::string_view name, const NamedValue* source, CMPIData stored) {
     std::uint32_t slot = NameTable::kNone;
+    bool spelledAlike = false;
     NamedValue* found = nullptr;
     std::uint32_t hash = 0;
-    if (table_ != nullptr && (slot = slotOf(name, source)) != NameTable::kNone) {
+    if (table_ != nullptr && (slot = slotOf(name, source, spelledAlike)) != NameTable::kNone) {
         hash = table_->hash(slot);
         found = positions_[slot] >= 0 ? &items_[positions_[slot]] : nullptr;
     } else {
@@ -360,7 +363,7 @@ void ValueList::put(std::string_view name, const NamedValue* source, CMPIData st
         found->data = stored;
         return;
     }
-    CMPIString* nameString = nameFor(name, source, slot);
+    CMPIString* nameString = nameFor(name, source, slot, spelledAlike);
     NamedValue& item = append();
     item.nameString = nameString;
     item.hash = hash;
@@ -406,9 +409,11 @@ CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIV
 namespace orv::host::detail {
 
 // A member carved from a pool joins that pool's arena, which it must not
-// outlive; one from the heap joins `arena`.
+// outlive; one from the heap joins `arena`. A pool's string stays as it is: it
+// may be shared, and its memory goes with the pool.
 void handOverValue(CMPIData& data, Arena& arena) noexcept {
-    if (ownsMember(data.type) && data.value.inst != nullptr && data.state == CMPI_goodValue) {
+    if (ownsMember(data.type) && data.value.inst != nullptr && data.state == CMPI_goodValue &&
+        !isPoolString(data.value.inst)) {
         ObjectBase* member = baseOf(data.value.inst);
         member->owner = Owner::Arena;
         (member->home != nullptr ? *member->home : arena).adopt(member);

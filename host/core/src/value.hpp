@@ -121,9 +121,10 @@ private:
     // name, whose name string may be shared).
     void put(std::string_view name, const NamedValue* source, CMPIData stored);
     // The slot of `name` in the name table, or NameTable::kNone.
-    std::uint32_t slotOf(std::string_view name, const NamedValue* source);
+    // spelledAlike: set when the table spells the name the same.
+    std::uint32_t slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike);
     NamedValue& append();
-    CMPIString* nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot);
+    CMPIString* nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot, bool spelledAlike);
     void freeEntry(NamedValue& item) noexcept;
     void indexSlots() noexcept;
 
