@@ -142,6 +142,25 @@ TEST_F(PropertyNamesTest, CloneOfAScopesInstanceOutlivesTheScope) {
     EXPECT_EQ(copy->ft->release(copy).rc, CMPI_RC_OK);
 }
 
+TEST_F(PropertyNamesTest, ValuesCopiedFromAnInstanceOutliveItsRelease) {
+    CMPIInstance* inst = element("kept");
+    CMPIArray* texts = mb()->eft->newArray(mb(), 1, CMPI_string, nullptr);
+    texts->ft->setElementAt(texts, 0, reinterpret_cast<const CMPIValue*>("first"), CMPI_chars);
+    inst->ft->setProperty(inst, "Numbers", reinterpret_cast<const CMPIValue*>(&texts), CMPI_stringA);
+    texts->ft->setElementAt(texts, 0, reinterpret_cast<const CMPIValue*>("changed"), CMPI_chars);
+    EXPECT_EQ(texts->ft->release(texts).rc, CMPI_RC_OK);
+    CMPIArray* held = inst->ft->getProperty(inst, "Numbers", nullptr).value.array;
+    EXPECT_EQ(text(held->ft->getElementAt(held, 0, nullptr).value.string), "first");
+    CMPIObjectPath* op = inst->ft->getObjectPath(inst, nullptr);
+    CMPIInstance* other = element("other");
+    CMPIData copied = inst->ft->getProperty(inst, "Numbers", nullptr);
+    other->ft->setProperty(other, "Numbers", &copied.value, copied.type);
+    EXPECT_EQ(inst->ft->release(inst).rc, CMPI_RC_OK);
+    EXPECT_EQ(text(op->ft->getKey(op, "Name", nullptr).value.string), "kept");
+    CMPIArray* again = other->ft->getProperty(other, "Numbers", nullptr).value.array;
+    EXPECT_EQ(text(again->ft->getElementAt(again, 0, nullptr).value.string), "first");
+}
+
 TEST_F(PropertyNamesTest, InstancesOfOneClassBuiltOnSeveralThreadsAtOnce) {
     // Run under ThreadSanitizer: the threads share the class's name table and
     // teach it different orders.
