@@ -30,7 +30,9 @@ ArrayImpl::ArrayImpl(const ArrayImpl& other) : elementType(other.elementType) {
 }
 
 ArrayImpl::~ArrayImpl() {
-    for (CMPICount i = 0; i < size; ++i) {
+    // In a pool, strings and scalars have nothing to free.
+    const bool nothingToFree = home != nullptr && (elementType == CMPI_string || !ownsMember(elementType));
+    for (CMPICount i = 0; !nothingToFree && i < size; ++i) {
         freeValue(elements[i]);
     }
     if (elements != nullptr) {

@@ -84,11 +84,6 @@ CMPIString* memberString(const CMPIString* string) {
     return newString(std::string_view(object->text(), object->length), Owner::Parent);
 }
 
-bool isPoolString(const void* object) noexcept {
-    const auto* base = static_cast<const ObjectBase*>(object);
-    return base->ft == &kStringFT && base->home != nullptr;
-}
-
 const char* stringText(const CMPIString* string) noexcept {
     StringObject* object = stringObject(string);
     return object != nullptr ? object->text() : nullptr;

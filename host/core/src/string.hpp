@@ -17,7 +17,10 @@ CMPIString* newString(std::string_view text, Owner owner);
 CMPIString* memberString(const CMPIString* string);
 // Whether `object` is a string carved from a pool (never destroyed one by one:
 // it may be shared).
-bool isPoolString(const void* object) noexcept;
+inline bool isPoolString(const void* object) noexcept {
+    const auto* base = static_cast<const ObjectBase*>(object);
+    return base->ft == &kStringFT && base->home != nullptr;
+}
 // The text of one of our strings, or nullptr for anything else.
 const char* stringText(const CMPIString* string) noexcept;
 

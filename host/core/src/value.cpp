@@ -20,7 +20,7 @@ namespace orv::host::detail {
 namespace {
 
 // Width of a scalar type's value, 0 for anything that is not a plain scalar.
-std::size_t scalarWidth(CMPIType type) noexcept {
+inline std::size_t scalarWidth(CMPIType type) noexcept {
     switch (type) {
     case CMPI_boolean:
     case CMPI_uint8:
@@ -130,18 +130,23 @@ bool isKnownType(CMPIType type) noexcept {
 }
 
 CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
-    if (!isKnownType(type)) {
-        return CMPI_RC_ERR_INVALID_DATA_TYPE;
-    }
     out = CMPIData{};
     out.type = storedType(type);
     out.state = CMPI_goodValue;
-    if (type == CMPI_null || value == nullptr) {
-        out.state = CMPI_nullValue;
+    if (std::size_t width = scalarWidth(type); width != 0) {  // the common case first
+        if (value == nullptr) {
+            out.state = CMPI_nullValue;
+        } else {
+            std::memcpy(&out.value, value, width);
+        }
         return CMPI_RC_OK;
     }
-    if (std::size_t width = scalarWidth(type); width != 0) {
-        std::memcpy(&out.value, value, width);
+    if (!isKnownType(type)) {
+        out = CMPIData{};
+        return CMPI_RC_ERR_INVALID_DATA_TYPE;
+    }
+    if (type == CMPI_null || value == nullptr) {
+        out.state = CMPI_nullValue;
         return CMPI_RC_OK;
     }
     if (type == CMPI_chars) {
