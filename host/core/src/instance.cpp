@@ -112,7 +112,7 @@ CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
         if (property != nullptr && property->data.state == CMPI_goodValue) {
             CMPIData copy{};
             copyValue(copy, property->data);
-            p->keys.setStored(*property, copy);
+            p->keys.appendDistinct(*property, copy);
         }
     });
     setRc(rc, CMPI_RC_OK);
@@ -161,7 +161,9 @@ CMPIStatus setObjectPath(CMPIInstance* instance, const CMPIObjectPath* op) {
         CMPIData copy{};
         copyValue(copy, key.data);
         inst->properties.setStored(key, copy);
-        inst->pathKeys.emplace_back(key.name());
+        if (inst->classNames == nullptr) {  // the class's own keys serve otherwise
+            inst->pathKeys.emplace_back(key.name());
+        }
     }
     return okStatus();
 }

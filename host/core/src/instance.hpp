@@ -19,8 +19,8 @@ struct InstanceImpl {
     std::string host;
     std::string className;
     ValueList properties;
-    // Key names of the path the instance was made from; used for the instance's
-    // path when the class is not in the repository.
+    // Key names of the path the instance was made from, kept only when the class
+    // is not in the repository, for the instance's path.
     std::vector<std::string> pathKeys;
     // Set by setPropertyFilter: only these names (and keys) are kept.
     std::optional<std::vector<std::string>> filter;

@@ -321,6 +321,20 @@ void ValueList::setStored(std::string_view name, CMPIData stored) { put(name, nu
 
 void ValueList::setStored(const NamedValue& source, CMPIData stored) { put(source.name(), &source, stored); }
 
+void ValueList::appendDistinct(const NamedValue& source, CMPIData stored) {
+    if (table_ != nullptr) {  // the table's slots must be looked up
+        setStored(source, stored);
+        return;
+    }
+    CMPIString* nameString = nameFor(source.name(), &source, NameTable::kNone, false);
+    NamedValue& item = append();
+    item.nameString = nameString;
+    item.hash = source.hash;
+    item.length = source.length;
+    item.slot = NameTable::kNone;
+    item.data = stored;
+}
+
 // Names are mostly set in the same order on every instance of a class: the
 // name set in this place last time is tried first, by its exact spelling.
 std::uint32_t ValueList::slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike) {

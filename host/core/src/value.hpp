@@ -86,6 +86,9 @@ public:
     void setStored(std::string_view name, CMPIData stored);
     // Same, naming the entry after `source` (an entry of another list).
     void setStored(const NamedValue& source, CMPIData stored);
+    // Appends an entry named after `source` whose name the caller knows the
+    // list does not hold yet (such as the distinct keys of a new path).
+    void appendDistinct(const NamedValue& source, CMPIData stored);
     // Keeps only the entries for which keep(name) is true, in order.
     template <class Pred>
     void keepIf(Pred keep) {
