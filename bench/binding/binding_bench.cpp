@@ -8,12 +8,15 @@
 //   binding_bench                 Google Benchmark, reports ns per instance
 //   binding_bench --fixed=N       N requests and nothing else, for
 //                                 valgrind --tool=callgrind instruction counts
+//   valgrind --tool=callgrind --collect-atstart=no binding_bench --callgrind
+//                                 the count of one steady-state request (64 instances)
 #include <benchmark/benchmark.h>
 
-#include <cstdlib>
 #include <cstring>
 #include <string>
 
+#include "orv/bench/Callgrind.h"
+#include "orv/bench/FixedRuns.h"
 #include "orv/host/broker_core.hpp"
 
 namespace {
@@ -123,17 +126,18 @@ BENCHMARK(BM_PortShapedInstances);
 }  // namespace
 
 int main(int argc, char** argv) {
-    for (int i = 1; i < argc; ++i) {
-        if (std::strncmp(argv[i], "--fixed=", 8) == 0) {
-            Setup setup;
-            long count = std::atol(argv[i] + 8);
-            for (long n = 0; n < count; ++n) {
-                if (!setup.request()) {
-                    return 1;
-                }
+    if (std::strcmp(argc > 1 ? argv[1] : "", "--callgrind") == 0) {
+        Setup setup;
+        return orv::bench::collectSecondRun([&] { return setup.request() ? std::size_t{1} : 0; }) == 1 ? 0 : 1;
+    }
+    if (const long count = orv::bench::fixedRuns(argc, argv); count >= 0) {
+        Setup setup;
+        for (long n = 0; n < count; ++n) {
+            if (!setup.request()) {
+                return 1;
             }
-            return setup.seen == 0 ? 1 : 0;
         }
+        return setup.seen == 0 ? 1 : 0;
     }
     benchmark::Initialize(&argc, argv);
     benchmark::RunSpecifiedBenchmarks();

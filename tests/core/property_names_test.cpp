@@ -22,17 +22,6 @@ protected:
         ASSERT_EQ(inst->ft->setProperty(inst, name, reinterpret_cast<const CMPIValue*>(&value), CMPI_uint32).rc,
                   CMPI_RC_OK);
     }
-
-    static std::vector<std::string> names(const CMPIInstance* inst) {
-        std::vector<std::string> out;
-        CMPICount count = inst->ft->getPropertyCount(inst, nullptr);
-        for (CMPICount i = 0; i < count; ++i) {
-            CMPIString* name = nullptr;
-            inst->ft->getPropertyAt(inst, i, &name, nullptr);
-            out.push_back(text(name));
-        }
-        return out;
-    }
 };
 
 TEST_F(PropertyNamesTest, FirstSpellingStaysOnEachInstanceWhateverOtherInstancesUsed) {
@@ -41,9 +30,9 @@ TEST_F(PropertyNamesTest, FirstSpellingStaysOnEachInstanceWhateverOtherInstances
     setText(first, "TEXT", "upper");
     CMPIInstance* second = element("b");
     setText(second, "Text", "declared");
-    EXPECT_EQ(names(first), (std::vector<std::string>{"Name", "text"}));
+    EXPECT_EQ(propertyNames(first), (std::vector<std::string>{"Name", "text"}));
     EXPECT_EQ(stringProperty(first, "Text"), "upper");
-    EXPECT_EQ(names(second), (std::vector<std::string>{"Name", "Text"}));
+    EXPECT_EQ(propertyNames(second), (std::vector<std::string>{"Name", "Text"}));
     EXPECT_EQ(stringProperty(second, "tExT"), "declared");
 }
 
@@ -52,7 +41,7 @@ TEST_F(PropertyNamesTest, NamesTheClassDoesNotDeclareAreKeptInOrderBesideDeclare
     setText(inst, "Undeclared", "u");
     setText(inst, "Text", "t");
     setText(inst, "undeclared", "again");
-    EXPECT_EQ(names(inst), (std::vector<std::string>{"Name", "Undeclared", "Text"}));
+    EXPECT_EQ(propertyNames(inst), (std::vector<std::string>{"Name", "Undeclared", "Text"}));
     EXPECT_EQ(stringProperty(inst, "UNDECLARED"), "again");
     EXPECT_EQ(stringProperty(inst, "text"), "t");
 }
@@ -77,7 +66,7 @@ TEST_F(PropertyNamesTest, EveryOrderOfSettingFindsEachProperty) {
         EXPECT_EQ(inst->ft->getProperty(inst, "counter", nullptr).value.uint32, static_cast<CMPIUint32>(round));
         EXPECT_EQ(stringProperty(inst, "Extra"), round % 2 == 1 ? "replaced" : "Extra");
         EXPECT_EQ(stringProperty(inst, "TEXT"), round % 2 == 0 ? "replaced" : "Text");
-        EXPECT_EQ(names(inst)[0], "Name");
+        EXPECT_EQ(propertyNames(inst)[0], "Name");
     }
 }
 
@@ -87,7 +76,7 @@ TEST_F(PropertyNamesTest, AReleasedPropertyNameStillNamesTheProperty) {
     CMPIString* name = nullptr;
     inst->ft->getPropertyAt(inst, 1, &name, nullptr);
     EXPECT_EQ(name->ft->release(name).rc, CMPI_RC_OK);
-    EXPECT_EQ(names(inst), (std::vector<std::string>{"Name", "Text"}));
+    EXPECT_EQ(propertyNames(inst), (std::vector<std::string>{"Name", "Text"}));
     EXPECT_EQ(text(name), "Text");
 }
 
@@ -100,7 +89,7 @@ TEST_F(PropertyNamesTest, FilterSetAfterPropertiesKeepsLookupsRight) {
     ASSERT_EQ(inst->ft->setPropertyFilter(inst, keep, keys).rc, CMPI_RC_OK);
     setText(inst, "Text", "dropped");
     setCounter(inst, "Counter", 8);
-    EXPECT_EQ(names(inst), (std::vector<std::string>{"Name", "Counter"}));
+    EXPECT_EQ(propertyNames(inst), (std::vector<std::string>{"Name", "Counter"}));
     EXPECT_EQ(inst->ft->getProperty(inst, "Counter", nullptr).value.uint32, 8U);
     CMPIObjectPath* op = inst->ft->getObjectPath(inst, nullptr);
     EXPECT_EQ(text(op->ft->getKey(op, "name", nullptr).value.string), "f");
@@ -134,7 +123,7 @@ TEST_F(PropertyNamesTest, CloneOfAScopesInstanceOutlivesTheScope) {
         s->ft->release(s);
         texts->ft->release(texts);
     }
-    EXPECT_EQ(names(copy), (std::vector<std::string>{"Name", "Numbers", "Other"}));
+    EXPECT_EQ(propertyNames(copy), (std::vector<std::string>{"Name", "Numbers", "Other"}));
     CMPIArray* texts = copy->ft->getProperty(copy, "numbers", nullptr).value.array;
     EXPECT_EQ(text(texts->ft->getElementAt(texts, 0, nullptr).value.string), "in the array");
     CMPIObjectPath* ref = copy->ft->getProperty(copy, "Other", nullptr).value.ref;
