@@ -5,6 +5,7 @@
 #include <thread>
 #include <vector>
 
+#include "context.hpp"
 #include "core_fixture.hpp"
 
 namespace orv::host::test {
@@ -182,6 +183,42 @@ TEST_F(PropertyNamesTest, InstancesOfOneClassBuiltOnSeveralThreadsAtOnce) {
         thread.join();
     }
     EXPECT_EQ(failures, (std::vector<int>{0, 0, 0, 0}));
+}
+
+TEST_F(PropertyNamesTest, ReleaseEntryFreesEachUnitOfWorkOfAnAttachedThread) {
+    // Run under AddressSanitizer / valgrind: every unit's pool goes back at the
+    // release entry and the next unit builds in reused chunks.
+    CMPIContext* invocation = detail::newContext(detail::Owner::Caller);
+    CMPIContext* ctx = mb()->bft->prepareAttachThread(mb(), invocation);
+    invocation->ft->release(invocation);
+    ASSERT_NE(ctx, nullptr);
+    int failures = 0;
+    std::thread worker([this, ctx, &failures] {
+        mb()->bft->attachThread(mb(), ctx);
+        for (int unit = 0; unit < 50; ++unit) {
+            CMPIInstance* inst = element("unit");
+            const std::string value = "value of unit " + std::to_string(unit);
+            for (const char* name : {"Text", "Extra", "Undeclared"}) {
+                setText(inst, name, value.c_str());
+            }
+            CMPIArray* texts = mb()->eft->newArray(mb(), 300, CMPI_string, nullptr);
+            for (CMPICount i = 0; i < 300; ++i) {
+                texts->ft->setElementAt(texts, i, reinterpret_cast<const CMPIValue*>(value.c_str()), CMPI_chars);
+            }
+            inst->ft->setProperty(inst, "Numbers", reinterpret_cast<const CMPIValue*>(&texts), CMPI_stringA);
+            CMPIArray* held = inst->ft->getProperty(inst, "Numbers", nullptr).value.array;
+            if (stringProperty(inst, "undeclared") != value ||
+                text(held->ft->getElementAt(held, 299, nullptr).value.string) != value) {
+                ++failures;
+            }
+            if (CMReleaseThreadMemory(ctx).rc != CMPI_RC_OK) {
+                ++failures;
+            }
+        }
+        mb()->bft->detachThread(mb(), ctx);
+    });
+    worker.join();
+    EXPECT_EQ(failures, 0);
 }
 
 }  // namespace
