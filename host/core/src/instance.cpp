@@ -90,6 +90,7 @@ CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMP
     if (!passesFilter(*inst, name)) {
         return okStatus();  // filtered out: accepted and dropped
     }
+    ++inst->changes;
     return CMPIStatus{inst->properties.set(name, value, type), nullptr};
 }
 
@@ -98,24 +99,59 @@ CMPIStatus setPropertyWithOrigin(const CMPIInstance* instance, const char* name,
     return setProperty(instance, name, value, type);
 }
 
+// Whether a key value cannot change behind the instance's back: a scalar or a
+// string (an embedded object read from the instance could be changed in place).
+bool isFixedKey(const CMPIData& data) noexcept { return data.type == CMPI_string || !ownsMember(data.type); }
+
+// The instance's path, made under `owner` (Parent: carved from `home`); false in
+// `cacheable` when a key could change without the instance knowing.
+CMPIObjectPath* makePath(const InstanceImpl& inst, Owner owner, Arena* home, bool& cacheable) {
+    MemberHome parent(home);
+    CMPIObjectPath* path = newObjectPath(inst.nameSpace, inst.className, inst.classes, owner);
+    ObjectPathImpl* p = objectPathImpl(path);
+    p->host = inst.host;
+    MemberHome members(p->keys.home());
+    cacheable = true;
+    forEachKey(inst, [p, &cacheable](const NamedValue* property) {
+        if (property != nullptr && property->data.state == CMPI_goodValue) {
+            CMPIData copy{};
+            copyValue(copy, property->data);
+            p->keys.appendDistinct(*property, copy);
+            cacheable = cacheable && isFixedKey(property->data);
+        }
+    });
+    return path;
+}
+
 CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
     InstanceImpl* inst = impl(instance);
     if (inst == nullptr) {
         setRc(rc, CMPI_RC_ERR_INVALID_HANDLE);
         return nullptr;
     }
-    CMPIObjectPath* path = newObjectPath(inst->nameSpace, inst->className, inst->classes, Owner::Arena);
-    ObjectPathImpl* p = objectPathImpl(path);
-    p->host = inst->host;
-    MemberHome members(p->keys.home());
-    forEachKey(*inst, [p](const NamedValue* property) {
-        if (property != nullptr && property->data.state == CMPI_goodValue) {
-            CMPIData copy{};
-            copyValue(copy, property->data);
-            p->keys.appendDistinct(*property, copy);
-        }
-    });
     setRc(rc, CMPI_RC_OK);
+    // Only the thread whose current arena holds the instance (the one building or
+    // serving it) uses the cache, so that other threads may read the instance at
+    // the same time as before.
+    Arena* home = baseOf(instance)->home;
+    bool cacheable = home != nullptr && home == &currentArena();
+    if (!cacheable) {
+        return makePath(*inst, Owner::Arena, nullptr, cacheable);
+    }
+    PathCache& cache = inst->pathCache;
+    if (cache.path != nullptr && cache.instanceChanges == inst->changes &&
+        objectPathImpl(cache.path)->changes == cache.pathChanges) {
+        return cache.path;
+    }
+    cache.forget();
+    CMPIObjectPath* path = makePath(*inst, Owner::Parent, home, cacheable);
+    if (!cacheable) {
+        handOverObject(path);
+        return path;
+    }
+    cache.path = path;
+    cache.instanceChanges = inst->changes;
+    cache.pathChanges = objectPathImpl(path)->changes;
     return path;
 }
 
@@ -140,6 +176,7 @@ CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** propertyList, 
         allowed.push_back(std::move(key));
     }
     inst->filter = std::move(allowed);
+    ++inst->changes;
     inst->properties.keepIf([inst](std::string_view name) { return passesFilter(*inst, name); });
     return okStatus();
 }
@@ -150,6 +187,7 @@ CMPIStatus setObjectPath(CMPIInstance* instance, const CMPIObjectPath* op) {
     if (inst == nullptr || path == nullptr) {
         return kInvalid;
     }
+    ++inst->changes;
     inst->nameSpace = path->nameSpace;
     inst->host = path->host;
     inst->className = path->className;
@@ -197,6 +235,13 @@ CMPIInstance* newInstance(const CMPIObjectPath* path, Owner owner) {
     }
     setObjectPath(instance, path);
     return instance;
+}
+
+void PathCache::forget() noexcept {
+    if (path != nullptr) {
+        handOverObject(path);
+        path = nullptr;
+    }
 }
 
 InstanceImpl* instanceImpl(const CMPIInstance* instance) noexcept {

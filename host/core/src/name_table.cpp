@@ -1,7 +1,5 @@
 #include "name_table.hpp"
 
-#include <cstring>
-
 #include "memory.hpp"
 #include "names.hpp"
 #include "object.hpp"
@@ -32,7 +30,9 @@ NameTable::NameTable(const std::vector<std::string>& names, std::vector<std::str
         }
         const auto slot = static_cast<std::uint32_t>(entries_.size());
         // Parent-owned: a provider releasing the name handed to it changes nothing.
-        entries_.push_back(Entry{newString(name, Owner::Parent), hash, static_cast<std::uint32_t>(name.size())});
+        CMPIString* string = newString(name, Owner::Parent);
+        entries_.push_back(Entry{string, static_cast<const char*>(baseOf(string)->hdl), hash,
+                                 static_cast<std::uint32_t>(name.size())});
         std::size_t at = hash & (index_.size() - 1);
         while (index_[at] != kNone) {
             at = (at + 1) & (index_.size() - 1);
@@ -57,18 +57,11 @@ NameTable::~NameTable() {
     }
 }
 
-bool NameTable::spelledAs(std::uint32_t slot, std::string_view name) const noexcept {
-    const Entry& entry = entries_[slot];
-    return entry.length == name.size() &&
-           std::memcmp(static_cast<const char*>(baseOf(entry.string)->hdl), name.data(), name.size()) == 0;
-}
-
 std::uint32_t NameTable::find(std::string_view name, std::uint32_t hash) const noexcept {
     std::size_t at = hash & (index_.size() - 1);
     while (index_[at] != kNone) {
         const Entry& entry = entries_[index_[at]];
-        if (entry.hash == hash &&
-            equalsNoCase(std::string_view(static_cast<const char*>(baseOf(entry.string)->hdl), entry.length), name)) {
+        if (entry.hash == hash && equalsNoCase(std::string_view(entry.chars, entry.length), name)) {
             return index_[at];
         }
         at = (at + 1) & (index_.size() - 1);

@@ -8,6 +8,7 @@
 
 #include <atomic>
 #include <cstdint>
+#include <cstring>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -31,7 +32,10 @@ public:
     std::uint32_t hash(std::uint32_t slot) const noexcept { return entries_[slot].hash; }
     std::uint32_t length(std::uint32_t slot) const noexcept { return entries_[slot].length; }
     // Whether the slot's name is spelled exactly `name`.
-    bool spelledAs(std::uint32_t slot, std::string_view name) const noexcept;
+    bool spelledAs(std::uint32_t slot, std::string_view name) const noexcept {
+        const Entry& entry = entries_[slot];
+        return entry.length == name.size() && std::memcmp(entry.chars, name.data(), name.size()) == 0;
+    }
     // The slot of `name` in any case (hash: its hashNoCase), or kNone.
     std::uint32_t find(std::string_view name, std::uint32_t hash) const noexcept;
 
@@ -52,6 +56,7 @@ public:
 private:
     struct Entry {
         CMPIString* string;
+        const char* chars;  // the string's
         std::uint32_t hash;
         std::uint32_t length;
     };

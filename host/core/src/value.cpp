@@ -439,4 +439,10 @@ void handOverValue(CMPIData& data, Arena& arena) noexcept {
     }
 }
 
+void handOverObject(const void* object) noexcept {
+    ObjectBase* base = baseOf(object);
+    base->owner = Owner::Arena;
+    (base->home != nullptr ? *base->home : currentArena()).adopt(base);
+}
+
 }  // namespace orv::host::detail

@@ -147,4 +147,7 @@ class Arena;
 // Moves the encapsulated member of a stored value into `arena`; the value
 // keeps pointing at it.
 void handOverValue(CMPIData& data, Arena& arena) noexcept;
+// Makes a Parent-owned object belong to an arena: its pool's when carved from
+// one, else the current arena.
+void handOverObject(const void* object) noexcept;
 }  // namespace orv::host::detail
