@@ -130,11 +130,11 @@ CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
         return nullptr;
     }
     setRc(rc, CMPI_RC_OK);
-    // Only the thread whose current arena holds the instance (the one building or
-    // serving it) uses the cache, so that other threads may read the instance at
-    // the same time as before.
+    // Only the thread that made the instance's arena (the one building or serving
+    // it) uses the cache, so that other threads may read the instance at the same
+    // time as before.
     Arena* home = baseOf(instance)->home;
-    bool cacheable = home != nullptr && home == &currentArena();
+    bool cacheable = home != nullptr && home->madeOnThisThread();
     if (!cacheable) {
         return makePath(*inst, Owner::Arena, nullptr, cacheable);
     }

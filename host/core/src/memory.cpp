@@ -7,6 +7,7 @@ namespace orv::host::detail {
 
 constinit thread_local Arena* tlsCurrentArena = nullptr;
 constinit thread_local Arena* tlsMemberHome = nullptr;
+constinit thread_local char tlsThreadTag = 0;
 
 struct Pool::Chunk {
     Chunk* next;

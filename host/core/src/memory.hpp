@@ -76,10 +76,14 @@ private:
     Chunk* chunks_ = nullptr;
 };
 
+extern constinit thread_local Arena* tlsCurrentArena;
+extern constinit thread_local Arena* tlsMemberHome;
+extern constinit thread_local char tlsThreadTag;
+
 // A list of objects freed together, and the pool their memory comes from.
 class Arena {
 public:
-    Arena() = default;
+    Arena() noexcept : thread_(&tlsThreadTag) {}
     ~Arena() { clear(); }
     Arena(const Arena&) = delete;
     Arena& operator=(const Arena&) = delete;
@@ -93,6 +97,8 @@ public:
     // carved from the pool after it.
     void clearAfter(const ObjectBase* mark) noexcept;
     void* allocate(std::size_t size) { return pool_.allocate(size); }
+    // Whether the calling thread made the arena (the thread that serves what it holds).
+    bool madeOnThisThread() const noexcept { return thread_ == &tlsThreadTag; }
     const ObjectBase* top() const noexcept { return head_; }
     std::size_t size() const noexcept { return count_; }
 
@@ -100,10 +106,9 @@ private:
     ObjectBase* head_ = nullptr;  // newest
     std::size_t count_ = 0;
     Pool pool_;
+    const char* thread_;
 };
 
-extern constinit thread_local Arena* tlsCurrentArena;
-extern constinit thread_local Arena* tlsMemberHome;
 
 // The arena new broker objects of the calling thread go to: the innermost open
 // invocation or scope, else the thread's own arena.
