@@ -10,10 +10,9 @@
 //                                    valgrind --tool=callgrind instruction counts
 #include <benchmark/benchmark.h>
 
-#include <cstdlib>
-#include <cstring>
 #include <string>
 
+#include "orv/bench/FixedRuns.h"
 #include "orv/host/broker_core.hpp"
 
 namespace {
@@ -103,16 +102,13 @@ BENCHMARK(BM_ExecQueryByEnumeration);
 }  // namespace
 
 int main(int argc, char** argv) {
-    for (int i = 1; i < argc; ++i) {
-        if (std::strncmp(argv[i], "--fixed=", 8) == 0) {
-            Setup setup;
-            long count = std::atol(argv[i] + 8);
-            std::size_t sum = 0;
-            for (long n = 0; n < count; ++n) {
-                sum += roundTrip(setup.core, setup.path, setup.opts);
-            }
-            return sum == 0 ? 1 : 0;
+    if (const long count = orv::bench::fixedRuns(argc, argv); count >= 0) {
+        Setup setup;
+        std::size_t sum = 0;
+        for (long n = 0; n < count; ++n) {
+            sum += roundTrip(setup.core, setup.path, setup.opts);
         }
+        return sum == 0 ? 1 : 0;
     }
     benchmark::Initialize(&argc, argv);
     benchmark::RunSpecifiedBenchmarks();

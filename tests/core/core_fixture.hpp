@@ -11,6 +11,7 @@
 #include <memory>
 #include <sstream>
 #include <string>
+#include <vector>
 
 #include "orv/host/broker_core.hpp"
 
@@ -32,6 +33,18 @@ inline std::string text(const CMPIString* s) { return s != nullptr ? static_cast
 inline std::string stringProperty(const CMPIInstance* inst, const char* name) {
     CMPIData d = inst->ft->getProperty(inst, name, nullptr);
     return d.type == CMPI_string ? text(d.value.string) : "<not a string>";
+}
+
+// The names of an instance's properties, in order.
+inline std::vector<std::string> propertyNames(const CMPIInstance* inst) {
+    std::vector<std::string> out;
+    const CMPICount count = inst->ft->getPropertyCount(inst, nullptr);
+    for (CMPICount i = 0; i < count; ++i) {
+        CMPIString* name = nullptr;
+        inst->ft->getPropertyAt(inst, i, &name, nullptr);
+        out.push_back(text(name));
+    }
+    return out;
 }
 
 inline std::string className(const CMPIObjectPath* op) { return text(op->ft->getClassName(op, nullptr)); }

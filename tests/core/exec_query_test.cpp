@@ -26,17 +26,6 @@ protected:
         }
         return out;
     }
-
-    static std::vector<std::string> propertyNames(const CMPIInstance* inst) {
-        std::vector<std::string> out;
-        const CMPICount count = inst->ft->getPropertyCount(inst, nullptr);
-        for (CMPICount i = 0; i < count; ++i) {
-            CMPIString* name = nullptr;
-            inst->ft->getPropertyAt(inst, i, &name, nullptr);
-            out.push_back(text(name));
-        }
-        return out;
-    }
 };
 
 TEST_F(ExecQueryTest, ProviderRefusingExecQueryIsAnsweredFromItsEnumeration) {

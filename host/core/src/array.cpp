@@ -4,23 +4,39 @@
 
 namespace orv::host::detail {
 
-ArrayImpl::ArrayImpl(CMPICount size, CMPIType type)
-    : elementType(storedType(static_cast<CMPIType>(type & ~CMPI_ARRAY))), elements(size) {
-    for (CMPIData& element : elements) {
-        element.type = elementType;
-        element.state = CMPI_nullValue;
+void ArrayImpl::allocate(CMPICount count) {
+    home = memberHome();
+    size = count;
+    if (count != 0) {
+        elements = static_cast<CMPIData*>(allocateObject(home, sizeof(CMPIData) * count));
     }
 }
 
-ArrayImpl::ArrayImpl(const ArrayImpl& other) : elementType(other.elementType), elements(other.elements.size()) {
-    for (std::size_t i = 0; i < elements.size(); ++i) {
+ArrayImpl::ArrayImpl(CMPICount count, CMPIType type)
+    : elementType(storedType(static_cast<CMPIType>(type & ~CMPI_ARRAY))) {
+    allocate(count);
+    for (CMPICount i = 0; i < size; ++i) {
+        elements[i] = CMPIData{};
+        elements[i].type = elementType;
+        elements[i].state = CMPI_nullValue;
+    }
+}
+
+ArrayImpl::ArrayImpl(const ArrayImpl& other) : elementType(other.elementType) {
+    allocate(other.size);
+    for (CMPICount i = 0; i < size; ++i) {
         copyValue(elements[i], other.elements[i]);
     }
 }
 
 ArrayImpl::~ArrayImpl() {
-    for (CMPIData& element : elements) {
-        freeValue(element);
+    // In a pool, strings and scalars have nothing to free.
+    const bool nothingToFree = home != nullptr && (elementType == CMPI_string || !ownsMember(elementType));
+    for (CMPICount i = 0; !nothingToFree && i < size; ++i) {
+        freeValue(elements[i]);
+    }
+    if (elements != nullptr) {
+        freeObjectMemory(elements, home);
     }
 }
 
@@ -37,7 +53,7 @@ CMPIArray* clone(const CMPIArray* array, CMPIStatus* rc) {
 CMPICount getSize(const CMPIArray* array, CMPIStatus* rc) {
     ArrayImpl* impl = arrayImpl(array);
     setRc(rc, impl != nullptr ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE);
-    return impl != nullptr ? static_cast<CMPICount>(impl->elements.size()) : 0;
+    return impl != nullptr ? impl->size : 0;
 }
 
 CMPIType getSimpleType(const CMPIArray* array, CMPIStatus* rc) {
@@ -52,7 +68,7 @@ CMPIData getElementAt(const CMPIArray* array, CMPICount index, CMPIStatus* rc) {
         setRc(rc, CMPI_RC_ERR_INVALID_HANDLE);
         return nullData();
     }
-    if (index >= impl->elements.size()) {
+    if (index >= impl->size) {
         setRc(rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
         return nullData(CMPI_badValue);
     }
@@ -65,13 +81,14 @@ CMPIStatus setElementAt(CMPIArray* array, CMPICount index, const CMPIValue* valu
     if (impl == nullptr) {
         return CMPIStatus{CMPI_RC_ERR_INVALID_HANDLE, nullptr};
     }
-    if (index >= impl->elements.size()) {
+    if (index >= impl->size) {
         return CMPIStatus{CMPI_RC_ERR_NO_SUCH_PROPERTY, nullptr};
     }
     if (storedType(type) != impl->elementType) {
         return CMPIStatus{CMPI_RC_ERR_TYPE_MISMATCH, nullptr};
     }
     CMPIData stored{};
+    MemberHome members(impl->home);
     if (CMPIrc rc = storeValue(stored, value, type); rc != CMPI_RC_OK) {
         return CMPIStatus{rc, nullptr};
     }

@@ -1,21 +1,26 @@
 // CMPIArray: a fixed-size array of one element type; every element starts null.
 #pragma once
 
-#include <vector>
-
 #include "object.hpp"
 
 namespace orv::host::detail {
 
 extern const CMPIArrayFT kArrayFT;
 
+// The elements live where the array lives (memberHome() when it is made).
 struct ArrayImpl {
     CMPIType elementType = CMPI_null;  // CMPI_chars is kept as CMPI_string
-    std::vector<CMPIData> elements;
+    CMPICount size = 0;
+    CMPIData* elements = nullptr;
+    Arena* home = nullptr;
 
-    ArrayImpl(CMPICount size, CMPIType type);
+    ArrayImpl(CMPICount count, CMPIType type);
     ArrayImpl(const ArrayImpl& other);
     ~ArrayImpl();
+    ArrayImpl& operator=(const ArrayImpl&) = delete;
+
+private:
+    void allocate(CMPICount count);
 };
 
 CMPIArray* newArray(CMPICount size, CMPIType elementType, Owner owner);

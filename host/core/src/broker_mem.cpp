@@ -36,7 +36,7 @@ void* allocate(std::size_t size) {
     block->hdl = block + 1;
     block->destroy = destroyBlock;
     block->drop = dropNothing;
-    placeObject(block, Owner::Arena);
+    placeObject(block, Owner::Arena, nullptr);
     return block + 1;
 }
 

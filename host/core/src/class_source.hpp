@@ -1,5 +1,5 @@
-// What encapsulated objects need to know about classes: key lists for
-// CMPIInstance.getObjectPath and qualifiers for the object path's qualifier
+// What encapsulated objects need to know about classes: property names and
+// key lists for instances and CMPIInstance.getObjectPath and qualifiers for the object path's qualifier
 // getters. The broker core implements it over the class repository; objects
 // made for a provider remember the source of the broker that made them.
 #pragma once
@@ -12,13 +12,14 @@
 
 namespace orv::host::detail {
 
+class NameTable;
+
 class ClassSource {
 public:
     virtual ~ClassSource() = default;
-    // The key property names of the class, or nullptr when the class is unknown.
-    // The list stays valid as long as the source.
-    virtual const std::vector<std::string>* keyNames(std::string_view ns,
-                                                     std::string_view className) const = 0;
+    // The property names of the class (its keys among them), or nullptr when
+    // the class is unknown. The table stays valid as long as the source.
+    virtual const NameTable* nameTable(std::string_view ns, std::string_view className) const = 0;
     // A qualifier of the class (element empty), of a property or method
     // (element = its name) or of a parameter (element = "method.parameter").
     // Answers rc CMPI_RC_ERR_NOT_FOUND / CMPI_RC_ERR_INVALID_CLASS when missing.

@@ -1,6 +1,7 @@
 #include "core.hpp"
 
 #include <algorithm>
+#include <atomic>
 #include <set>
 #include <stdexcept>
 
@@ -14,6 +15,8 @@ namespace orv::host::detail {
 namespace {
 
 namespace fs = std::filesystem;
+
+std::atomic<std::uint64_t> nextSerial{1};
 namespace repo = orv::repository;
 
 // MOF files of a path: the file itself, or a directory's *.mof in name order.
@@ -33,7 +36,8 @@ std::vector<fs::path> mofFiles(const fs::path& path) {
 
 }  // namespace
 
-CoreServices::CoreServices(const CoreConfig& config) : broker_(makeBroker(this)), warningSink_(config.warningSink) {
+CoreServices::CoreServices(const CoreConfig& config)
+    : broker_(makeBroker(this)), serial_(nextSerial.fetch_add(1)), warningSink_(config.warningSink) {
     try {
         for (const fs::path& path : config.mofPaths) {
             for (const fs::path& file : mofFiles(path)) {
@@ -107,18 +111,50 @@ std::vector<std::string> CoreServices::createAllProviders() {
     return failures;
 }
 
-const std::vector<std::string>* CoreServices::keyNames(std::string_view ns, std::string_view className) const {
-    std::string cacheKey = lowerCase(ns) + ":" + lowerCase(className);
-    std::lock_guard lock(keyMutex_);
-    auto found = keyCache_.find(cacheKey);
-    if (found == keyCache_.end()) {
-        std::unique_ptr<std::vector<std::string>> names;
-        if (repository_.getClass(ns, className) != nullptr) {
-            names = std::make_unique<std::vector<std::string>>(repository_.keyNames(ns, className));
-        }
-        found = keyCache_.emplace(cacheKey, std::move(names)).first;
+namespace {
+
+// The table a thread looked up last, checked before the shared map: instances
+// of one class are usually made one after another.
+struct LastNameTable {
+    std::uint64_t serial = 0;
+    std::string nameSpace;
+    std::string className;
+    const NameTable* table = nullptr;
+};
+
+thread_local LastNameTable tlsLastNameTable;
+
+}  // namespace
+
+const NameTable* CoreServices::nameTable(std::string_view ns, std::string_view className) const {
+    LastNameTable& last = tlsLastNameTable;
+    if (last.serial == serial_ && last.className == className && last.nameSpace == ns) {
+        return last.table;
     }
-    return found->second.get();
+    std::string cacheKey = lowerCase(ns) + ":" + lowerCase(className);
+    const NameTable* table = nullptr;
+    {
+        std::lock_guard lock(nameTableMutex_);
+        auto found = nameTables_.find(cacheKey);
+        if (found == nameTables_.end()) {
+            std::unique_ptr<NameTable> made;
+            if (const repo::ClassDecl* cls = repository_.getClass(ns, className); cls != nullptr) {
+                std::vector<std::string> names;
+                names.reserve(cls->properties.size());
+                for (const auto& property : cls->properties) {
+                    names.push_back(property.name);
+                }
+                made = std::make_unique<NameTable>(names, repository_.keyNames(ns, className));
+            }
+            found = nameTables_.emplace(std::move(cacheKey), std::move(made)).first;
+        }
+        table = found->second.get();
+    }
+    last.serial = serial_;
+    last.nameSpace.assign(ns);
+    last.className.assign(className);
+    last.table = table;
+    return table;
 }
 
 CMPIData CoreServices::qualifier(std::string_view ns, std::string_view className, char elementKind,

@@ -17,6 +17,7 @@
 
 #include "class_source.hpp"
 #include "loader.hpp"
+#include "name_table.hpp"
 #include "orv/host/broker_core.hpp"
 #include "orv/repository/class_repository.hpp"
 #include "orv/repository/registration.hpp"
@@ -107,7 +108,7 @@ public:
     std::vector<std::string> createAllProviders();
 
     // ClassSource
-    const std::vector<std::string>* keyNames(std::string_view ns, std::string_view className) const override;
+    const NameTable* nameTable(std::string_view ns, std::string_view className) const override;
     CMPIData qualifier(std::string_view ns, std::string_view className, char elementKind, std::string_view element,
                        std::string_view qualifierName, CMPIrc* rc) const override;
     bool isA(std::string_view ns, std::string_view className, std::string_view ancestor) const override;
@@ -139,8 +140,10 @@ private:
     CMPIBroker broker_;
     std::unique_ptr<ProviderLoader> loader_;
 
-    mutable std::mutex keyMutex_;
-    mutable std::map<std::string, std::unique_ptr<std::vector<std::string>>> keyCache_;
+    // Tells this core's tables from those of a core that lived at the same address.
+    const std::uint64_t serial_;
+    mutable std::mutex nameTableMutex_;
+    mutable std::map<std::string, std::unique_ptr<NameTable>> nameTables_;
 
     std::function<void(const std::string&)> warningSink_;
     std::mutex warnedMutex_;

@@ -59,6 +59,7 @@ CMPIArray* toArray(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
     CMPIType type = e->items.empty() ? CMPI_instance : e->items.front().type;
     CMPIArray* array = newArray(static_cast<CMPICount>(e->items.size()), type, Owner::Arena);
     ArrayImpl* a = arrayImpl(array);
+    MemberHome members(a->home);
     for (std::size_t i = 0; i < e->items.size(); ++i) {
         freeValue(a->elements[i]);
         copyValue(a->elements[i], e->items[i]);

@@ -1,5 +1,6 @@
 #include "instance.hpp"
 
+#include "name_table.hpp"
 #include "names.hpp"
 #include "object_path.hpp"
 #include "string.hpp"
@@ -14,12 +15,22 @@ constexpr CMPIStatus kInvalid{CMPI_RC_ERR_INVALID_HANDLE, nullptr};
 InstanceImpl* impl(const CMPIInstance* instance) { return instanceImpl(instance); }
 
 const std::vector<std::string>& keyNamesOf(const InstanceImpl& inst) {
-    if (inst.classes != nullptr) {
-        if (const auto* names = inst.classes->keyNames(inst.nameSpace, inst.className); names != nullptr) {
-            return *names;
+    return inst.classNames != nullptr ? inst.classNames->keyNames() : inst.pathKeys;
+}
+
+// The key properties of the instance, in the order of its key names.
+template <class Visit>
+void forEachKey(const InstanceImpl& inst, Visit visit) {
+    if (inst.classNames != nullptr && inst.properties.nameTable() == inst.classNames &&
+        inst.classNames->keySlots().size() == inst.classNames->keyNames().size()) {
+        for (std::uint32_t slot : inst.classNames->keySlots()) {
+            visit(inst.properties.atSlot(slot));
         }
+        return;
     }
-    return inst.pathKeys;
+    for (const std::string& key : keyNamesOf(inst)) {
+        visit(inst.properties.find(key));
+    }
 }
 
 bool contains(const std::vector<std::string>& names, std::string_view name) {
@@ -79,6 +90,7 @@ CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMP
     if (!passesFilter(*inst, name)) {
         return okStatus();  // filtered out: accepted and dropped
     }
+    ++inst->changes;
     return CMPIStatus{inst->properties.set(name, value, type), nullptr};
 }
 
@@ -87,24 +99,59 @@ CMPIStatus setPropertyWithOrigin(const CMPIInstance* instance, const char* name,
     return setProperty(instance, name, value, type);
 }
 
+// Whether a key value cannot change behind the instance's back: a scalar or a
+// string (an embedded object read from the instance could be changed in place).
+bool isFixedKey(const CMPIData& data) noexcept { return data.type == CMPI_string || !ownsMember(data.type); }
+
+// The instance's path, made under `owner` (Parent: carved from `home`); false in
+// `cacheable` when a key could change without the instance knowing.
+CMPIObjectPath* makePath(const InstanceImpl& inst, Owner owner, Arena* home, bool& cacheable) {
+    MemberHome parent(home);
+    CMPIObjectPath* path = newObjectPath(inst.nameSpace, inst.className, inst.classes, owner);
+    ObjectPathImpl* p = objectPathImpl(path);
+    p->host = inst.host;
+    MemberHome members(p->keys.home());
+    cacheable = true;
+    forEachKey(inst, [p, &cacheable](const NamedValue* property) {
+        if (property != nullptr && property->data.state == CMPI_goodValue) {
+            CMPIData copy{};
+            copyValue(copy, property->data);
+            p->keys.appendDistinct(*property, copy);
+            cacheable = cacheable && isFixedKey(property->data);
+        }
+    });
+    return path;
+}
+
 CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
     InstanceImpl* inst = impl(instance);
     if (inst == nullptr) {
         setRc(rc, CMPI_RC_ERR_INVALID_HANDLE);
         return nullptr;
     }
-    CMPIObjectPath* path = newObjectPath(inst->nameSpace, inst->className, inst->classes, Owner::Arena);
-    ObjectPathImpl* p = objectPathImpl(path);
-    p->host = inst->host;
-    for (const std::string& key : keyNamesOf(*inst)) {
-        const NamedValue* property = inst->properties.find(key);
-        if (property != nullptr && property->data.state == CMPI_goodValue) {
-            CMPIData copy{};
-            copyValue(copy, property->data);
-            p->keys.setStored(property->name, copy);
-        }
-    }
     setRc(rc, CMPI_RC_OK);
+    // Only the thread that made the instance's arena (the one building or serving
+    // it) uses the cache, so that other threads may read the instance at the same
+    // time as before.
+    Arena* home = baseOf(instance)->home;
+    bool cacheable = home != nullptr && home->madeOnThisThread();
+    if (!cacheable) {
+        return makePath(*inst, Owner::Arena, nullptr, cacheable);
+    }
+    PathCache& cache = inst->pathCache;
+    if (cache.path != nullptr && cache.instanceChanges == inst->changes &&
+        objectPathImpl(cache.path)->changes == cache.pathChanges) {
+        return cache.path;
+    }
+    cache.forget();
+    CMPIObjectPath* path = makePath(*inst, Owner::Parent, home, cacheable);
+    if (!cacheable) {
+        handOverObject(path);
+        return path;
+    }
+    cache.path = path;
+    cache.instanceChanges = inst->changes;
+    cache.pathChanges = objectPathImpl(path)->changes;
     return path;
 }
 
@@ -129,7 +176,8 @@ CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** propertyList, 
         allowed.push_back(std::move(key));
     }
     inst->filter = std::move(allowed);
-    inst->properties.keepIf([inst](const std::string& name) { return passesFilter(*inst, name); });
+    ++inst->changes;
+    inst->properties.keepIf([inst](std::string_view name) { return passesFilter(*inst, name); });
     return okStatus();
 }
 
@@ -139,16 +187,21 @@ CMPIStatus setObjectPath(CMPIInstance* instance, const CMPIObjectPath* op) {
     if (inst == nullptr || path == nullptr) {
         return kInvalid;
     }
+    ++inst->changes;
     inst->nameSpace = path->nameSpace;
     inst->host = path->host;
     inst->className = path->className;
+    inst->classNames = inst->classes != nullptr ? inst->classes->nameTable(inst->nameSpace, inst->className) : nullptr;
     inst->pathKeys.clear();
+    MemberHome members(inst->properties.home());
     for (std::size_t i = 0; i < path->keys.size(); ++i) {
         const NamedValue& key = path->keys[i];
         CMPIData copy{};
         copyValue(copy, key.data);
-        inst->properties.setStored(key.name, copy);
-        inst->pathKeys.push_back(key.name);
+        inst->properties.setStored(key, copy);
+        if (inst->classNames == nullptr) {  // the class's own keys serve otherwise
+            inst->pathKeys.emplace_back(key.name());
+        }
     }
     return okStatus();
 }
@@ -175,9 +228,20 @@ CMPIInstance* newInstance(const CMPIObjectPath* path, Owner owner) {
         return nullptr;
     }
     CMPIInstance* instance = makeObject<CMPIInstance, InstanceImpl>(&kInstanceFT, owner);
-    instanceImpl(instance)->classes = p->classes;
+    InstanceImpl* inst = instanceImpl(instance);
+    inst->classes = p->classes;
+    if (p->classes != nullptr) {
+        inst->properties.useNameTable(p->classes->nameTable(p->nameSpace, p->className));
+    }
     setObjectPath(instance, path);
     return instance;
+}
+
+void PathCache::forget() noexcept {
+    if (path != nullptr) {
+        handOverObject(path);
+        path = nullptr;
+    }
 }
 
 InstanceImpl* instanceImpl(const CMPIInstance* instance) noexcept {
@@ -193,7 +257,9 @@ std::string instanceText(const InstanceImpl& instance) {
     std::string text = "instance of " + instance.className + " {\n";
     for (std::size_t i = 0; i < instance.properties.size(); ++i) {
         const NamedValue& property = instance.properties[i];
-        text += " " + property.name + " = " + keyText(property.data) + ";\n";
+        text += " ";
+        text += property.name();
+        text += " = " + keyText(property.data) + ";\n";
     }
     return text + "};\n";
 }

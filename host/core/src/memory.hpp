@@ -11,10 +11,18 @@
 // release() drops the object's contents at once but keeps its 16-byte shell
 // alive in the current arena, so that a second release is answered with an
 // error status instead of touching freed memory.
+//
+// Where the memory comes from is a separate matter (ObjectBase::home): objects
+// an arena owns, and everything inside them, are carved from that arena's pool,
+// which gives them back all at once when the arena is cleared; caller-owned
+// objects and their contents come from the heap and are freed one by one. So a
+// request that builds thousands of values costs a few pool chunks, not a
+// malloc and a free per value.
 #pragma once
 
 #include <cstddef>
 #include <cstdint>
+#include <new>
 
 namespace orv::host::detail {
 
@@ -27,46 +35,102 @@ struct ObjectBase {
     const void* ft = nullptr;  // mirrors the CMPI struct's ft
     ObjectBase* prev = nullptr;
     ObjectBase* next = nullptr;
-    Arena* arena = nullptr;
+    Arena* arena = nullptr;  // the arena whose list holds the object, if any
+    Arena* home = nullptr;   // the arena whose pool holds its memory; nullptr: the heap
     void (*destroy)(ObjectBase*) noexcept = nullptr;  // deletes the whole object
     void (*drop)(ObjectBase*) noexcept = nullptr;     // frees the contents only
     Owner owner = Owner::Caller;
     bool released = false;
 };
 
-// A list of objects freed together.
+// Bump allocation from chunks that are given back all at once. Chunks of the
+// usual size are kept per thread for the next pool, so that a request's pool
+// costs no malloc once the thread has served one before.
+class Pool {
+public:
+    struct Chunk;
+
+    Pool() = default;
+    ~Pool() { release(); }
+    Pool(const Pool&) = delete;
+    Pool& operator=(const Pool&) = delete;
+
+    // 16-byte aligned memory valid until release().
+    void* allocate(std::size_t size) {
+        size = (size + 15) & ~static_cast<std::size_t>(15);
+        if (static_cast<std::size_t>(end_ - cursor_) < size) {
+            return grow(size);
+        }
+        void* memory = cursor_;
+        cursor_ += size;
+        return memory;
+    }
+    // Gives back every chunk.
+    void release() noexcept;
+
+private:
+    void* grow(std::size_t size);
+
+    char* cursor_ = nullptr;
+    char* end_ = nullptr;
+    Chunk* chunks_ = nullptr;
+};
+
+extern constinit thread_local Arena* tlsCurrentArena;
+extern constinit thread_local Arena* tlsMemberHome;
+extern constinit thread_local char tlsThreadTag;
+
+// A list of objects freed together, and the pool their memory comes from.
 class Arena {
 public:
-    Arena() = default;
+    Arena() noexcept : thread_(&tlsThreadTag) {}
     ~Arena() { clear(); }
     Arena(const Arena&) = delete;
     Arena& operator=(const Arena&) = delete;
 
     void adopt(ObjectBase* object) noexcept;
     void unlink(ObjectBase* object) noexcept;
-    // Frees every object, newest first.
+    // Frees every object, newest first, then gives the pool back.
     void clear() noexcept;
-    // Frees the objects adopted after `mark` (a value from top()).
+    // Frees the objects adopted after `mark` (a value from top()). Their pool
+    // memory stays until clear(): objects made before the mark may hold values
+    // carved from the pool after it.
     void clearAfter(const ObjectBase* mark) noexcept;
+    void* allocate(std::size_t size) { return pool_.allocate(size); }
+    // Whether the calling thread made the arena (the thread that serves what it holds).
+    bool madeOnThisThread() const noexcept { return thread_ == &tlsThreadTag; }
     const ObjectBase* top() const noexcept { return head_; }
     std::size_t size() const noexcept { return count_; }
 
 private:
     ObjectBase* head_ = nullptr;  // newest
     std::size_t count_ = 0;
+    Pool pool_;
+    const char* thread_;
 };
+
 
 // The arena new broker objects of the calling thread go to: the innermost open
 // invocation or scope, else the thread's own arena.
-Arena& currentArena() noexcept;
+inline Arena& currentArena() noexcept;
 // The calling thread's own arena (attached provider threads, clients without a scope).
 Arena& threadArena() noexcept;
+
+inline Arena& currentArena() noexcept { return tlsCurrentArena != nullptr ? *tlsCurrentArena : threadArena(); }
+
+inline Arena* homeFor(Owner owner) noexcept {
+    switch (owner) {
+    case Owner::Arena: return &currentArena();
+    case Owner::Parent: return tlsMemberHome;
+    default: return nullptr;
+    }
+}
 
 // Makes `arena` current for the calling thread while alive.
 class ArenaGuard {
 public:
-    explicit ArenaGuard(Arena& arena) noexcept;
-    ~ArenaGuard();
+    explicit ArenaGuard(Arena& arena) noexcept : previous_(tlsCurrentArena) { tlsCurrentArena = &arena; }
+    ~ArenaGuard() { tlsCurrentArena = previous_; }
     ArenaGuard(const ArenaGuard&) = delete;
     ArenaGuard& operator=(const ArenaGuard&) = delete;
 
@@ -74,8 +138,39 @@ private:
     Arena* previous_;
 };
 
-// Places a new object under `owner`: Arena -> the current arena.
-void placeObject(ObjectBase* object, Owner owner) noexcept;
+// The arena whose pool new objects placed under `owner` are carved from:
+// Arena -> the current arena, Parent -> the parent's home (memberHome()),
+// Caller -> none (the heap).
+inline Arena* homeFor(Owner owner) noexcept;
+// Memory for an object of `size` bytes from `home`'s pool, or the heap.
+inline void* allocateObject(Arena* home, std::size_t size) {
+    return home != nullptr ? home->allocate(size) : ::operator new(size);
+}
+// Gives back the memory of an object whose destructor has run (heap only: pool
+// memory goes back with its arena).
+inline void freeObjectMemory(void* memory, Arena* home) noexcept {
+    if (home == nullptr) {
+        ::operator delete(memory);
+    }
+}
+
+// The home of the values a parent object being built or changed holds: new
+// Parent-owned objects are carved from it. MemberHome makes it current.
+inline Arena* memberHome() noexcept { return tlsMemberHome; }
+class MemberHome {
+public:
+    explicit MemberHome(Arena* home) noexcept : previous_(tlsMemberHome) { tlsMemberHome = home; }
+    ~MemberHome() { tlsMemberHome = previous_; }
+    MemberHome(const MemberHome&) = delete;
+    MemberHome& operator=(const MemberHome&) = delete;
+
+private:
+    Arena* previous_;
+};
+
+// Places a new object under `owner`: Arena -> the current arena. `home` is
+// where its memory came from (homeFor(owner) when it was allocated).
+void placeObject(ObjectBase* object, Owner owner, Arena* home) noexcept;
 
 // The generic release: Caller objects drop their contents and leave the shell
 // to the current arena; Arena objects drop their contents; Parent objects are

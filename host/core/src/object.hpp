@@ -5,6 +5,7 @@
 #include <cmpidt.h>
 #include <cmpift.h>
 
+#include <new>
 #include <optional>
 #include <utility>
 
@@ -16,21 +17,32 @@ template <class Impl>
 struct Object : ObjectBase {
     std::optional<Impl> impl;
 
-    static void destroyFn(ObjectBase* base) noexcept { delete static_cast<Object*>(base); }
+    static void destroyFn(ObjectBase* base) noexcept {
+        auto* object = static_cast<Object*>(base);
+        Arena* home = object->home;
+        object->~Object();
+        freeObjectMemory(object, home);
+    }
     static void dropFn(ObjectBase* base) noexcept { static_cast<Object*>(base)->impl.reset(); }
 };
 
 // Creates an object of type Pub (a CMPI struct) whose function table is `ft`;
-// hdl points at the contents unless the caller resets it.
+// hdl points at the contents unless the caller resets it. The contents are
+// built with the object's home as the home of the values they copy.
 template <class Pub, class Impl, class FT, class... Args>
 Pub* makeObject(const FT* ft, Owner owner, Args&&... args) {
-    auto* object = new Object<Impl>();
-    object->impl.emplace(std::forward<Args>(args)...);
+    Arena* home = homeFor(owner);
+    auto* object = new (allocateObject(home, sizeof(Object<Impl>))) Object<Impl>();
+    object->home = home;
+    {
+        MemberHome members(home);
+        object->impl.emplace(std::forward<Args>(args)...);
+    }
     object->hdl = &*object->impl;
     object->ft = ft;
     object->destroy = &Object<Impl>::destroyFn;
     object->drop = &Object<Impl>::dropFn;
-    placeObject(object, owner);
+    placeObject(object, owner, home);
     return reinterpret_cast<Pub*>(static_cast<ObjectBase*>(object));
 }
 

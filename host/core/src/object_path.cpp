@@ -26,6 +26,7 @@ CMPIStatus setText(CMPIObjectPath* path, std::string ObjectPathImpl::*member, co
         return kInvalid;
     }
     p->*member = text != nullptr ? text : "";
+    ++p->changes;
     return okStatus();
 }
 
@@ -67,6 +68,7 @@ CMPIStatus addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value
     if (name == nullptr) {
         return CMPIStatus{CMPI_RC_ERR_INVALID_PARAMETER, nullptr};
     }
+    ++p->changes;
     return CMPIStatus{p->keys.set(name, value, type), nullptr};
 }
 
@@ -111,6 +113,7 @@ CMPIStatus copyFrom(CMPIObjectPath* path, const CMPIObjectPath* source, bool wit
     if (withHost) {
         p->host = s->host;
     }
+    ++p->changes;
     return okStatus();
 }
 
@@ -225,7 +228,8 @@ std::string objectPathText(const ObjectPathImpl& path) {
     text += path.className;
     for (std::size_t i = 0; i < path.keys.size(); ++i) {
         text += i == 0 ? "." : ",";
-        text += path.keys[i].name + "=" + keyText(path.keys[i].data);
+        text += path.keys[i].name();
+        text += "=" + keyText(path.keys[i].data);
     }
     return text;
 }

@@ -1,6 +1,7 @@
 // CMPIObjectPath: namespace, host, class name and keys.
 #pragma once
 
+#include <cstdint>
 #include <string>
 
 #include "class_source.hpp"
@@ -17,6 +18,8 @@ struct ObjectPathImpl {
     std::string className;
     ValueList keys;
     const ClassSource* classes = nullptr;
+    // Counts the changes made through the function table (setters, addKey).
+    std::uint32_t changes = 0;
 };
 
 CMPIObjectPath* newObjectPath(std::string_view ns, std::string_view className,

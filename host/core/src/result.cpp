@@ -50,16 +50,43 @@ CMPIStatus consume(const ResultSink& sink, ReturnedItem::Kind kind, CMPIType typ
     return okStatus();
 }
 
-// Keeps the item, or hands it to the streaming consumer and frees what was made
-// for it since `mark` (the sink arena's newest object before the copy).
-CMPIStatus append(ResultSink& sink, ReturnedItem::Kind kind, CMPIType type, void* object, const ObjectBase* mark) {
-    if (sink.consumer == nullptr) {
-        sink.items.push_back(itemOf(kind, type, object));
+// A copy of a returned object made by `copy` with `arena` current, so that it
+// and its contents belong to that arena.
+template <class Copy>
+void* copyInto(Arena& arena, Copy&& copy) {
+    ArenaGuard guard(arena);
+    return copy();
+}
+
+// A returned object copied for the sink: kept in the sink's arena, or, for a
+// streaming consumer, made in an arena of its own that is freed as soon as the
+// consumer has it, so that a stream costs the memory of one object. An instance
+// the query (if any) does not select is dropped.
+template <class Copy>
+CMPIStatus deliverCopy(ResultSink& sink, ReturnedItem::Kind kind, CMPIType type, bool isInstance, Copy&& copy,
+                       const char* invalid) {
+    if (sink.consumer != nullptr) {
+        Arena scratch;
+        void* object = copyInto(scratch, copy);
+        if (object == nullptr) {
+            return status(CMPI_RC_ERR_INVALID_HANDLE, invalid);
+        }
+        if (isInstance && !admitted(sink, static_cast<CMPIInstance*>(object))) {
+            return okStatus();
+        }
+        return consume(sink, kind, type, object);
+    }
+    const ObjectBase* mark = sink.out->top();
+    void* object = copyInto(*sink.out, copy);
+    if (object == nullptr) {
+        return status(CMPI_RC_ERR_INVALID_HANDLE, invalid);
+    }
+    if (isInstance && !admitted(sink, static_cast<CMPIInstance*>(object))) {
+        sink.out->clearAfter(mark);
         return okStatus();
     }
-    const CMPIStatus consumed = consume(sink, kind, type, object);
-    sink.out->clearAfter(mark);
-    return consumed;
+    sink.items.push_back(itemOf(kind, type, object));
+    return okStatus();
 }
 
 CMPIStatus returnData(const CMPIResult* result, const CMPIValue* value, CMPIType type) {
@@ -72,6 +99,7 @@ CMPIStatus returnData(const CMPIResult* result, const CMPIValue* value, CMPIType
         return status(CMPI_RC_ERR_INVALID_DATA_TYPE, "returnData with CMPI_ref: use returnObjectPath");
     }
     ReturnedItem item;
+    MemberHome members(sink->out);
     if (CMPIrc rc = storeValue(item.data, value, type); rc != CMPI_RC_OK) {
         return CMPIStatus{rc, nullptr};
     }
@@ -92,20 +120,9 @@ CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance
         // No copy: the consumer is done with the provider's instance when it returns.
         return consume(*sink, ReturnedItem::Kind::Instance, CMPI_instance, const_cast<CMPIInstance*>(instance));
     }
-    const ObjectBase* mark = sink->out->top();
-    CMPIInstance* copy = nullptr;
-    {
-        ArenaGuard guard(*sink->out);
-        copy = cloneInstance(instance, Owner::Arena);
-    }
-    if (copy == nullptr) {
-        return status(CMPI_RC_ERR_INVALID_HANDLE, "returnInstance with an object that is not a live instance");
-    }
-    if (!admitted(*sink, copy)) {
-        sink->out->clearAfter(mark);
-        return okStatus();
-    }
-    return append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy, mark);
+    return deliverCopy(*sink, ReturnedItem::Kind::Instance, CMPI_instance, true,
+                       [&]() -> void* { return cloneInstance(instance, Owner::Arena); },
+                       "returnInstance with an object that is not a live instance");
 }
 
 CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path) {
@@ -116,29 +133,17 @@ CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path
     if (path == nullptr) {
         return status(CMPI_RC_ERR_INVALID_PARAMETER, "returnObjectPath with a NULL path");
     }
-    const ObjectBase* mark = sink->out->top();
-    const bool asInstance = sink->pathsAsInstances;
-    void* copy = nullptr;
-    {
-        ArenaGuard guard(*sink->out);
-        if (asInstance) {
-            copy = objectPathImpl(path) != nullptr ? newInstance(path, Owner::Arena) : nullptr;
-        } else {
-            copy = cloneObjectPath(path, Owner::Arena);
-        }
+    const char* invalid = "returnObjectPath with an object that is not a live object path";
+    if (!sink->pathsAsInstances) {
+        return deliverCopy(*sink, ReturnedItem::Kind::ObjectPath, CMPI_ref, false,
+                           [&]() -> void* { return cloneObjectPath(path, Owner::Arena); }, invalid);
     }
-    if (copy == nullptr) {
-        return status(CMPI_RC_ERR_INVALID_HANDLE, "returnObjectPath with an object that is not a live object path");
+    if (objectPathImpl(path) == nullptr) {
+        return status(CMPI_RC_ERR_INVALID_HANDLE, invalid);
     }
-    if (asInstance) {
-        ++sink->pathsTurnedIntoInstances;
-        if (!admitted(*sink, static_cast<CMPIInstance*>(copy))) {
-            sink->out->clearAfter(mark);
-            return okStatus();
-        }
-        return append(*sink, ReturnedItem::Kind::Instance, CMPI_instance, copy, mark);
-    }
-    return append(*sink, ReturnedItem::Kind::ObjectPath, CMPI_ref, copy, mark);
+    ++sink->pathsTurnedIntoInstances;
+    return deliverCopy(*sink, ReturnedItem::Kind::Instance, CMPI_instance, true,
+                       [&]() -> void* { return newInstance(path, Owner::Arena); }, invalid);
 }
 
 CMPIStatus returnDone(const CMPIResult* result) {

@@ -11,12 +11,14 @@ namespace {
 // characters cannot be freed apart from the shell, so a released string keeps them until
 // its arena is cleared, like the shell of any released object.
 struct StringObject : ObjectBase {
+    std::size_t length = 0;
     char* text() noexcept { return reinterpret_cast<char*>(this + 1); }
 
     static void destroyFn(ObjectBase* base) noexcept {
         auto* object = static_cast<StringObject*>(base);
+        Arena* home = object->home;
         object->~StringObject();
-        ::operator delete(object);
+        freeObjectMemory(object, home);
     }
     static void dropFn(ObjectBase* /*base*/) noexcept {}
 };
@@ -51,19 +53,35 @@ char* getCharPtr(const CMPIString* string, CMPIStatus* rc) {
 const CMPIStringFT kStringFT = {1, release, clone, getCharPtr};
 
 CMPIString* newString(std::string_view text, Owner owner) {
-    void* memory = ::operator new(sizeof(StringObject) + text.size() + 1);
+    Arena* home = homeFor(owner);
+    void* memory = allocateObject(home, sizeof(StringObject) + text.size() + 1);
     auto* object = new (memory) StringObject();
     char* chars = object->text();
     if (!text.empty()) {
         std::memcpy(chars, text.data(), text.size());
     }
     chars[text.size()] = '\0';
+    object->length = text.size();
     object->hdl = chars;
     object->ft = &kStringFT;
     object->destroy = &StringObject::destroyFn;
     object->drop = &StringObject::dropFn;
-    placeObject(object, owner);
+    placeObject(object, owner, home);
     return reinterpret_cast<CMPIString*>(static_cast<ObjectBase*>(object));
+}
+
+// A string a parent owns is never released or changed, and its pool memory
+// lasts as long as the pool: another value of the same pool may refer to it.
+CMPIString* memberString(const CMPIString* string) {
+    StringObject* object = stringObject(string);
+    if (object == nullptr) {
+        return nullptr;
+    }
+    Arena* home = memberHome();
+    if (home != nullptr && object->home == home && object->owner == Owner::Parent) {
+        return const_cast<CMPIString*>(string);
+    }
+    return newString(std::string_view(object->text(), object->length), Owner::Parent);
 }
 
 const char* stringText(const CMPIString* string) noexcept {

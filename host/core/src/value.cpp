@@ -3,10 +3,12 @@
 #include <cstring>
 
 #include "array.hpp"
+#include "memory.hpp"
 #include "args.hpp"
 #include "datetime.hpp"
 #include "enumeration.hpp"
 #include "instance.hpp"
+#include "name_table.hpp"
 #include "names.hpp"
 #include "object_path.hpp"
 #include "object.hpp"
@@ -18,7 +20,7 @@ namespace orv::host::detail {
 namespace {
 
 // Width of a scalar type's value, 0 for anything that is not a plain scalar.
-std::size_t scalarWidth(CMPIType type) noexcept {
+inline std::size_t scalarWidth(CMPIType type) noexcept {
     switch (type) {
     case CMPI_boolean:
     case CMPI_uint8:
@@ -80,10 +82,8 @@ void* copyMember(CMPIType type, const void* object) {
         return cloneSelectExp(static_cast<const CMPISelectExp*>(object), Owner::Parent);
     case CMPI_enumeration:
         return cloneEnumeration(static_cast<const CMPIEnumeration*>(object), Owner::Parent);
-    case CMPI_string: {
-        const char* text = stringText(static_cast<const CMPIString*>(object));
-        return text != nullptr ? newString(text, Owner::Parent) : nullptr;
-    }
+    case CMPI_string:
+        return memberString(static_cast<const CMPIString*>(object));
     case CMPI_dateTime:
         return cloneDateTime(static_cast<const CMPIDateTime*>(object), Owner::Parent);
     default:
@@ -130,18 +130,23 @@ bool isKnownType(CMPIType type) noexcept {
 }
 
 CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
-    if (!isKnownType(type)) {
-        return CMPI_RC_ERR_INVALID_DATA_TYPE;
-    }
     out = CMPIData{};
     out.type = storedType(type);
     out.state = CMPI_goodValue;
-    if (type == CMPI_null || value == nullptr) {
-        out.state = CMPI_nullValue;
+    if (std::size_t width = scalarWidth(type); width != 0) {  // the common case first
+        if (value == nullptr) {
+            out.state = CMPI_nullValue;
+        } else {
+            std::memcpy(&out.value, value, width);
+        }
         return CMPI_RC_OK;
     }
-    if (std::size_t width = scalarWidth(type); width != 0) {
-        std::memcpy(&out.value, value, width);
+    if (!isKnownType(type)) {
+        out = CMPIData{};
+        return CMPI_RC_ERR_INVALID_DATA_TYPE;
+    }
+    if (type == CMPI_null || value == nullptr) {
+        out.state = CMPI_nullValue;
         return CMPI_RC_OK;
     }
     if (type == CMPI_chars) {
@@ -181,7 +186,8 @@ void copyValue(CMPIData& out, const CMPIData& in) {
 }
 
 void freeValue(CMPIData& data) noexcept {
-    if (ownsMember(data.type) && data.value.inst != nullptr && data.state == CMPI_goodValue) {
+    if (ownsMember(data.type) && data.value.inst != nullptr && data.state == CMPI_goodValue &&
+        !isPoolString(data.value.inst)) {
         ObjectBase* member = baseOf(data.value.inst);
         member->destroy(member);
     }
@@ -193,51 +199,199 @@ void retireValue(CMPIData& data) noexcept {
     data.value.inst = nullptr;
 }
 
+namespace {
+
+// A Parent-owned string holding an entry's name, carved from the list's home.
+CMPIString* nameStringOf(std::string_view name, Arena* home) {
+    MemberHome members(home);
+    return newString(name, Owner::Parent);
+}
+
+}  // namespace
+
+ValueList::ValueList() noexcept : home_(memberHome()) {}
+
 ValueList::~ValueList() {
-    for (NamedValue& item : items_) {
-        freeValue(item.data);
+    for (std::uint32_t i = 0; i < size_; ++i) {
+        freeEntry(items_[i]);
+    }
+    freeObjectMemory(items_, home_);
+    freeObjectMemory(positions_, home_);
+}
+
+// Names carved from the same pool are shared: that memory stays until the
+// pool goes, whichever list goes first. Values are always copied.
+ValueList::ValueList(const ValueList& other) : home_(memberHome()) {
+    useNameTable(other.table_);
+    for (std::uint32_t i = 0; i < other.size_; ++i) {
+        const NamedValue& item = other.items_[i];
+        CMPIData copy{};
+        copyValue(copy, item.data);
+        setStored(item, copy);
     }
 }
 
-ValueList::ValueList(const ValueList& other) {
-    items_.reserve(other.items_.size());
-    for (const NamedValue& item : other.items_) {
-        NamedValue copy{item.name, item.hash, {}};
-        copyValue(copy.data, item.data);
-        items_.push_back(std::move(copy));
+void ValueList::useNameTable(const NameTable* table) {
+    if (home_ == nullptr || table == nullptr || size_ != 0) {
+        return;
+    }
+    table_ = table;
+    positions_ = static_cast<std::int32_t*>(allocateObject(home_, sizeof(std::int32_t) * table->size()));
+    indexSlots();
+}
+
+void ValueList::indexSlots() noexcept {
+    if (table_ == nullptr) {
+        return;
+    }
+    for (std::uint32_t slot = 0; slot < table_->size(); ++slot) {
+        positions_[slot] = -1;
+    }
+    for (std::uint32_t i = 0; i < size_; ++i) {
+        if (items_[i].slot != NameTable::kNone) {
+            positions_[items_[i].slot] = static_cast<std::int32_t>(i);
+        }
     }
 }
 
-const NamedValue* ValueList::findHashed(std::string_view name, std::uint32_t hash) const noexcept {
-    for (const NamedValue& item : items_) {
-        if (item.hash == hash && equalsNoCase(item.name, name)) {
+const NamedValue* ValueList::atSlot(std::uint32_t slot) const noexcept {
+    if (table_ == nullptr || slot >= table_->size() || positions_[slot] < 0) {
+        return nullptr;
+    }
+    return &items_[positions_[slot]];
+}
+
+void ValueList::freeEntry(NamedValue& item) noexcept {
+    freeValue(item.data);
+    if (home_ == nullptr) {
+        ObjectBase* name = baseOf(item.nameString);
+        name->destroy(name);
+    }
+}
+
+NamedValue& ValueList::append() {
+    if (size_ == capacity_) {
+        const std::uint32_t grown = capacity_ == 0 ? 8 : capacity_ * 2;
+        auto* items = static_cast<NamedValue*>(allocateObject(home_, grown * sizeof(NamedValue)));
+        for (std::uint32_t i = 0; i < size_; ++i) {
+            items[i] = items_[i];
+        }
+        freeObjectMemory(items_, home_);
+        items_ = items;
+        capacity_ = grown;
+    }
+    items_[size_] = NamedValue{};
+    return items_[size_++];
+}
+
+NamedValue* ValueList::findHashed(std::string_view name, std::uint32_t hash) const noexcept {
+    for (std::uint32_t i = 0; i < size_; ++i) {
+        NamedValue& item = items_[i];
+        if (item.hash == hash && equalsNoCase(item.name(), name)) {
             return &item;
         }
     }
     return nullptr;
 }
 
-const NamedValue* ValueList::find(std::string_view name) const noexcept { return findHashed(name, hashNoCase(name)); }
+const NamedValue* ValueList::find(std::string_view name) const noexcept {
+    const std::uint32_t hash = hashNoCase(name);
+    if (table_ != nullptr) {
+        if (const std::uint32_t slot = table_->find(name, hash); slot != NameTable::kNone) {
+            return atSlot(slot);
+        }
+    }
+    return findHashed(name, hash);
+}
 
 CMPIrc ValueList::set(std::string_view name, const CMPIValue* value, CMPIType type) {
     CMPIData stored{};
-    CMPIrc rc = storeValue(stored, value, type);
+    CMPIrc rc = CMPI_RC_OK;
+    {
+        MemberHome members(home_);
+        rc = storeValue(stored, value, type);
+    }
     if (rc == CMPI_RC_OK) {
-        setStored(name, stored);
+        put(name, nullptr, stored);
     }
     return rc;
 }
 
-// The name is hashed once, for the lookup and for the new entry.
-void ValueList::setStored(std::string_view name, CMPIData stored) {
-    std::uint32_t hash = hashNoCase(name);
-    if (const NamedValue* found = findHashed(name, hash); found != nullptr) {
-        NamedValue& existing = items_[static_cast<std::size_t>(found - items_.data())];
-        retireValue(existing.data);
-        existing.data = stored;
+void ValueList::setStored(std::string_view name, CMPIData stored) { put(name, nullptr, stored); }
+
+void ValueList::setStored(const NamedValue& source, CMPIData stored) { put(source.name(), &source, stored); }
+
+void ValueList::appendDistinct(const NamedValue& source, CMPIData stored) {
+    if (table_ != nullptr) {  // the table's slots must be looked up
+        setStored(source, stored);
         return;
     }
-    items_.push_back(NamedValue{std::string(name), hash, stored});
+    CMPIString* nameString = nameFor(source.name(), &source, NameTable::kNone, false);
+    NamedValue& item = append();
+    item.nameString = nameString;
+    item.hash = source.hash;
+    item.length = source.length;
+    item.slot = NameTable::kNone;
+    item.data = stored;
+}
+
+// Names are mostly set in the same order on every instance of a class: the
+// name set in this place last time is tried first, by its exact spelling.
+std::uint32_t ValueList::slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike) {
+    const std::uint32_t place = sets_++;
+    std::uint32_t slot = table_->guess(place);
+    if (slot != NameTable::kNone && table_->spelledAs(slot, name)) {
+        spelledAlike = true;
+        return slot;
+    }
+    slot = table_->find(name, source != nullptr ? source->hash : hashNoCase(name));
+    if (slot != NameTable::kNone) {
+        table_->learn(place, slot);
+        spelledAlike = table_->spelledAs(slot, name);
+    }
+    return slot;
+}
+
+// The name string of a new entry: the table's when spelled the same, the
+// source's when it comes from the same pool, else a copy.
+CMPIString* ValueList::nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot,
+                               bool spelledAlike) {
+    if (spelledAlike) {
+        return table_->nameString(slot);
+    }
+    if (source != nullptr && home_ != nullptr && baseOf(source->nameString)->home == home_) {
+        return source->nameString;
+    }
+    return nameStringOf(name, home_);
+}
+
+void ValueList::put(std::string_view name, const NamedValue* source, CMPIData stored) {
+    std::uint32_t slot = NameTable::kNone;
+    bool spelledAlike = false;
+    NamedValue* found = nullptr;
+    std::uint32_t hash = 0;
+    if (table_ != nullptr && (slot = slotOf(name, source, spelledAlike)) != NameTable::kNone) {
+        hash = table_->hash(slot);
+        found = positions_[slot] >= 0 ? &items_[positions_[slot]] : nullptr;
+    } else {
+        hash = source != nullptr ? source->hash : hashNoCase(name);
+        found = findHashed(name, hash);
+    }
+    if (found != nullptr) {
+        retireValue(found->data);
+        found->data = stored;
+        return;
+    }
+    CMPIString* nameString = nameFor(name, source, slot, spelledAlike);
+    NamedValue& item = append();
+    item.nameString = nameString;
+    item.hash = hash;
+    item.length = static_cast<std::uint32_t>(name.size());
+    item.slot = slot;
+    item.data = stored;
+    if (slot != NameTable::kNone) {
+        positions_[slot] = static_cast<std::int32_t>(size_ - 1);
+    }
 }
 
 CMPIData ValueList::get(std::string_view name, CMPIStatus* rc, CMPIValueState missing) const {
@@ -250,9 +404,11 @@ CMPIData ValueList::get(std::string_view name, CMPIStatus* rc, CMPIValueState mi
     return item->data;
 }
 
-CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc,
-                       CMPIValueState missing) const {
-    if (index >= items_.size()) {
+// A name carved from a pool is handed out as it is (it lasts as long as the
+// pool, at least the invocation); a list on the heap hands out a copy that
+// belongs to the current arena, since the list may be released first.
+CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const {
+    if (index >= size_) {
         setRc(rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
         if (name != nullptr) {
             *name = nullptr;
@@ -261,7 +417,7 @@ CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc,
     }
     const NamedValue& item = items_[index];
     if (name != nullptr) {
-        *name = newString(item.name, Owner::Arena);
+        *name = home_ != nullptr ? item.nameString : newString(item.name(), Owner::Arena);
     }
     setRc(rc, CMPI_RC_OK);
     return item.data;
@@ -271,12 +427,22 @@ CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc,
 
 namespace orv::host::detail {
 
+// A member carved from a pool joins that pool's arena, which it must not
+// outlive; one from the heap joins `arena`. A pool's string stays as it is: it
+// may be shared, and its memory goes with the pool.
 void handOverValue(CMPIData& data, Arena& arena) noexcept {
-    if (ownsMember(data.type) && data.value.inst != nullptr && data.state == CMPI_goodValue) {
+    if (ownsMember(data.type) && data.value.inst != nullptr && data.state == CMPI_goodValue &&
+        !isPoolString(data.value.inst)) {
         ObjectBase* member = baseOf(data.value.inst);
         member->owner = Owner::Arena;
-        arena.adopt(member);
+        (member->home != nullptr ? *member->home : arena).adopt(member);
     }
+}
+
+void handOverObject(const void* object) noexcept {
+    ObjectBase* base = baseOf(object);
+    base->owner = Owner::Arena;
+    (base->home != nullptr ? *base->home : currentArena()).adopt(base);
 }
 
 }  // namespace orv::host::detail

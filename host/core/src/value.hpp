@@ -14,11 +14,14 @@
 #include <cstdint>
 #include <string>
 #include <string_view>
-#include <vector>
 
 namespace orv::host::detail {
 
-// Converts setter input into an owned value. Null `value` (or a NULL object
+class Arena;
+class NameTable;
+
+// Converts setter input into an owned value, whose member is carved from
+// memberHome(). Null `value` (or a NULL object
 // pointer) gives a null value of the type. Answers CMPI_RC_ERR_INVALID_DATA_TYPE
 // for an unknown type code, CMPI_RC_ERR_INVALID_HANDLE for an object that is not
 // a live broker object of the type, CMPI_RC_ERR_TYPE_MISMATCH for an array whose
@@ -45,40 +48,69 @@ bool isKnownType(CMPIType type) noexcept;
 // Whether a stored value of this type owns an encapsulated member.
 bool ownsMember(CMPIType type) noexcept;
 
+// One entry of a ValueList. The name is a string object of the list (hdl: its
+// characters), handed out as it is by the getters that report names.
 struct NamedValue {
-    std::string name;
-    std::uint32_t hash = 0;
+    CMPIString* nameString = nullptr;
+    std::uint32_t hash = 0;    // hashNoCase of the name
+    std::uint32_t length = 0;  // of the name
+    std::uint32_t slot = 0;    // in the list's name table, NameTable::kNone when not there
     CMPIData data{};
+
+    std::string_view name() const noexcept {
+        return std::string_view(static_cast<const char*>(nameString->hdl), length);
+    }
 };
 
-// An ordered list of named values with case-insensitive lookup.
+// An ordered list of named values with case-insensitive lookup. Its entries,
+// names and values live where the list's owner lives (memberHome() when the
+// list is made): in an arena's pool, or on the heap.
+//
+// A list in a pool may use a class's NameTable (an instance's properties): an
+// entry of a declared name then carries the table's name string when spelled
+// the same, and setting a name is mostly a comparison with the name set in the
+// same place last time instead of a hash and a scan.
 class ValueList {
 public:
-    ValueList() = default;
+    ValueList() noexcept;
     ~ValueList();
     ValueList(const ValueList& other);
     ValueList& operator=(const ValueList&) = delete;
 
-    std::size_t size() const noexcept { return items_.size(); }
+    std::size_t size() const noexcept { return size_; }
     const NamedValue& operator[](std::size_t i) const noexcept { return items_[i]; }
     const NamedValue* find(std::string_view name) const noexcept;
     // Adds, or replaces the value of the same name (the first spelling stays).
     CMPIrc set(std::string_view name, const CMPIValue* value, CMPIType type);
     // Same with an already stored value (taken over).
     void setStored(std::string_view name, CMPIData stored);
+    // Same, naming the entry after `source` (an entry of another list).
+    void setStored(const NamedValue& source, CMPIData stored);
+    // Appends an entry named after `source` whose name the caller knows the
+    // list does not hold yet (such as the distinct keys of a new path).
+    void appendDistinct(const NamedValue& source, CMPIData stored);
     // Keeps only the entries for which keep(name) is true, in order.
     template <class Pred>
     void keepIf(Pred keep) {
-        std::vector<NamedValue> kept;
-        for (NamedValue& item : items_) {
-            if (keep(item.name)) {
-                kept.push_back(std::move(item));
+        std::size_t kept = 0;
+        for (std::size_t i = 0; i < size_; ++i) {
+            if (keep(items_[i].name())) {
+                items_[kept++] = items_[i];
             } else {
-                freeValue(item.data);
+                freeEntry(items_[i]);
             }
         }
-        items_ = std::move(kept);
+        size_ = kept;
+        indexSlots();
     }
+    // The arena whose pool holds the entries, nullptr for the heap.
+    Arena* home() const noexcept { return home_; }
+    // Uses `table` for the names from now on (ignored for a list on the heap).
+    // The list must be empty.
+    void useNameTable(const NameTable* table);
+    const NameTable* nameTable() const noexcept { return table_; }
+    // The entry of a slot of the name table, or null.
+    const NamedValue* atSlot(std::uint32_t slot) const noexcept;
 
     // Getter helpers: the value, or rc CMPI_RC_ERR_NO_SUCH_PROPERTY and a null
     // CMPIData with state CMPI_notFound (entries: CMPI_nullValue).
@@ -87,9 +119,25 @@ public:
 
 private:
     // The entry named `name`, whose hashNoCase is `hash`, or null.
-    const NamedValue* findHashed(std::string_view name, std::uint32_t hash) const noexcept;
+    NamedValue* findHashed(std::string_view name, std::uint32_t hash) const noexcept;
+    // Stores `stored` under `name` (source: an entry of another list with that
+    // name, whose name string may be shared).
+    void put(std::string_view name, const NamedValue* source, CMPIData stored);
+    // The slot of `name` in the name table, or NameTable::kNone.
+    // spelledAlike: set when the table spells the name the same.
+    std::uint32_t slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike);
+    NamedValue& append();
+    CMPIString* nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot, bool spelledAlike);
+    void freeEntry(NamedValue& item) noexcept;
+    void indexSlots() noexcept;
 
-    std::vector<NamedValue> items_;
+    Arena* home_;
+    NamedValue* items_ = nullptr;
+    std::uint32_t size_ = 0;
+    std::uint32_t capacity_ = 0;
+    const NameTable* table_ = nullptr;
+    std::int32_t* positions_ = nullptr;  // per slot of table_: index in items_, or -1
+    std::uint32_t sets_ = 0;             // names set so far: the place of the next one
 };
 
 }  // namespace orv::host::detail
@@ -99,4 +147,7 @@ class Arena;
 // Moves the encapsulated member of a stored value into `arena`; the value
 // keeps pointing at it.
 void handOverValue(CMPIData& data, Arena& arena) noexcept;
+// Makes a Parent-owned object belong to an arena: its pool's when carved from
+// one, else the current arena.
+void handOverObject(const void* object) noexcept;
 }  // namespace orv::host::detail
