@@ -1,14 +1,20 @@
 // EnumerateInstances of Bench_Port (64 instances of an Ethernet port's shape,
 // built by a provider on the C++ binding) through the broker core, streamed to
-// a consumer that reads each instance the way the CIM-XML writer does: the
-// object path (class name, keys with their names), the class name again, and
-// every property with its name, array elements included. What is measured is
-// the binding and the core per delivered instance, without platform or XML.
+// one of two consumers:
+// - one that reads each instance the way the CIM-XML writer does: the object
+//   path (class name, keys with their names), the class name again, and every
+//   property with its name, array elements included. What is measured is the
+//   binding and the core per delivered instance, without platform or XML;
+// - the CIM-XML writer itself, each instance written as the VALUE.NAMEDINSTANCE
+//   of a streamed EnumerateInstances answer (the text handed over in 16 KiB
+//   pieces as orv-cimhost sends its chunks): the binding, the core and the writer
+//   together per delivered instance, still without platform or HTTP.
 //
 //   binding_bench                 Google Benchmark, reports ns per instance
-//   binding_bench --fixed=N       N requests and nothing else, for
+//   binding_bench --fixed=N [--xml]
+//                                 N requests and nothing else, for
 //                                 valgrind --tool=callgrind instruction counts
-//   valgrind --tool=callgrind --collect-atstart=no binding_bench --callgrind
+//   valgrind --tool=callgrind --collect-atstart=no binding_bench --callgrind [--xml]
 //                                 the count of one steady-state request (64 instances)
 #include <benchmark/benchmark.h>
 
@@ -17,6 +23,8 @@
 
 #include "orv/bench/Callgrind.h"
 #include "orv/bench/FixedRuns.h"
+#include "orv/cimxml/object_encoder.hpp"
+#include "orv/cimxml/xml_writer.hpp"
 #include "orv/host/broker_core.hpp"
 
 namespace {
@@ -29,6 +37,10 @@ using orv::host::Reply;
 using orv::host::ReturnedItem;
 
 constexpr int kInstancesPerRequest = 64;
+// orv-cimhost sends a streamed answer in chunks of about this size.
+constexpr std::size_t kChunkBytes = 16 * 1024;
+
+enum class Consumer { Read, Xml };
 
 CoreConfig benchConfig() {
     CoreConfig config;
@@ -92,8 +104,22 @@ struct Setup {
     std::size_t seen = 0;
     int instances = 0;
     CallOptions opts;
-    Setup() {
+    orv::cimxml::XmlWriter out;
+    orv::cimxml::InstanceEncoding encoding;
+    explicit Setup(Consumer consumer = Consumer::Read) {
         opts.principal = "bench";
+        encoding.declarations = orv::cimxml::ClassDeclarations(core.classes(), "root/cimv2", "Bench_Port");
+        if (consumer == Consumer::Xml) {
+            opts.onItem = [this](const ReturnedItem& item) {
+                orv::cimxml::writeNamedInstance(out, item.data.value.inst, encoding);
+                if (out.size() >= kChunkBytes) {
+                    seen += out.drain().size();
+                }
+                ++instances;
+                return true;
+            };
+            return;
+        }
         opts.onItem = [this](const ReturnedItem& item) {
             seen += readInstance(item.data.value.inst);
             ++instances;
@@ -109,7 +135,7 @@ struct Setup {
 };
 
 void BM_PortShapedInstances(benchmark::State& state) {
-    Setup setup;
+    Setup setup(static_cast<Consumer>(state.range(0)));
     for (auto _ : state) {
         if (!setup.request()) {
             state.SkipWithError("the request failed");
@@ -121,17 +147,28 @@ void BM_PortShapedInstances(benchmark::State& state) {
     state.counters["ns/instance"] = benchmark::Counter(static_cast<double>(state.iterations() * kInstancesPerRequest),
                                                        benchmark::Counter::kIsRate | benchmark::Counter::kInvert);
 }
-BENCHMARK(BM_PortShapedInstances);
+// 0: read as the writer reads; 1: written as CIM-XML.
+BENCHMARK(BM_PortShapedInstances)->ArgName("xml")->Arg(0)->Arg(1);
+
+bool hasArgument(int argc, char** argv, const char* wanted) {
+    for (int i = 1; i < argc; ++i) {
+        if (std::strcmp(argv[i], wanted) == 0) {
+            return true;
+        }
+    }
+    return false;
+}
 
 }  // namespace
 
 int main(int argc, char** argv) {
-    if (std::strcmp(argc > 1 ? argv[1] : "", "--callgrind") == 0) {
-        Setup setup;
+    const Consumer consumer = hasArgument(argc, argv, "--xml") ? Consumer::Xml : Consumer::Read;
+    if (hasArgument(argc, argv, "--callgrind")) {
+        Setup setup(consumer);
         return orv::bench::collectSecondRun([&] { return setup.request() ? std::size_t{1} : 0; }) == 1 ? 0 : 1;
     }
     if (const long count = orv::bench::fixedRuns(argc, argv); count >= 0) {
-        Setup setup;
+        Setup setup(consumer);
         for (long n = 0; n < count; ++n) {
             if (!setup.request()) {
                 return 1;
