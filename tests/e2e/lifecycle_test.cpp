@@ -169,6 +169,53 @@ TEST(CimHostLifecycle, OverrunAfterTheAnswerBeganClosesTheConnectionWithoutTheLa
     EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
 }
 
+// The call runs on the request's worker; when it overruns, the answer goes out at the limit
+// and another worker takes that one's place: with a single worker, the same connection and
+// a new one are both served while the provider still sleeps.
+TEST(CimHostLifecycle, OverrunningCallHandsItsWorkerOverSoTheNextRequestsAreServed) {
+    setenv("SLOW_PROVIDER_MS", "4000", 1);
+    HostProcess host({"--provider-dir", buildDir() + "/lib", "--registration",
+                      sourceDir() + "/tests/e2e/data/slowhost.reg", "--mof",
+                      sourceDir() + "/tests/rawprovider/rawprovider.mof", "--provider-call-limit", "1",
+                      "--threads", "1"});
+    unsetenv("SLOW_PROVIDER_MS");
+    ASSERT_TRUE(host.waitReady()) << host.output();
+    const std::string enumerateNames =
+        "<?xml version=\"1.0\" encoding=\"utf-8\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
+        "<MESSAGE ID=\"7\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><IMETHODCALL NAME=\"EnumerateInstanceNames\">"
+        "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/></LOCALNAMESPACEPATH>"
+        "<IPARAMVALUE NAME=\"ClassName\"><CLASSNAME NAME=\"Raw_Element\"/></IPARAMVALUE>"
+        "</IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
+    const auto start = std::chrono::steady_clock::now();
+    RawConnection connection(host.port());
+    ASSERT_TRUE(connection.send(cimPost(enumerateNames, "EnumerateInstanceNames")));
+    auto overrun = connection.readResponse(std::chrono::milliseconds(3000));
+    ASSERT_TRUE(overrun) << "answered at the limit";
+    EXPECT_EQ(overrun->status, 200);
+    EXPECT_NE(overrun->body.find("<ERROR CODE=\"1\" DESCRIPTION=\"the request did not finish within the provider "
+                                 "call limit of 1 s"),
+              std::string::npos)
+        << overrun->body;
+    EXPECT_NE(overrun->body.find("<MESSAGE ID=\"7\""), std::string::npos) << overrun->body;
+
+    ASSERT_TRUE(connection.send(cimPost(enumerateClassNamesBody(8), "EnumerateClassNames")));
+    auto sameConnection = connection.readResponse(std::chrono::milliseconds(1500));
+    ASSERT_TRUE(sameConnection) << "the connection goes on after the early answer";
+    EXPECT_EQ(sameConnection->status, 200);
+    EXPECT_NE(sameConnection->body.find("<MESSAGE ID=\"8\""), std::string::npos);
+
+    RawConnection other(host.port());
+    ASSERT_TRUE(other.send(cimPost(enumerateClassNamesBody(9), "EnumerateClassNames")));
+    auto otherConnection = other.readResponse(std::chrono::milliseconds(1500));
+    ASSERT_TRUE(otherConnection) << "the only worker is busy with the provider: another took its place";
+    EXPECT_EQ(otherConnection->status, 200);
+    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(3800))
+        << "all of it while the provider still sleeps";
+    EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
+    EXPECT_GT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(3900))
+        << "the stop waited for the provider call still running";
+}
+
 TEST(CimHostLifecycle, BadMofFailsWithOneLine) {
     const std::string mof = tempPath("bad.mof");
     std::ofstream(mof) << "class Broken {\n  uint32 ;\n";

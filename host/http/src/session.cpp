@@ -56,12 +56,14 @@ Response unauthorized(const std::string& realm) {
     return response;
 }
 
-Response callHandler(const Handler& handler, const Request& request) {
+// `channel` is the request's stream: after an early answer the connection reads its next
+// request into the same place, so the request's own pointer is not looked at again.
+Response callHandler(const Handler& handler, const Request& request, StreamChannel* channel) {
     try {
         return handler(request);
     } catch (...) {
-        if (request.stream != nullptr) {
-            request.stream->abort();  // a body already begun cannot be completed
+        if (channel != nullptr) {
+            channel->abort();  // a body already begun cannot be completed
         }
         return status(500);
     }
@@ -200,8 +202,8 @@ void Session<Stream>::checkSystemLogin(std::string user, std::string password) {
     state_ = State::LoginCheck;
     transport().expires_never();
     auto check = [self = shared_from_this(), user = std::move(user), password = std::move(password)]() mutable {
-        asio::post(*self->context_.workers, [self, guard = asio::make_work_guard(self->context_.io),
-                                             user = std::move(user), password = std::move(password)]() mutable {
+        self->context_.workers->post([self, guard = asio::make_work_guard(self->context_.io),
+                                      user = std::move(user), password = std::move(password)]() mutable {
             const bool accepted = self->context_.options.pam->check(user, password);
             asio::io_context& io = self->context_.io;
             asio::post(io, [self = std::move(self), guard = std::move(guard), user = std::move(user),
@@ -313,10 +315,17 @@ void Session<Stream>::work() {
     transport().expires_never();
     std::shared_ptr<StreamChannel> channel = parser_->version() == 11 ? openStream() : nullptr;
     request_.stream = channel.get();
-    // The worker reads request_ while this connection waits; nothing else touches it.
-    asio::post(*context_.workers, [self = shared_from_this(), channel = std::move(channel),
-                                   guard = asio::make_work_guard(context_.io)]() mutable {
-        Response response = callHandler(self->context_.handler, self->request_);
+    // The worker reads request_ while this connection waits; nothing else touches it (until
+    // an early answer, after which the handler no longer reads it).
+    context_.workers->post([self = shared_from_this(), channel = std::move(channel),
+                            guard = asio::make_work_guard(context_.io)]() mutable {
+        if (channel) {
+            channel->runOn(*self->context_.workers, WorkerPool::current());
+        }
+        Response response = callHandler(self->context_.handler, self->request_, channel.get());
+        if (channel && !channel->settle()) {
+            return;  // answered early: what the handler returned is dropped
+        }
         asio::io_context& io = self->context_.io;
         if (channel && channel->begun()) {
             // The I/O thread writes what is left and the last chunk; this post keeps the
@@ -401,6 +410,10 @@ void Session<Stream>::pumpStream() {
         return;  // no body streamed now, or the write in flight pumps again when done
     }
     StreamChannel::Batch batch = channel_->take();
+    if (batch.whole) {
+        finish(std::move(*batch.whole));  // answered early, while the handler goes on
+        return;
+    }
     if (batch.aborted) {
         streamFailed();
         return;
