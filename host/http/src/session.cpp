@@ -1,5 +1,7 @@
 #include "session.hpp"
 
+#include "response_head.hpp"
+
 #include <boost/asio/post.hpp>
 #include <boost/asio/ssl/stream_base.hpp>
 #include <boost/asio/write.hpp>
@@ -353,12 +355,17 @@ void Session<Stream>::refuse(int code) {
 }
 
 template <class Stream>
-template <class Message>
-void Session<Stream>::prepareHead(Message& message, Response& response, bool keepAlive) {
+void Session<Stream>::countServed(const Response& response) {
     ++served_;
     if (context_.accessLog) {
         context_.accessLog(request_, response);
     }
+}
+
+template <class Stream>
+template <class Message>
+void Session<Stream>::prepareHead(Message& message, Response& response, bool keepAlive) {
+    countServed(response);
     // Named, not "= {}": clang 14 leaves the destructor of a temporary made from an empty
     // braced list undefined inside an explicitly instantiated template (a link error).
     message = Message{};
@@ -376,14 +383,17 @@ void Session<Stream>::prepareHead(Message& message, Response& response, bool kee
     message.keep_alive(keepAlive);
 }
 
+// Head and body leave in one write.
 template <class Stream>
 void Session<Stream>::reply(Response response, bool keepAlive) {
-    prepareHead(response_, response, keepAlive);
-    response_.body() = std::move(response.body);
-    response_.prepare_payload();
+    countServed(response);
+    const unsigned version = parser_ && parser_->version() == 10 ? 10 : 11;
+    responseHead_ = responseHead(version, response, keepAlive, context_.options.serverName);
+    responseBody_ = std::move(response.body);
     state_ = State::Writing;
     transport().expires_after(context_.options.writeTimeout);
-    beasthttp::async_write(stream_, response_, [self = shared_from_this(), keepAlive](error_code ec, std::size_t) {
+    const std::array<asio::const_buffer, 2> pieces{asio::buffer(responseHead_), asio::buffer(responseBody_)};
+    asio::async_write(stream_, pieces, [self = shared_from_this(), keepAlive](error_code ec, std::size_t) {
         self->onWritten(ec, keepAlive);
     });
 }

@@ -11,7 +11,6 @@
 #include <boost/beast/http/empty_body.hpp>
 #include <boost/beast/http/message.hpp>
 #include <boost/beast/http/serializer.hpp>
-#include <boost/beast/http/string_body.hpp>
 #include <boost/beast/ssl/ssl_stream.hpp>
 
 #include <array>
@@ -85,6 +84,7 @@ private:
     void work();
     void finish(Response response);
     void refuse(int status);
+    void countServed(const Response& response);
     template <class Message>
     void prepareHead(Message& message, Response& response, bool keepAlive);
     void reply(Response response, bool keepAlive);
@@ -104,8 +104,8 @@ private:
     boost::beast::flat_buffer buffer_;
     Request request_;
     std::optional<RequestParser> parser_;
-    using ResponseMessage = boost::beast::http::response<boost::beast::http::string_body>;
-    ResponseMessage response_;
+    std::string responseHead_;  // the whole answer being written: head, then body
+    std::string responseBody_;
     std::shared_ptr<StreamChannel> channel_;  // the streamed body in progress, if any
     boost::beast::http::response<boost::beast::http::empty_body> streamHead_;
     std::optional<boost::beast::http::response_serializer<boost::beast::http::empty_body>> headWriter_;
