@@ -55,7 +55,8 @@ public:
         : SessionBase(std::move(address), context),
           stream_(std::forward<StreamArgs>(streamArgs)...),
           buffer_(context.options.maxHeaderBytes + 65536),
-          delay_(context.io) {}
+          delay_(context.io),
+          deadlineTimer_(context.io) {}
 
     void start();
     void stopServing() override;
@@ -67,6 +68,9 @@ private:
     static constexpr bool kTls = std::is_same_v<Stream, TlsStream>;
 
     boost::beast::tcp_stream& transport() { return boost::beast::get_lowest_layer(stream_); }
+    void setDeadline(std::chrono::steady_clock::duration timeout);
+    void clearDeadline();
+    void armDeadline();
 
     void awaitRequest();
     void readHead();
@@ -113,6 +117,9 @@ private:
     bool chunkInFlight_ = false;
     bool streamKeepAlive_ = false;
     boost::asio::steady_timer delay_;
+    boost::asio::steady_timer deadlineTimer_;
+    std::chrono::steady_clock::time_point deadline_ = std::chrono::steady_clock::time_point::max();
+    bool deadlineArmed_ = false;
     std::array<char, 4096> scratch_{};
     std::size_t drained_ = 0;
     std::size_t served_ = 0;
