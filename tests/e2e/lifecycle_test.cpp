@@ -5,11 +5,14 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <atomic>
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
+#include <thread>
+#include <vector>
 
 #include "golden_file.hpp"
 #include "host_process.hpp"
@@ -214,6 +217,64 @@ TEST(CimHostLifecycle, OverrunningCallHandsItsWorkerOverSoTheNextRequestsAreServ
     EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
     EXPECT_GT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(3900))
         << "the stop waited for the provider call still running";
+}
+
+// Calls that overrun and calls that do not, from several clients at once: each overrun is
+// answered at the limit and every quick request in full, on two workers (under the thread
+// sanitizer this drives the early answer, the watchdog and the worker hand-over together).
+TEST(CimHostLifecycle, ConcurrentClientsAreServedWhileCallsOverrun) {
+    setenv("SLOW_PROVIDER_MS", "1500", 1);
+    HostProcess host({"--provider-dir", buildDir() + "/lib", "--registration",
+                      sourceDir() + "/tests/e2e/data/slowhost.reg", "--mof",
+                      sourceDir() + "/tests/rawprovider/rawprovider.mof", "--provider-call-limit", "1",
+                      "--threads", "2"});
+    unsetenv("SLOW_PROVIDER_MS");
+    ASSERT_TRUE(host.waitReady()) << host.output();
+    const std::string enumerateNames =
+        "<?xml version=\"1.0\" encoding=\"utf-8\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
+        "<MESSAGE ID=\"5\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><IMETHODCALL NAME=\"EnumerateInstanceNames\">"
+        "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/></LOCALNAMESPACEPATH>"
+        "<IPARAMVALUE NAME=\"ClassName\"><CLASSNAME NAME=\"Raw_Element\"/></IPARAMVALUE>"
+        "</IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
+    std::atomic<int> overruns{0};
+    std::atomic<int> quick{0};
+    std::vector<std::thread> clients;
+    for (int c = 0; c < 2; ++c) {
+        clients.emplace_back([&] {
+            RawConnection connection(host.port());
+            for (int i = 0; i < 2; ++i) {
+                if (!connection.send(cimPost(enumerateNames, "EnumerateInstanceNames"))) {
+                    return;
+                }
+                auto answer = connection.readResponse(std::chrono::seconds(10));
+                if (answer && answer->body.find("provider call limit of 1 s") != std::string::npos) {
+                    ++overruns;
+                }
+            }
+        });
+    }
+    for (int c = 0; c < 4; ++c) {
+        clients.emplace_back([&, c] {
+            RawConnection connection(host.port());
+            for (int i = 0; i < 20; ++i) {
+                if (!connection.send(cimPost(enumerateClassNamesBody(100 + c), "EnumerateClassNames"))) {
+                    return;
+                }
+                auto answer = connection.readResponse(std::chrono::seconds(10));
+                if (answer && answer->status == 200 &&
+                    answer->body.find("<MESSAGE ID=\"" + std::to_string(100 + c) + "\"") != std::string::npos &&
+                    answer->body.find("<ERROR") == std::string::npos) {
+                    ++quick;
+                }
+            }
+        });
+    }
+    for (auto& client : clients) {
+        client.join();
+    }
+    EXPECT_EQ(overruns.load(), 4);
+    EXPECT_EQ(quick.load(), 80);
+    EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
 }
 
 TEST(CimHostLifecycle, BadMofFailsWithOneLine) {
