@@ -172,23 +172,33 @@ TEST(CimHostLifecycle, OverrunAfterTheAnswerBeganClosesTheConnectionWithoutTheLa
     EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
 }
 
+// The arguments of a host serving the slow provider with a provider call limit of 1 s and
+// `threads` workers.
+std::vector<std::string> slowHostArgs(const char* threads) {
+    return {"--provider-dir", buildDir() + "/lib", "--registration", sourceDir() + "/tests/e2e/data/slowhost.reg",
+            "--mof", sourceDir() + "/tests/rawprovider/rawprovider.mof", "--provider-call-limit", "1",
+            "--threads", threads};
+}
+
+// EnumerateInstanceNames of Raw_Element in root/cimv2 with the given MESSAGE ID.
+std::string enumerateRawElementNames(int messageId) {
+    return "<?xml version=\"1.0\" encoding=\"utf-8\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
+           "<MESSAGE ID=\"" + std::to_string(messageId) +
+           "\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><IMETHODCALL NAME=\"EnumerateInstanceNames\">"
+           "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/></LOCALNAMESPACEPATH>"
+           "<IPARAMVALUE NAME=\"ClassName\"><CLASSNAME NAME=\"Raw_Element\"/></IPARAMVALUE>"
+           "</IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
+}
+
 // The call runs on the request's worker; when it overruns, the answer goes out at the limit
 // and another worker takes that one's place: with a single worker, the same connection and
 // a new one are both served while the provider still sleeps.
 TEST(CimHostLifecycle, OverrunningCallHandsItsWorkerOverSoTheNextRequestsAreServed) {
     setenv("SLOW_PROVIDER_MS", "4000", 1);
-    HostProcess host({"--provider-dir", buildDir() + "/lib", "--registration",
-                      sourceDir() + "/tests/e2e/data/slowhost.reg", "--mof",
-                      sourceDir() + "/tests/rawprovider/rawprovider.mof", "--provider-call-limit", "1",
-                      "--threads", "1"});
+    HostProcess host(slowHostArgs("1"));
     unsetenv("SLOW_PROVIDER_MS");
     ASSERT_TRUE(host.waitReady()) << host.output();
-    const std::string enumerateNames =
-        "<?xml version=\"1.0\" encoding=\"utf-8\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
-        "<MESSAGE ID=\"7\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><IMETHODCALL NAME=\"EnumerateInstanceNames\">"
-        "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/></LOCALNAMESPACEPATH>"
-        "<IPARAMVALUE NAME=\"ClassName\"><CLASSNAME NAME=\"Raw_Element\"/></IPARAMVALUE>"
-        "</IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
+    const std::string enumerateNames = enumerateRawElementNames(7);
     const auto start = std::chrono::steady_clock::now();
     RawConnection connection(host.port());
     ASSERT_TRUE(connection.send(cimPost(enumerateNames, "EnumerateInstanceNames")));
@@ -224,18 +234,10 @@ TEST(CimHostLifecycle, OverrunningCallHandsItsWorkerOverSoTheNextRequestsAreServ
 // sanitizer this drives the early answer, the watchdog and the worker hand-over together).
 TEST(CimHostLifecycle, ConcurrentClientsAreServedWhileCallsOverrun) {
     setenv("SLOW_PROVIDER_MS", "1500", 1);
-    HostProcess host({"--provider-dir", buildDir() + "/lib", "--registration",
-                      sourceDir() + "/tests/e2e/data/slowhost.reg", "--mof",
-                      sourceDir() + "/tests/rawprovider/rawprovider.mof", "--provider-call-limit", "1",
-                      "--threads", "2"});
+    HostProcess host(slowHostArgs("2"));
     unsetenv("SLOW_PROVIDER_MS");
     ASSERT_TRUE(host.waitReady()) << host.output();
-    const std::string enumerateNames =
-        "<?xml version=\"1.0\" encoding=\"utf-8\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
-        "<MESSAGE ID=\"5\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><IMETHODCALL NAME=\"EnumerateInstanceNames\">"
-        "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/></LOCALNAMESPACEPATH>"
-        "<IPARAMVALUE NAME=\"ClassName\"><CLASSNAME NAME=\"Raw_Element\"/></IPARAMVALUE>"
-        "</IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
+    const std::string enumerateNames = enumerateRawElementNames(5);
     std::atomic<int> overruns{0};
     std::atomic<int> quick{0};
     std::vector<std::thread> clients;
