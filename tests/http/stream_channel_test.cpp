@@ -32,6 +32,21 @@ TEST(StreamChannel, AnEarlyAnswerReachesTheConnectionAndTheHandlersAnswerIsDropp
     EXPECT_FALSE(channel.settle()) << "the handler's return value is dropped";
 }
 
+TEST(StreamChannel, PiecesArriveJoinedInTheOrderTheyWereWritten) {
+    StreamChannel channel(1 << 20, [] {});
+    EXPECT_TRUE(channel.begin(whole(200, "<a>")));
+    EXPECT_TRUE(channel.write("<b/>"));
+    StreamChannel::Batch first = channel.take();
+    EXPECT_EQ(first.data, "<a><b/>");
+    EXPECT_TRUE(channel.write(std::string(20000, 'c')));
+    EXPECT_TRUE(channel.write("</a>"));
+    channel.end();
+    StreamChannel::Batch second = channel.take();
+    EXPECT_FALSE(second.head);
+    EXPECT_EQ(second.data, std::string(20000, 'c') + "</a>");
+    EXPECT_TRUE(second.last);
+}
+
 TEST(StreamChannel, NoEarlyAnswerOnceTheBodyBegan) {
     StreamChannel channel(1024, [] {});
     EXPECT_TRUE(channel.begin(whole(200, "<first/>")));

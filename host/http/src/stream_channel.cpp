@@ -27,13 +27,18 @@ bool StreamChannel::begin(Response head) {
     return true;
 }
 
-bool StreamChannel::write(std::string_view piece) {
+// A piece that finds nothing waiting is kept as it is, without a copy.
+bool StreamChannel::write(std::string piece) {
     std::unique_lock lock(mutex_);
     space_.wait(lock, [this] { return pending_.size() < limit_ || aborted_ || closed_; });
     if (!begun_ || ended_ || aborted_ || closed_ || answered_) {
         return false;
     }
-    pending_.append(piece);
+    if (pending_.empty()) {
+        pending_ = std::move(piece);
+    } else {
+        pending_.append(piece);
+    }
     wakeLocked();
     return true;
 }

@@ -24,7 +24,7 @@ public:
 
     // Producer side.
     bool begin(Response head) override;
-    bool write(std::string_view piece) override;
+    bool write(std::string piece) override;
     void abort() override;
     bool begun() const override;
     bool answer(Response whole) override;

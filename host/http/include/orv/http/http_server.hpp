@@ -69,7 +69,7 @@ class ResponseStream {
 public:
     virtual ~ResponseStream() = default;
     virtual bool begin(Response head) = 0;
-    virtual bool write(std::string_view piece) = 0;
+    virtual bool write(std::string piece) = 0;
     virtual void abort() = 0;
     virtual bool begun() const = 0;
     virtual bool answer(Response whole) = 0;
