@@ -6,6 +6,7 @@
 
 #include "EthernetPort-Classes.h"
 #include "EthernetPort-Provider.h"
+#include "EthernetPort-Request.h"
 
 namespace EthernetProvider {
 
@@ -110,7 +111,8 @@ CmpiStatus EthernetPortProvider::doReferencesSettingData(const CmpiContext& ctx,
     if (deviceName == nullptr) {
         return CmpiStatus(CMPI_RC_ERR_INVALID_PARAMETER, "DeviceID specified is not valid");
     }
-    const CmpiObjectPath port = portPath(ctx, ns, deviceName);
+    PortRequest request(ctx, *broker, ns);
+    const CmpiObjectPath port = request.portPath(deviceName);
     result.returnData(associationInstance(ns, assocClass.assocClass, assocClass, port, objectPath));
     result.returnDone();
     return CmpiStatus(CMPI_RC_OK);
@@ -118,11 +120,11 @@ CmpiStatus EthernetPortProvider::doReferencesSettingData(const CmpiContext& ctx,
 
 void EthernetPortProvider::enumInstSettingAssoc(const FarEndClass& row, const CmpiString& assocClass,
                                                 const std::vector<Pnic*>& nics, std::size_t start,
-                                                const CmpiContext& ctx, const CmpiString& ns, CmpiResult& result,
-                                                bool instances) {
+                                                PortRequest& request, CmpiResult& result, bool instances) {
+    const CmpiString& ns = request.nameSpace();
     for (std::size_t i = start; i < nics.size(); ++i) {
         const std::string name = nics[i]->GetName();
-        const CmpiObjectPath port = portPath(ctx, ns, name.c_str());
+        const CmpiObjectPath port = request.portPath(name.c_str());
         const CmpiObjectPath settingData = farEndPath(ns, row.className, row, name);
         if (instances) {
             result.returnData(associationInstance(ns, assocClass.charPtr(), row, port, settingData));

@@ -3,7 +3,6 @@
 #define ORV_ETHERNETPORT_FILL_H
 
 #include <cstddef>
-#include <string>
 #include <vector>
 
 #include <cmpi/CmpiArray.h>
@@ -36,14 +35,11 @@ CmpiArray convertedArray(const std::vector<Item>& items, CMPIType elementType, C
     return array;
 }
 
-// A string array holding texts, in order.
-inline CmpiArray stringArray(const std::vector<std::string>& texts) {
-    return convertedArray(texts, CMPI_string, [](const std::string& text) { return CmpiData(CmpiString(text.c_str())); });
-}
-
 // A uint16 array of one element.
 inline CmpiArray singleUint16(CMPIUint16 value) {
-    return convertedArray(std::vector<CMPIUint16>{value}, CMPI_uint16, [](CMPIUint16 v) { return CmpiData(v); });
+    CmpiArray array(1, CMPI_uint16);
+    array[0] = CmpiData(value);
+    return array;
 }
 
 // Sets each named member of record as a property of the same name, in table

@@ -2,8 +2,6 @@
 // from names alone: no NIC is asked whether it exists.
 #include <cstring>
 
-#include <omc/ComputerSystem.h>
-
 #include "EthernetPort-Classes.h"
 #include "EthernetPort-Provider.h"
 
@@ -29,16 +27,6 @@ const char* EthernetPortProvider::getDeviceName(const CmpiString& id) {
     }
     const char* colon = std::strrchr(text, ':');
     return colon == nullptr ? nullptr : colon + 1;
-}
-
-CmpiObjectPath EthernetPortProvider::portPath(const CmpiContext& ctx, const CmpiString& ns,
-                                              const char* deviceId) const {
-    CmpiObjectPath path(ns, kPortClass);
-    path.setKey(kDeviceIdKey, CmpiData(deviceId));
-    path.setKey("SystemCreationClassName", CmpiData(OMC::getComputerSystemClassName()));
-    path.setKey("SystemName", CmpiData(OMC::getComputerSystemName(ctx, *broker)));
-    path.setKey("CreationClassName", CmpiData(kPortClass));
-    return path;
 }
 
 CmpiObjectPath farEndPath(const CmpiString& ns, const char* className, const FarEndClass& row,

@@ -1,9 +1,10 @@
 // The non-key properties of an "Orvane_EthernetPort" instance, read from one
 // physical NIC.
-#include <cstdio>
+#include <cstdint>
 
 #include "EthernetPort-Fill.h"
 #include "EthernetPort-Provider.h"
+#include "EthernetPort-Request.h"
 
 namespace EthernetProvider {
 
@@ -22,31 +23,42 @@ constexpr CMPIUint16 kCapabilityWakeOnLan = 5;
 constexpr CMPIUint16 kCapabilityNone = 0;
 constexpr CMPIUint64 kBitsPerMegabit = 1000000;
 
+// Lower-case or upper-case hexadecimal digits of value, digits of them,
+// written at out.
+void putHex(char* out, unsigned value, int digits, const char* alphabet) {
+    for (int i = digits - 1; i >= 0; --i) {
+        out[i] = alphabet[value & 0xFu];
+        value >>= 4;
+    }
+}
+
+constexpr const char* kLowerDigits = "0123456789abcdef";
+constexpr const char* kUpperDigits = "0123456789ABCDEF";
+
 // Twelve upper-case hexadecimal digits, no separators.
-std::string macText(const MacAddress& mac) {
-    unsigned char bytes[6];
-    mac.GetBinaryAddress(bytes);
+struct MacText {
     char text[13];
-    std::snprintf(text, sizeof text, "%02X%02X%02X%02X%02X%02X", bytes[0], bytes[1], bytes[2], bytes[3], bytes[4],
-                  bytes[5]);
-    return text;
-}
+    explicit MacText(const MacAddress& mac) {
+        unsigned char bytes[6];
+        mac.GetBinaryAddress(bytes);
+        for (int i = 0; i < 6; ++i) {
+            putHex(text + 2 * i, bytes[i], 2, kUpperDigits);
+        }
+        text[12] = '\0';
+    }
+};
 
-// Lower-case hexadecimal behind 0x: two digits for bus, slot and function
-// (printed into 33 bytes), four for the rest (vendor and device into exactly
-// 7 bytes, the segment into 33).
-std::string hex2(unsigned value) {
-    char text[33];
-    std::snprintf(text, sizeof text, "0x%02x", value);
-    return text;
-}
-
-template <std::size_t Size>
-std::string hex4(unsigned value) {
-    char text[Size];
-    std::snprintf(text, sizeof text, "0x%04x", value);
-    return text;
-}
+// "0x" and digits lower-case hexadecimal digits: two for bus, slot and
+// function, four for vendor, device and segment (each value fits).
+struct HexText {
+    char text[7];
+    HexText(unsigned value, int digits) {
+        text[0] = '0';
+        text[1] = 'x';
+        putHex(text + 2, value, digits, kLowerDigits);
+        text[2 + digits] = '\0';
+    }
+};
 
 // The state is decided by IsEnabled first; the link is asked only when enabled.
 CMPIUint16 enabledState(Pnic* pnic) {
@@ -58,78 +70,127 @@ CMPIUint16 enabledState(Pnic* pnic) {
 
 CMPIUint16 capability(bool wakeOnLan) { return wakeOnLan ? kCapabilityWakeOnLan : kCapabilityNone; }
 
-void setMacAddress(CmpiInstance& instance, Pnic* pnic) {
-    const std::string mac = macText(pnic->GetMacAddress());
-    instance.setProperty("PermanentAddress", CmpiData(mac.c_str()));
-    instance.setProperty("NetworkAddresses", CmpiData(stringArray({mac})));
+// A uint16 array of the values the caller appended to the memo's key;
+// shared by the ports of the request that have the same values.
+CmpiArray uint16Array(ArrayMemo& memo) {
+    return memo.find([&memo] {
+        return convertedArray(memo.currentKey(), CMPI_uint16,
+                              [](std::int64_t v) { return CmpiData(static_cast<CMPIUint16>(v)); });
+    });
 }
 
-void setState(CmpiInstance& instance, Pnic* pnic) {
+// A uint16 array of items, each converted by convert.
+template <typename Item, typename Convert>
+CmpiArray uint16Array(ArrayMemo& memo, const std::vector<Item>& items, Convert convert) {
+    std::vector<std::int64_t>& key = memo.key(ArrayTag::Uint16Values);
+    for (const Item& item : items) {
+        key.push_back(convert(item));
+    }
+    return uint16Array(memo);
+}
+
+CmpiArray oneUint16(ArrayMemo& memo, CMPIUint16 value) {
+    memo.key(ArrayTag::Uint16Values).push_back(value);
+    return uint16Array(memo);
+}
+
+// A string array of texts; each text is built into the array only.
+template <std::size_t N>
+CmpiArray textArray(const char* const (&texts)[N]) {
+    CmpiArray array(static_cast<CMPICount>(N), CMPI_string);
+    for (std::size_t i = 0; i < N; ++i) {
+        array[static_cast<int>(i)] = CmpiData(CmpiString(texts[i]));
+    }
+    return array;
+}
+
+void setMacAddress(CmpiInstance& instance, Pnic* pnic) {
+    const MacText mac(pnic->GetMacAddress());
+    instance.setProperty("PermanentAddress", CmpiData(mac.text));
+    const char* const addresses[] = {mac.text};
+    instance.setProperty("NetworkAddresses", CmpiData(textArray(addresses)));
+}
+
+void setState(CmpiInstance& instance, Pnic* pnic, ArrayMemo& memo) {
     instance.setProperty("RequestedState", CmpiData(kRequestedStateNoChange));
     const CMPIUint16 state = enabledState(pnic);
     instance.setProperty("EnabledState", CmpiData(state));
-    instance.setProperty("OperationalStatus", CmpiData(singleUint16(state == kEnabled ? kStatusOK : kStatusStopped)));
+    instance.setProperty("OperationalStatus",
+                         CmpiData(oneUint16(memo, state == kEnabled ? kStatusOK : kStatusStopped)));
 }
 
-// Both arrays are built before either is set: supported is asked first.
-void setCapabilities(CmpiInstance& instance, Pnic* pnic) {
-    const CmpiArray supported = singleUint16(capability(pnic->GetWakeOnLANSupported()));
-    const CmpiArray enabled = singleUint16(capability(pnic->GetWakeOnLANEnabled()));
+// Both arrays are made before either is set: supported is asked first.
+void setCapabilities(CmpiInstance& instance, Pnic* pnic, ArrayMemo& memo) {
+    const CmpiArray supported = oneUint16(memo, capability(pnic->GetWakeOnLANSupported()));
+    const CmpiArray enabled = oneUint16(memo, capability(pnic->GetWakeOnLANEnabled()));
     instance.setProperty("Capabilities", CmpiData(supported));
     instance.setProperty("EnabledCapabilities", CmpiData(enabled));
 }
 
+CmpiArray identifyingDescriptions(ArrayMemo& memo) {
+    static const char* const kDescriptions[] = {"PCI Bus",    "PCI Slot",     "PCI Function",
+                                                "PCI Vendor", "PCI DeviceID", "PCI Segment"};
+    memo.key(ArrayTag::Texts);
+    return memo.find([] { return textArray(kDescriptions); });
+}
+
 // OtherIdentifyingInfo and IdentifyingDescriptions, only for a NIC with a PCI
 // device; read in the order bus, slot, function, vendor, device, segment.
-void setPciIdentity(CmpiInstance& instance, Pnic* pnic) {
+void setPciIdentity(CmpiInstance& instance, Pnic* pnic, ArrayMemo& memo) {
     const PciDevice* pci = pnic->GetPciDevice();
     if (pci == nullptr) {
         return;
     }
-    std::vector<std::string> values;
-    values.push_back(hex2(pci->GetBus()));
-    values.push_back(hex2(pci->GetSlot()));
-    values.push_back(hex2(pci->GetFunction()));
-    values.push_back(hex4<7>(pci->GetVendorId()));
-    values.push_back(hex4<7>(pci->GetDeviceId()));
-    values.push_back(hex4<33>(pci->GetSegment()));
-    instance.setProperty("OtherIdentifyingInfo", CmpiData(stringArray(values)));
-    instance.setProperty("IdentifyingDescriptions",
-                         CmpiData(stringArray({"PCI Bus", "PCI Slot", "PCI Function", "PCI Vendor", "PCI DeviceID",
-                                               "PCI Segment"})));
+    const HexText bus(pci->GetBus(), 2);
+    const HexText slot(pci->GetSlot(), 2);
+    const HexText function(pci->GetFunction(), 2);
+    const HexText vendor(pci->GetVendorId(), 4);
+    const HexText device(pci->GetDeviceId(), 4);
+    const HexText segment(pci->GetSegment(), 4);
+    const char* const values[] = {bus.text, slot.text, function.text, vendor.text, device.text, segment.text};
+    instance.setProperty("OtherIdentifyingInfo", CmpiData(textArray(values)));
+    instance.setProperty("IdentifyingDescriptions", CmpiData(identifyingDescriptions(memo)));
 }
 
-CmpiArray linkModeArray(const std::vector<LinkMode>& modes) {
-    return convertedArray(modes, CMPI_string, [](const LinkMode& mode) {
-        return CmpiData(CmpiString(EthernetPortProvider::convertLinkMode(mode).c_str()));
+CmpiArray linkModeArray(ArrayMemo& memo, const std::vector<LinkMode>& modes) {
+    std::vector<std::int64_t>& key = memo.key(ArrayTag::LinkModes);
+    for (const LinkMode& mode : modes) {
+        key.push_back(mode.first);
+        key.push_back(mode.second);
+    }
+    return memo.find([&] {
+        return convertedArray(modes, CMPI_string, [](const LinkMode& mode) {
+            return CmpiData(CmpiString(EthernetPortProvider::convertLinkMode(mode).c_str()));
+        });
     });
 }
 
-CmpiArray wakeOnArray(const std::vector<WakeOnMode>& modes) {
-    return convertedArray(modes, CMPI_uint16, [](WakeOnMode mode) {
-        return CmpiData(static_cast<CMPIUint16>(EthernetPortProvider::convertWOLOption(mode)));
+CmpiArray wakeOnArray(ArrayMemo& memo, const std::vector<WakeOnMode>& modes) {
+    return uint16Array(memo, modes, [](WakeOnMode mode) {
+        return static_cast<CMPIUint16>(EthernetPortProvider::convertWOLOption(mode));
     });
 }
 
-void setInfoProperties(CmpiInstance& instance, const PnicInfo& info) {
-    instance.setProperty("SupportedPorts", CmpiData(convertedArray(info.supportedPorts, CMPI_uint16, [](PnicPortMode p) {
-                             return CmpiData(static_cast<CMPIUint16>(EthernetPortProvider::convertPortMode(p)));
+void setInfoProperties(CmpiInstance& instance, const PnicInfo& info, ArrayMemo& memo) {
+    instance.setProperty("SupportedPorts", CmpiData(uint16Array(memo, info.supportedPorts, [](PnicPortMode p) {
+                             return static_cast<CMPIUint16>(EthernetPortProvider::convertPortMode(p));
                          })));
-    instance.setProperty("SupportedLinkModes", CmpiData(linkModeArray(info.supportedLinkModes)));
-    instance.setProperty("AdvertisedLinkModes", CmpiData(linkModeArray(info.advertisedLinkModes)));
+    instance.setProperty("SupportedLinkModes", CmpiData(linkModeArray(memo, info.supportedLinkModes)));
+    instance.setProperty("AdvertisedLinkModes", CmpiData(linkModeArray(memo, info.advertisedLinkModes)));
     instance.setProperty("AdvertisedAutoNegotiation", CmpiData(info.advertisedAutoNegotiation));
     instance.setProperty("PhysicalAddress", CmpiData(static_cast<CMPIUint32>(info.PHYAD)));
     instance.setProperty("Transceiver",
                          CmpiData(static_cast<CMPIUint16>(EthernetPortProvider::convertTransceiver(info.transceiver))));
-    instance.setProperty("WOLSupported", CmpiData(wakeOnArray(info.supportsWakeOn)));
-    instance.setProperty("WOLOptions", CmpiData(wakeOnArray(info.wakeOn)));
+    instance.setProperty("WOLSupported", CmpiData(wakeOnArray(memo, info.supportsWakeOn)));
+    instance.setProperty("WOLOptions", CmpiData(wakeOnArray(memo, info.wakeOn)));
 }
 
 }  // namespace
 
-void EthernetPortProvider::fillEPInstance(CmpiInstance& instance, Pnic* pnic) {
+void EthernetPortProvider::fillEPInstance(CmpiInstance& instance, Pnic* pnic, PortRequest& request) {
     guardFill([&] {
-        PnicInfo info;
+        ArrayMemo& memo = request.arrays();
+        PnicInfo& info = request.freshInfo();
         pnic->GetPnicInfo(info);
         const std::string name = pnic->GetName();
         instance.setProperty("Name", CmpiData(name.c_str()));
@@ -141,12 +202,12 @@ void EthernetPortProvider::fillEPInstance(CmpiInstance& instance, Pnic* pnic) {
         instance.setProperty("Speed", CmpiData(static_cast<CMPIUint64>(pnic->GetLinkSpeed()) * kBitsPerMegabit));
         instance.setProperty("LinkTechnology", CmpiData(kLinkTechnologyEthernet));
         setMacAddress(instance, pnic);
-        setState(instance, pnic);
-        setCapabilities(instance, pnic);
+        setState(instance, pnic, memo);
+        setCapabilities(instance, pnic, memo);
         instance.setProperty("FullDuplex", CmpiData(pnic->GetDuplex() == DUPLEX_MODE_FULL));
         instance.setProperty("ActiveMaximumTransmissionUnit", CmpiData(static_cast<CMPIUint64>(pnic->GetMTU())));
-        setPciIdentity(instance, pnic);
-        setInfoProperties(instance, info);
+        setPciIdentity(instance, pnic, memo);
+        setInfoProperties(instance, info, memo);
     });
 }
 

@@ -12,6 +12,7 @@
 #include "EthernetPort-Classes.h"
 #include "EthernetPort-Fill.h"
 #include "EthernetPort-Provider.h"
+#include "EthernetPort-Request.h"
 
 namespace EthernetProvider {
 
@@ -166,22 +167,23 @@ void EthernetPortProvider::deliverClass(const CmpiContext& ctx, CmpiResult& resu
                                         const ServedClass& served, const std::vector<Pnic*>& pnics,
                                         const char** properties, Delivery delivery) {
     const CmpiString className = op.getClassName();
-    const CmpiString ns = op.getNameSpace();
+    PortRequest request(ctx, *broker, op.getNameSpace());
+    const CmpiString& ns = request.nameSpace();
     if (served.kind == ServedClass::Kind::Association && served.row->group == AssociationGroup::SettingData) {
         // Paths, also for an instance enumeration.
-        enumInstSettingAssoc(*served.row, className, std::vector<Pnic*>(pnics), 0, ctx, ns, result, false);
+        enumInstSettingAssoc(*served.row, className, pnics, 0, request, result, false);
         return;
     }
     for (Pnic* pnic : pnics) {
         switch (served.kind) {
             case ServedClass::Kind::Port:
-                deliverPort(ctx, result, ns, pnic, properties, delivery);
+                deliverPort(result, request, pnic, properties, delivery);
                 break;
             case ServedClass::Kind::FarEnd:
                 deliverFarEnd(result, ns, className, *served.row, pnic, delivery);
                 break;
             case ServedClass::Kind::Association:
-                deliverAssociation(ctx, result, ns, className, *served.row, pnic, delivery);
+                deliverAssociation(result, request, className, *served.row, pnic, delivery);
                 break;
             case ServedClass::Kind::None:
                 break;
@@ -191,22 +193,22 @@ void EthernetPortProvider::deliverClass(const CmpiContext& ctx, CmpiResult& resu
 
 // The only class whose instances honour the request's property list, applied
 // without a key list of its own.
-void EthernetPortProvider::deliverPort(const CmpiContext& ctx, CmpiResult& result, const CmpiString& ns, Pnic* pnic,
+void EthernetPortProvider::deliverPort(CmpiResult& result, PortRequest& request, Pnic* pnic,
                                        const char** properties, Delivery delivery) {
     const std::string name = pnic->GetName();
     if (delivery == Delivery::Paths) {
-        result.returnData(portPath(ctx, ns, name.c_str()));
+        result.returnData(request.portPath(name.c_str()));
         return;
     }
-    CmpiObjectPath path(ns, kPortClass);
+    CmpiObjectPath path(request.nameSpace(), kPortClass);
     path.setKey(kDeviceIdKey, CmpiData(name.c_str()));
     CmpiInstance instance(path);
     instance.setPropertyFilter(properties, nullptr);
     instance.setProperty("SystemCreationClassName", CmpiData(OMC::getComputerSystemClassName()));
-    instance.setProperty("SystemName", CmpiData(OMC::getComputerSystemName(ctx, *broker)));
+    instance.setProperty("SystemName", CmpiData(request.systemName()));
     instance.setProperty("CreationClassName", CmpiData(kPortClass));
     instance.setProperty(kDeviceIdKey, CmpiData(name.c_str()));
-    fillEPInstance(instance, pnic);
+    fillEPInstance(instance, pnic, request);
     result.returnData(instance);
 }
 
@@ -223,11 +225,11 @@ void EthernetPortProvider::deliverFarEnd(CmpiResult& result, const CmpiString& n
     result.returnData(instance);
 }
 
-void EthernetPortProvider::deliverAssociation(const CmpiContext& ctx, CmpiResult& result, const CmpiString& ns,
-                                              const CmpiString& className, const FarEndClass& row, Pnic* pnic,
-                                              Delivery delivery) {
+void EthernetPortProvider::deliverAssociation(CmpiResult& result, PortRequest& request, const CmpiString& className,
+                                              const FarEndClass& row, Pnic* pnic, Delivery delivery) {
+    const CmpiString& ns = request.nameSpace();
     const std::string name = pnic->GetName();
-    const CmpiObjectPath port = portPath(ctx, ns, name.c_str());
+    const CmpiObjectPath port = request.portPath(name.c_str());
     const CmpiObjectPath farEnd = farEndPath(ns, row.className, row, name);
     if (delivery == Delivery::Paths) {
         result.returnData(associationPath(ns, className.charPtr(), row, port, farEnd));

@@ -3,7 +3,9 @@
 // pause and ring settings, and the associations from a port to those objects.
 //
 // One object serves the instance and the association interfaces. It keeps no
-// state: every request asks the host-management library afresh.
+// state: every request asks the host-management library afresh. What the
+// ports of one request have in common (the system name, arrays with the same
+// elements) is made once for that request (EthernetPort-Request.h).
 #ifndef ORV_ETHERNETPORT_PROVIDER_H
 #define ORV_ETHERNETPORT_PROVIDER_H
 
@@ -20,6 +22,7 @@ namespace EthernetProvider {
 
 struct FarEndClass;
 struct ServedClass;
+class PortRequest;
 
 class EthernetPortProvider : public CmpiInstanceMI, private OMC::SimpleAssociationMI {
 public:
@@ -88,8 +91,9 @@ public:
 
     // Fill operations: each adds the non-key properties of one class to an
     // instance its caller made. A failing NIC call ends the fill early and
-    // leaves the instance with the properties set so far.
-    void fillEPInstance(CmpiInstance& instance, NodeMgr::Network::Pnic* pnic);
+    // leaves the instance with the properties set so far. The port's fill
+    // shares what it can with the other ports of its request.
+    void fillEPInstance(CmpiInstance& instance, NodeMgr::Network::Pnic* pnic, PortRequest& request);
     void fillEPDriverInstance(CmpiInstance& instance, NodeMgr::Network::Pnic* pnic);
     void fillEPFirmwareInstance(CmpiInstance& instance, NodeMgr::Network::Pnic* pnic);
     void fillEPStatsInstance(CmpiInstance& instance, NodeMgr::Network::Pnic* pnic);
@@ -115,19 +119,14 @@ private:
     void deliverClass(const CmpiContext& ctx, CmpiResult& result, const CmpiObjectPath& op,
                       const ServedClass& served, const std::vector<NodeMgr::Network::Pnic*>& pnics,
                       const char** properties, Delivery delivery);
-    void deliverPort(const CmpiContext& ctx, CmpiResult& result, const CmpiString& ns,
-                     NodeMgr::Network::Pnic* pnic, const char** properties, Delivery delivery);
+    void deliverPort(CmpiResult& result, PortRequest& request, NodeMgr::Network::Pnic* pnic,
+                     const char** properties, Delivery delivery);
     void deliverFarEnd(CmpiResult& result, const CmpiString& ns, const CmpiString& className,
                        const FarEndClass& row, NodeMgr::Network::Pnic* pnic, Delivery delivery);
-    void deliverAssociation(const CmpiContext& ctx, CmpiResult& result, const CmpiString& ns,
-                            const CmpiString& className, const FarEndClass& row, NodeMgr::Network::Pnic* pnic,
-                            Delivery delivery);
+    void deliverAssociation(CmpiResult& result, PortRequest& request, const CmpiString& className,
+                            const FarEndClass& row, NodeMgr::Network::Pnic* pnic, Delivery delivery);
     // The device name a getInstance path names, or a failure status.
     CmpiStatus deviceNameOf(const CmpiObjectPath& cop, const ServedClass& served, std::string& deviceName) const;
-
-    // The port's path: DeviceID, SystemCreationClassName, SystemName and
-    // CreationClassName, in that order.
-    CmpiObjectPath portPath(const CmpiContext& ctx, const CmpiString& ns, const char* deviceId) const;
 
     CmpiStatus doReferencesFromPort(CmpiResult& result, const CmpiObjectPath& objectPath,
                                     const CmpiString& ns, const char* assocClass, const char* resultClass,
@@ -145,7 +144,7 @@ private:
     // NIC's port and its setting data of row; no returnDone.
     void enumInstSettingAssoc(const FarEndClass& row, const CmpiString& assocClass,
                               const std::vector<NodeMgr::Network::Pnic*>& nics, std::size_t start,
-                              const CmpiContext& ctx, const CmpiString& ns, CmpiResult& result, bool instances);
+                              PortRequest& request, CmpiResult& result, bool instances);
 };
 
 }  // namespace EthernetProvider

@@ -1,6 +1,8 @@
 // CIM-XML output: escaping, the response envelope and class encoding from MOF.
 #include <gtest/gtest.h>
 
+#include <map>
+
 #include "orv/cimxml/class_encoder.hpp"
 #include "orv/cimxml/cmpi_value.hpp"
 #include "orv/cimxml/response_writer.hpp"
@@ -50,6 +52,75 @@ TEST(XmlWriter, KeepsPlainRunsAroundEscapedCharactersAndControlPictures) {
     out.open("OUTER").open("V").attr("A", "x\ny\rz").text("plain <mid> end\x1f").close().leaf("L", "a&b").close();
     EXPECT_EQ(out.take(), "<OUTER><V A=\"x&#10;y&#13;z\">plain &lt;mid&gt; end\xE2\x90\x9F</V><L>a&amp;b</L></OUTER>");
     EXPECT_EQ(out.depth(), 0U);
+}
+
+// What one byte becomes, written out by hand: NUL dropped, markup and white space as
+// references, other control characters as their pictures.
+std::string escapedByte(unsigned char c) {
+    static const std::map<unsigned char, std::string> kReferences = {
+        {'&', "&amp;"}, {'<', "&lt;"}, {'>', "&gt;"},  {'"', "&quot;"},
+        {'\'', "&apos;"}, {'\t', "&#9;"}, {'\n', "&#10;"}, {'\r', "&#13;"}};
+    if (const auto found = kReferences.find(c); found != kReferences.end()) {
+        return found->second;
+    }
+    if (c == 0) {
+        return "";
+    }
+    if (c < 0x20) {
+        return std::string{'\xE2', '\x90', static_cast<char>(0x80 + c)};
+    }
+    return std::string(1, static_cast<char>(c));
+}
+
+// Every byte value at every place of texts longer and shorter than the blocks the
+// escaping reads at once, alone and in runs, among plain text of every length.
+TEST(XmlWriter, EveryByteIsEscapedAlikeWhereverItStands) {
+    for (unsigned value = 0; value < 256; ++value) {
+        const auto c = static_cast<unsigned char>(value);
+        for (std::size_t length : {1U, 2U, 3U, 4U, 5U, 7U, 8U, 9U, 12U, 15U, 16U, 17U, 20U, 24U, 31U, 33U, 70U}) {
+            for (std::size_t at = 0; at < length; ++at) {
+                std::string text(length, 'a');
+                text[at] = static_cast<char>(c);
+                if (at + 2 < length) {
+                    text[at + 2] = static_cast<char>(c);
+                }
+                std::string expected;
+                for (char t : text) {
+                    expected += escapedByte(static_cast<unsigned char>(t));
+                }
+                ASSERT_EQ(escapeXml(text), expected) << "byte " << value << " at " << at << " of " << length;
+            }
+        }
+    }
+}
+
+TEST(XmlWriter, LongTextWithManyEscapesIsWrittenWhole) {
+    std::string text;
+    std::string expected;
+    for (int i = 0; i < 5000; ++i) {
+        text += "\"x<";
+        expected += "&quot;x&lt;";
+    }
+    XmlWriter out;
+    out.open("V").text(text).close();
+    EXPECT_EQ(out.take(), "<V>" + expected + "</V>");
+    std::string appended = "head";
+    appendEscapedXml(appended, text);
+    EXPECT_EQ(appended, "head" + expected);
+}
+
+TEST(XmlWriter, DrainHandsOverTheTextAndStaysInsideTheOpenElements) {
+    XmlWriter out;
+    out.open("A").open("B").text("one");
+    EXPECT_EQ(out.size(), 9U);
+    EXPECT_EQ(out.drain(), "<A><B>one");
+    EXPECT_EQ(out.size(), 0U);
+    EXPECT_EQ(out.str(), "");
+    out.close().raw("<C></C>").close();
+    EXPECT_EQ(out.str(), "</B><C></C></A>");
+    EXPECT_EQ(out.take(), "</B><C></C></A>");
+    EXPECT_EQ(out.depth(), 0U);
+    EXPECT_EQ(out.take(), "");
 }
 
 TEST(ResponseWriter, ErrorResponseCarriesCodeAndDescription) {

@@ -1,6 +1,9 @@
 // A running simulated host follows its fixture file.
 #include <gtest/gtest.h>
 
+#include <memory>
+#include <utility>
+
 #include "KsiHelpers.h"
 #include "SimHost.h"
 #include "tmkctl/network/NetworkInfoImpl.h"
@@ -49,6 +52,30 @@ TEST(FixtureReread, BrokenThenFixedFileRecovers)
     EXPECT_NE(reported.find("rejected"), std::string::npos) << reported;
     host.rewrite(fixture);
     EXPECT_EQ(checkSignature(), KSI_OK);
+}
+
+TEST(FixtureReread, NicsAreFoundByTheirNamesInTheRewrittenFile)
+{
+    Json fixture = defaultHost();
+    SimHost host(fixture);
+    std::unique_ptr<NodeMgr::Network::Pnic> before(NetworkInfoImpl().GetPnicByName("vmnic3"));
+    ASSERT_NE(before, nullptr);
+    fixture["nics"].erase(3);
+    fixture["nics"][0]["name"] = "vmnic9";
+    fixture["nics"][0]["mtu"] = 1234;
+    std::swap(fixture["nics"][0], fixture["nics"][2]);
+    host.rewrite(fixture);
+    EXPECT_EQ(NetworkInfoImpl().GetPnicByName("vmnic3"), nullptr);
+    EXPECT_EQ(NetworkInfoImpl().GetPnicByName("vmnic0"), nullptr);
+    std::unique_ptr<NodeMgr::Network::Pnic> renamed(NetworkInfoImpl().GetPnicByName("vmnic9"));
+    ASSERT_NE(renamed, nullptr);
+    EXPECT_EQ(renamed->GetName(), "vmnic9");
+    EXPECT_EQ(renamed->GetMTU(), 1234u);
+    std::unique_ptr<NodeMgr::Network::Pnic> moved(NetworkInfoImpl().GetPnicByName("vmnic2"));
+    ASSERT_NE(moved, nullptr);
+    EXPECT_EQ(moved->GetName(), "vmnic2");
+    // A NIC handed out before keeps the host it was made from.
+    EXPECT_EQ(before->GetName(), "vmnic3");
 }
 
 TEST(FixtureReread, FaultCountersStartAgainWithANewFile)

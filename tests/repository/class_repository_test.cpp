@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include <atomic>
+#include <cctype>
 #include <thread>
 #include <vector>
 
@@ -79,6 +80,42 @@ TEST_F(RepositoryFixture, LookupIgnoresCaseAndReturnsDeclaredSpelling) {
     EXPECT_FALSE(repo.hasNamespace("root/other"));
     EXPECT_EQ(repo.namespaces(), Names{"root/cimv2"});
     EXPECT_NE(cls("base_port").findProperty("SYSTEMNAME"), nullptr);
+}
+
+// Every property is found by its declared spelling, by any other spelling and through a
+// copy of the class; a name the class does not declare is not, whatever its hash.
+TEST_F(RepositoryFixture, PropertyFoundAsDeclaredInAnyCaseAndInACopy) {
+    const ClassDecl copy = cls("Base_Port");
+    for (const ClassDecl* port : {&cls("Base_Port"), &copy}) {
+        for (const PropertyDecl& p : port->properties) {
+            EXPECT_EQ(port->findProperty(p.name), &p) << p.name;
+            std::string upper = p.name;
+            for (char& c : upper) {
+                c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
+            }
+            EXPECT_EQ(port->findProperty(upper), &p) << upper;
+        }
+        for (std::string_view absent : {"", "Speed2", "Spee", "Base_Port", "DeviceId_", "x"}) {
+            EXPECT_EQ(port->findProperty(absent), nullptr) << absent;
+        }
+    }
+    EXPECT_GT(copy.propertySlots.size(), copy.properties.size());
+}
+
+// A class built by hand (never indexed) or changed after indexing is still searched.
+TEST(ClassDeclLookup, UnindexedOrOutdatedClassIsScanned) {
+    ClassDecl cls;
+    cls.properties.push_back(PropertyDecl{});
+    cls.properties.back().name = "First";
+    EXPECT_EQ(cls.findProperty("first"), &cls.properties.back());
+    cls.indexProperties();
+    for (int i = 0; i < 8; ++i) {
+        cls.properties.push_back(PropertyDecl{});
+        cls.properties.back().name = "Added" + std::to_string(i);
+    }
+    EXPECT_EQ(cls.findProperty("Added7"), &cls.properties.back());
+    EXPECT_EQ(cls.findProperty("First"), &cls.properties.front());
+    EXPECT_EQ(cls.findProperty("Other"), nullptr);
 }
 
 TEST_F(RepositoryFixture, EffectivePropertiesInheritedFirstInParentOrder) {

@@ -65,8 +65,10 @@ void getInstance(OperationContext& context) {
     cimxml::checkParameterNames(request, {"InstanceName", "LocalOnly", "IncludeQualifiers", "IncludeClassOrigin",
                                           "PropertyList"});
     const ReadFlags flags = readFlags(request);
-    CMPIObjectPath* path = instancePath(context, cimxml::instanceNameParam(request, "InstanceName"));
-    const cimxml::InstanceEncoding encoding = instanceEncoding(context, flags.includeClassOrigin, flags.propertyList);
+    const cimxml::ObjectPathModel& name = cimxml::instanceNameParam(request, "InstanceName");
+    CMPIObjectPath* path = instancePath(context, name);
+    const cimxml::InstanceEncoding encoding =
+        instanceEncoding(context, flags.includeClassOrigin, flags.propertyList, name.className);
     host::CallOptions options =
         callOptions(context, false, flags.includeQualifiers, flags.includeClassOrigin, flags.propertyList);
     // The first instance the provider returns is the answer: encoded into the response as
@@ -107,7 +109,8 @@ void enumerateInstances(OperationContext& context) {
     const std::string className = cimxml::classNameParam(request, "ClassName").value_or("");
     const repository::ClassDecl& cls = requireClass(context, className);
     auto kept = deep ? flags.propertyList : shallowPropertyList(cls, flags.propertyList);
-    const cimxml::InstanceEncoding encoding = instanceEncoding(context, flags.includeClassOrigin, std::move(kept));
+    const cimxml::InstanceEncoding encoding =
+        instanceEncoding(context, flags.includeClassOrigin, std::move(kept), cls.name);
     host::CallOptions options =
         callOptions(context, deep, flags.includeQualifiers, flags.includeClassOrigin, flags.propertyList);
     std::exception_ptr failure;

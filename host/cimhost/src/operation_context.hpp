@@ -77,8 +77,10 @@ ReadFlags readFlags(const cimxml::CimRequest& request);
 // Without deep inheritance only the requested class's own properties are returned.
 std::optional<std::vector<std::string>> shallowPropertyList(const repository::ClassDecl& cls,
                                                             const std::optional<std::vector<std::string>>& requested);
-// Encoding of returned instances: class origins and property list from the request.
+// Encoding of returned instances: class origins and property list from the request; the
+// declarations of `expectedClass` (the class most answers are instances of) looked up once.
 cimxml::InstanceEncoding instanceEncoding(const OperationContext& context, bool includeClassOrigin,
-                                          std::optional<std::vector<std::string>> propertyList);
+                                          std::optional<std::vector<std::string>> propertyList,
+                                          std::string_view expectedClass = {});
 
 }  // namespace orv::cimhost::detail

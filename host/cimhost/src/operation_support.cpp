@@ -68,22 +68,13 @@ std::optional<std::vector<std::string>> shallowPropertyList(const repository::Cl
 }
 
 cimxml::InstanceEncoding instanceEncoding(const OperationContext& context, bool includeClassOrigin,
-                                          std::optional<std::vector<std::string>> propertyList) {
+                                          std::optional<std::vector<std::string>> propertyList,
+                                          std::string_view expectedClass) {
     cimxml::InstanceEncoding encoding;
     encoding.includeClassOrigin = includeClassOrigin;
     encoding.arrayNullElements = context.arrayNulls;
     encoding.propertyList = std::move(propertyList);
-    const repository::ClassRepository& classes = context.classes;
-    const std::string nameSpace = context.request.nameSpace;
-    encoding.lookup = [&classes, nameSpace](std::string_view className,
-                                            std::string_view property) -> std::optional<cimxml::PropertyInfo> {
-        const repository::ClassDecl* cls = classes.getClass(nameSpace, className);
-        const repository::PropertyDecl* decl = cls == nullptr ? nullptr : cls->findProperty(property);
-        if (decl == nullptr) {
-            return std::nullopt;
-        }
-        return cimxml::PropertyInfo{decl->classOrigin, decl->type.referenceClass, false};
-    };
+    encoding.declarations = cimxml::ClassDeclarations(context.classes, context.request.nameSpace, expectedClass);
     return encoding;
 }
 

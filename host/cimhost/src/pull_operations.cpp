@@ -147,20 +147,16 @@ Encoder encoder(PullKind kind, cimxml::InstanceEncoding encoding, cimxml::PathDe
             return std::string();
         }
         const CMPIInstance* instance = isInstance ? item.data.value.inst : nullptr;
-        const CMPIObjectPath* path =
-            isInstance ? instance->ft->getObjectPath(instance, nullptr) : item.data.value.ref;
         switch (kind) {
         case PullKind::InstancesWithPath:
             if (instance == nullptr) {
                 return std::string();
             }
-            out.open("VALUE.INSTANCEWITHPATH");
-            cimxml::writeInstancePath(out, path, defaults);
-            cimxml::writeInstance(out, instance, encoding);
-            out.close();
+            cimxml::writeInstanceWithPath(out, "VALUE.INSTANCEWITHPATH", instance, defaults, encoding);
             break;
         case PullKind::InstancePaths:
-            cimxml::writeInstancePath(out, path, defaults);
+            cimxml::writeInstancePath(
+                out, isInstance ? instance->ft->getObjectPath(instance, nullptr) : item.data.value.ref, defaults);
             break;
         case PullKind::Instances:
             if (instance == nullptr) {
@@ -308,7 +304,7 @@ void openClassEnumeration(OperationContext& context, PullKind kind, const std::s
     }
     open(context, kind, parameters, std::move(call),
          callOptions(context, deep, flags.includeQualifiers, flags.includeClassOrigin, flags.propertyList),
-         instanceEncoding(context, flags.includeClassOrigin, std::move(kept)));
+         instanceEncoding(context, flags.includeClassOrigin, std::move(kept), cls.name));
 }
 
 void pull(OperationContext& context, PullKind kind) {

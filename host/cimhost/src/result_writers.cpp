@@ -4,20 +4,9 @@
 
 namespace orv::cimhost::detail {
 
-namespace {
-
-const CMPIObjectPath* pathOf(const CMPIInstance* instance) {
-    return instance->ft->getObjectPath(instance, nullptr);
-}
-
-}  // namespace
-
 void writeNamedInstance(OperationContext& context, const CMPIInstance* instance,
                         const cimxml::InstanceEncoding& encoding) {
-    context.out.open("VALUE.NAMEDINSTANCE");
-    cimxml::writeInstanceName(context.out, pathOf(instance));
-    cimxml::writeInstance(context.out, instance, encoding);
-    context.out.close();
+    cimxml::writeNamedInstance(context.out, instance, encoding);
 }
 
 void writeNamedInstances(OperationContext& context, const host::Reply& reply,
@@ -30,10 +19,7 @@ void writeNamedInstances(OperationContext& context, const host::Reply& reply,
 void writeObjectsWithPath(OperationContext& context, const host::Reply& reply,
                           const cimxml::InstanceEncoding& encoding) {
     for (const CMPIInstance* instance : reply.instances()) {
-        context.out.open("VALUE.OBJECTWITHPATH");
-        cimxml::writeInstancePath(context.out, pathOf(instance), context.defaults);
-        cimxml::writeInstance(context.out, instance, encoding);
-        context.out.close();
+        cimxml::writeInstanceWithPath(context.out, "VALUE.OBJECTWITHPATH", instance, context.defaults, encoding);
     }
 }
 

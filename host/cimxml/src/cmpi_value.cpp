@@ -6,11 +6,7 @@
 namespace orv::cimxml {
 
 std::string cmpiString(const CMPIString* text) {
-    if (text == nullptr || text->ft == nullptr) {
-        return {};
-    }
-    const char* chars = text->ft->getCharPtr(text, nullptr);
-    return chars == nullptr ? std::string() : std::string(chars);
+    return std::string(cmpiChars(text));
 }
 
 std::string_view xmlTypeName(CMPIType type) noexcept {
@@ -48,78 +44,96 @@ std::string_view keyValueType(CMPIType type) noexcept {
     return "string";
 }
 
-bool isNullData(const CMPIData& data) noexcept {
-    return (data.state & (CMPI_nullValue | CMPI_notFound | CMPI_badValue)) != 0;
-}
+namespace {
 
-std::string char16ToUtf8(CMPIChar16 unit) {
-    std::string out;
+// Writes the UTF-8 form of a UTF-16 code unit (a lone surrogate becomes U+FFFD); returns
+// the end of what it wrote (at most three bytes).
+char* writeUtf8(char* out, CMPIChar16 unit) noexcept {
     if (unit >= 0xD800 && unit <= 0xDFFF) {
         unit = 0xFFFD;
     }
     if (unit < 0x80) {
-        out += static_cast<char>(unit);
+        *out++ = static_cast<char>(unit);
     } else if (unit < 0x800) {
-        out += static_cast<char>(0xC0 | (unit >> 6));
-        out += static_cast<char>(0x80 | (unit & 0x3F));
+        *out++ = static_cast<char>(0xC0 | (unit >> 6));
+        *out++ = static_cast<char>(0x80 | (unit & 0x3F));
     } else {
-        out += static_cast<char>(0xE0 | (unit >> 12));
-        out += static_cast<char>(0x80 | ((unit >> 6) & 0x3F));
-        out += static_cast<char>(0x80 | (unit & 0x3F));
+        *out++ = static_cast<char>(0xE0 | (unit >> 12));
+        *out++ = static_cast<char>(0x80 | ((unit >> 6) & 0x3F));
+        *out++ = static_cast<char>(0x80 | (unit & 0x3F));
     }
     return out;
 }
 
-namespace {
-
 template <typename Number>
-std::string numberText(Number value) {
-    char buffer[64];
-    auto result = std::to_chars(buffer, buffer + sizeof buffer, value);
-    return std::string(buffer, result.ptr);
+ScalarChars numberChars(Number value, ScalarBuffer& buffer) noexcept {
+    const auto result = std::to_chars(buffer.chars, buffer.chars + sizeof buffer.chars, value);
+    return ScalarChars{std::string_view(buffer.chars, static_cast<std::size_t>(result.ptr - buffer.chars)), true};
 }
 
-std::optional<std::string> dateTimeText(const CMPIDateTime* dateTime) {
+// Padded to kPlainTextRoom like the numbers in a ScalarBuffer.
+constexpr char kTrue[kPlainTextRoom] = "TRUE";
+constexpr char kFalse[kPlainTextRoom] = "FALSE";
+
+ScalarChars booleanChars(bool value) noexcept {
+    return value ? ScalarChars{std::string_view(kTrue, 4), true} : ScalarChars{std::string_view(kFalse, 5), true};
+}
+
+std::optional<ScalarChars> charsOf(const char* chars) noexcept {
+    return chars == nullptr ? std::nullopt : std::optional<ScalarChars>(ScalarChars{chars, false});
+}
+
+std::optional<ScalarChars> stringChars(const CMPIString* text) noexcept {
+    return text == nullptr ? std::nullopt : std::optional<ScalarChars>(ScalarChars{cmpiChars(text), false});
+}
+
+std::optional<ScalarChars> dateTimeChars(const CMPIDateTime* dateTime) {
     if (dateTime == nullptr || dateTime->ft == nullptr) {
         return std::nullopt;
     }
-    return cmpiString(dateTime->ft->getStringFormat(dateTime, nullptr));
-}
-
-std::optional<std::string> charsText(const char* chars) {
-    return chars == nullptr ? std::nullopt : std::optional<std::string>(chars);
-}
-
-std::optional<std::string> stringText(const CMPIString* text) {
-    return text == nullptr ? std::nullopt : std::optional<std::string>(cmpiString(text));
+    return ScalarChars{cmpiChars(dateTime->ft->getStringFormat(dateTime, nullptr)), false};
 }
 
 }  // namespace
 
-std::optional<std::string> scalarText(const CMPIData& data) {
+std::string char16ToUtf8(CMPIChar16 unit) {
+    char chars[3];
+    return std::string(chars, writeUtf8(chars, unit));
+}
+
+std::optional<ScalarChars> scalarChars(const CMPIData& data, ScalarBuffer& buffer) {
     if (isNullData(data)) {
         return std::nullopt;
     }
     const CMPIValue& v = data.value;
     switch (data.type) {
-        case CMPI_boolean: return std::string(v.boolean != 0 ? "TRUE" : "FALSE");
-        case CMPI_char16: return char16ToUtf8(v.char16);
-        case CMPI_real32: return numberText(v.real32);
-        case CMPI_real64: return numberText(v.real64);
-        case CMPI_uint8: return numberText(v.uint8);
-        case CMPI_uint16: return numberText(v.uint16);
-        case CMPI_uint32: return numberText(v.uint32);
-        case CMPI_uint64: return numberText(v.uint64);
-        case CMPI_sint8: return numberText(v.sint8);
-        case CMPI_sint16: return numberText(v.sint16);
-        case CMPI_sint32: return numberText(v.sint32);
-        case CMPI_sint64: return numberText(v.sint64);
-        case CMPI_string: return stringText(v.string);
-        case CMPI_chars: return charsText(v.chars);
-        case CMPI_charsptr: return charsText(static_cast<const char*>(v.dataPtr.ptr));
-        case CMPI_dateTime: return dateTimeText(v.dateTime);
+        case CMPI_boolean: return booleanChars(v.boolean != 0);
+        case CMPI_char16:
+            return ScalarChars{std::string_view(buffer.chars,
+                                                static_cast<std::size_t>(writeUtf8(buffer.chars, v.char16) - buffer.chars)),
+                               false};
+        case CMPI_real32: return numberChars(v.real32, buffer);
+        case CMPI_real64: return numberChars(v.real64, buffer);
+        case CMPI_uint8: return numberChars(v.uint8, buffer);
+        case CMPI_uint16: return numberChars(v.uint16, buffer);
+        case CMPI_uint32: return numberChars(v.uint32, buffer);
+        case CMPI_uint64: return numberChars(v.uint64, buffer);
+        case CMPI_sint8: return numberChars(v.sint8, buffer);
+        case CMPI_sint16: return numberChars(v.sint16, buffer);
+        case CMPI_sint32: return numberChars(v.sint32, buffer);
+        case CMPI_sint64: return numberChars(v.sint64, buffer);
+        case CMPI_string: return stringChars(v.string);
+        case CMPI_chars: return charsOf(v.chars);
+        case CMPI_charsptr: return charsOf(static_cast<const char*>(v.dataPtr.ptr));
+        case CMPI_dateTime: return dateTimeChars(v.dateTime);
         default: return std::nullopt;
     }
+}
+
+std::optional<std::string> scalarText(const CMPIData& data) {
+    ScalarBuffer buffer;
+    const std::optional<ScalarChars> chars = scalarChars(data, buffer);
+    return chars ? std::optional<std::string>(chars->text) : std::nullopt;
 }
 
 }  // namespace orv::cimxml

@@ -15,10 +15,11 @@ bool needsControlPicture(unsigned char c) noexcept {
     return c != 0 && c < 0x20 && c != '\t' && c != '\n' && c != '\r';
 }
 
-void appendControlPicture(std::string& out, unsigned char c) {
-    out += static_cast<char>(kLead);
-    out += static_cast<char>(kSecond);
-    out += static_cast<char>(kBase + c);
+char* writeControlPicture(char* out, unsigned char c) noexcept {
+    out[0] = static_cast<char>(kLead);
+    out[1] = static_cast<char>(kSecond);
+    out[2] = static_cast<char>(kBase + c);
+    return out + 3;
 }
 
 std::string fromControlPictures(std::string_view text) {

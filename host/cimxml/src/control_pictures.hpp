@@ -14,8 +14,9 @@ namespace orv::cimxml {
 
 // Whether `c` needs the control picture to travel in XML 1.0.
 bool needsControlPicture(unsigned char c) noexcept;
-// Appends the UTF-8 form of the control picture of `c` (three bytes, E2 90 8x/9x).
-void appendControlPicture(std::string& out, unsigned char c);
+// Writes the UTF-8 form of the control picture of `c` (three bytes, E2 90 8x/9x) to `out`;
+// returns the end of what it wrote.
+char* writeControlPicture(char* out, unsigned char c) noexcept;
 // `text` with every control picture of such a character turned back into it.
 std::string fromControlPictures(std::string_view text);
 

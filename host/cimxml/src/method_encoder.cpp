@@ -26,8 +26,8 @@ void writeTypedValue(XmlWriter& out, const CMPIData& data, ArrayNullElements nul
         if (data.value.ref != nullptr) {
             writeValueReference(out, data.value.ref);
         }
-    } else if (std::optional<std::string> text = itemText(data)) {
-        out.leaf("VALUE", *text);
+    } else {
+        writeValue(out, data);
     }
 }
 

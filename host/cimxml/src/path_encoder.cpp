@@ -1,6 +1,7 @@
 // Instance names and the path elements around them.
 #include "orv/cimxml/cmpi_value.hpp"
 #include "orv/cimxml/object_encoder.hpp"
+#include "value_encoding.hpp"
 
 namespace orv::cimxml {
 
@@ -37,27 +38,32 @@ void writeNamespacePath(XmlWriter& out, std::string_view host, std::string_view 
     out.close();
 }
 
-void writeKeyBinding(XmlWriter& out, const std::string& name, const CMPIData& key) {
-    out.open("KEYBINDING").attr("NAME", name);
+void writeKeyBinding(XmlWriter& out, std::string_view name, const CMPIData& key) {
+    out.raw("<KEYBINDING NAME=\"").text(name).raw("\">");
     if (key.type == CMPI_ref && !isNullData(key) && key.value.ref != nullptr) {
         writeValueReference(out, key.value.ref);
     } else {
         // TYPE names the key's CIM type beside the coarse VALUETYPE, so that a
         // client can tell a uint16 key from a sint64 one.
-        out.open("KEYVALUE").attr("VALUETYPE", keyValueType(key.type));
+        out.raw("<KEYVALUE VALUETYPE=\"").raw(keyValueType(key.type)).raw("\"");
         if (const std::string_view type = xmlTypeName(key.type); !type.empty()) {
-            out.attr("TYPE", type);
+            out.raw(" TYPE=\"").raw(type).raw("\"");
         }
-        out.text(scalarText(key).value_or(""));
-        out.close();
+        out.raw(">");
+        writeScalarText(out, key);
+        out.raw("</KEYVALUE>");
     }
-    out.close();
+    out.raw("</KEYBINDING>");
 }
 
 }  // namespace
 
+std::string_view pathClassChars(const CMPIObjectPath* path) {
+    return path == nullptr ? std::string_view() : cmpiChars(path->ft->getClassName(path, nullptr));
+}
+
 std::string pathClassName(const CMPIObjectPath* path) {
-    return path == nullptr ? std::string() : cmpiString(path->ft->getClassName(path, nullptr));
+    return std::string(pathClassChars(path));
 }
 
 std::string instanceClassName(const CMPIInstance* instance) {
@@ -76,14 +82,14 @@ void writeClassPath(XmlWriter& out, std::string_view host, std::string_view name
 }
 
 void writeInstanceName(XmlWriter& out, const CMPIObjectPath* path) {
-    out.open("INSTANCENAME").attr("CLASSNAME", pathClassName(path));
+    out.raw("<INSTANCENAME CLASSNAME=\"").text(pathClassChars(path)).raw("\">");
     const CMPICount count = path->ft->getKeyCount(path, nullptr);
     for (CMPICount i = 0; i < count; ++i) {
         CMPIString* name = nullptr;
         const CMPIData key = path->ft->getKeyAt(path, i, &name, nullptr);
-        writeKeyBinding(out, cmpiString(name), key);
+        writeKeyBinding(out, cmpiChars(name), key);
     }
-    out.close();
+    out.raw("</INSTANCENAME>");
 }
 
 void writeInstancePath(XmlWriter& out, const CMPIObjectPath* path, const PathDefaults& defaults) {

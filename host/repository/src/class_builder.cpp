@@ -52,6 +52,7 @@ public:
         for (PropertyDecl& p : c.properties) {
             p.key = p.qualifiers.isTrue("Key");
         }
+        c.indexProperties();
         return c;
     }
 

@@ -58,26 +58,36 @@ FaultTable::FaultTable(std::vector<FaultRule> rules)
 {
 }
 
+bool FaultTable::counts(std::size_t index, const CallSite& site) const
+{
+    const FaultRule& rule = rules_[index];
+    if (!matches(rule, site)) {
+        return false;
+    }
+    const uint64_t count = hits_[index].fetch_add(1, std::memory_order_relaxed) + 1;
+    return !rule.nth || *rule.nth == count;
+}
+
 std::vector<const FaultRule*> FaultTable::fireEach(const CallSite& site) const
 {
     std::vector<const FaultRule*> fired;
     for (size_t i = 0; i < rules_.size(); ++i) {
-        const FaultRule& rule = rules_[i];
-        if (!matches(rule, site)) {
-            continue;
-        }
-        const uint64_t count = hits_[i].fetch_add(1, std::memory_order_relaxed) + 1;
-        if (!rule.nth || *rule.nth == count) {
-            fired.push_back(&rule);
+        if (counts(i, site)) {
+            fired.push_back(&rules_[i]);
         }
     }
     return fired;
 }
 
-const FaultRule* FaultTable::fire(const CallSite& site) const
+const FaultRule* FaultTable::firstFired(const CallSite& site) const
 {
-    const std::vector<const FaultRule*> fired = fireEach(site);
-    return fired.empty() ? nullptr : fired.front();
+    const FaultRule* first = nullptr;
+    for (size_t i = 0; i < rules_.size(); ++i) {
+        if (counts(i, site) && first == nullptr) {
+            first = &rules_[i];
+        }
+    }
+    return first;
 }
 
 bool isKnownCall(std::string_view call)

@@ -4,6 +4,7 @@
 #pragma once
 
 #include <atomic>
+#include <cstddef>
 #include <cstdint>
 #include <memory>
 #include <optional>
@@ -45,14 +46,20 @@ public:
     FaultTable& operator=(FaultTable&& other) noexcept = default;
 
     // The first rule that fires for this invocation, or null. Every matching
-    // rule counts the invocation, fired or not.
-    const FaultRule* fire(const CallSite& site) const;
+    // rule counts the invocation, fired or not. A table without rules answers
+    // at once: every simulated call asks it.
+    const FaultRule* fire(const CallSite& site) const { return rules_.empty() ? nullptr : firstFired(site); }
     // Every rule that fires for this invocation, in rule order.
     std::vector<const FaultRule*> fireEach(const CallSite& site) const;
 
     const std::vector<FaultRule>& rules() const { return rules_; }
+    bool empty() const { return rules_.empty(); }
 
 private:
+    // Counts the invocation on rule index when it matches; whether the rule fires.
+    bool counts(std::size_t index, const CallSite& site) const;
+    const FaultRule* firstFired(const CallSite& site) const;
+
     std::vector<FaultRule> rules_;
     std::unique_ptr<std::atomic<uint64_t>[]> hits_;
 };

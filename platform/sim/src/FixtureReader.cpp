@@ -32,7 +32,7 @@ std::shared_ptr<HostModel> readModel(const nlohmann::json& document)
     JsonObject root = JsonNode(document, "$").object();
     readHost(root.required("host"), *host);
     if (std::optional<JsonNode> nics = root.optional("nics")) {
-        host->nics = readNics(*nics);
+        host->nics = readNics(*nics, host->nicIndex);
     }
     if (std::optional<JsonNode> stacks = root.optional("tcpipStacks")) {
         host->tcpipStacks = readTcpipStacks(*stacks);

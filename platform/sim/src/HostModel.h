@@ -7,6 +7,7 @@
 #include <map>
 #include <optional>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "FaultTable.h"
@@ -131,6 +132,7 @@ struct HostModel {
     bool osIsTmk = false;
     std::optional<long> uptimeSeconds;
     std::optional<std::vector<NicModel>> nics;
+    std::unordered_map<std::string, size_t> nicIndex;  // name -> position in nics, made with them
     std::optional<std::map<std::string, StackModel>> tcpipStacks;
     std::optional<CpuModel> cpu;
     std::optional<VersionModel> version;

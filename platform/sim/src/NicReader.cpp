@@ -1,6 +1,5 @@
 // The "nics" section: one physical NIC per entry with every record it serves.
 #include <cstdio>
-#include <set>
 
 #include "ReaderParts.h"
 #include "orv/platform/sim/RecordFields.h"
@@ -202,13 +201,13 @@ NicModel readNic(const JsonNode& node)
 
 } // namespace
 
-std::vector<NicModel> readNics(const JsonNode& node)
+std::vector<NicModel> readNics(const JsonNode& node, std::unordered_map<std::string, size_t>& index)
 {
     std::vector<NicModel> nics;
-    std::set<std::string> names;
+    index.clear();
     for (const JsonNode& item : node.array()) {
         nics.push_back(readNic(item));
-        if (!names.insert(nics.back().name).second) {
+        if (!index.emplace(nics.back().name, nics.size() - 1).second) {
             item.fail("duplicate NIC name \"" + nics.back().name + "\"");
         }
     }

@@ -4,6 +4,7 @@
 
 #include <map>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "HostModel.h"
@@ -11,7 +12,8 @@
 
 namespace orv::platform::sim {
 
-std::vector<NicModel> readNics(const JsonNode& node);
+// The NICs in fixture order; index gets each name's position.
+std::vector<NicModel> readNics(const JsonNode& node, std::unordered_map<std::string, size_t>& index);
 std::map<std::string, StackModel> readTcpipStacks(const JsonNode& node);
 CpuModel readCpu(const JsonNode& node);
 VersionModel readVersion(const JsonNode& node, std::map<TmkuserStatus_Code, StatusText>& codes);

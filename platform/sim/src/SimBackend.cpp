@@ -20,6 +20,9 @@ constexpr TmkuserStatus_Code kNoVersionCode = 0xBAD00010u;
 
 const FaultRule* fireCall(const HostModel& host, std::string_view call, const std::string* param = nullptr)
 {
+    if (host.faults.empty()) {
+        return nullptr;
+    }
     std::vector<std::string> params;
     if (param != nullptr) {
         params.push_back(*param);
@@ -60,9 +63,11 @@ public:
     {
         std::shared_ptr<const HostModel> host = hostOrThrow(source_);
         throwIfInjected(*host, "GetPnics");
+        const std::vector<NicModel>& nics = nicsOrThrow(*host);
         std::vector<NodeMgr::Network::Pnic*> pnics;
+        pnics.reserve(nics.size());
         try {
-            for (const NicModel& nic : nicsOrThrow(*host)) {
+            for (const NicModel& nic : nics) {
                 pnics.push_back(makeSimPnic(host, nic));
             }
         } catch (...) {
@@ -78,12 +83,9 @@ public:
     {
         std::shared_ptr<const HostModel> host = hostOrThrow(source_);
         throwIfInjected(*host, "GetPnicByName", &name);
-        for (const NicModel& nic : nicsOrThrow(*host)) {
-            if (nic.name == name) {
-                return makeSimPnic(host, nic);
-            }
-        }
-        return nullptr;
+        const std::vector<NicModel>& nics = nicsOrThrow(*host);
+        const auto found = host->nicIndex.find(name);
+        return found != host->nicIndex.end() ? makeSimPnic(host, nics[found->second]) : nullptr;
     }
 
 private:

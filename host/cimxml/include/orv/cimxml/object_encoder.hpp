@@ -5,28 +5,37 @@
 #include <cmpidt.h>
 #include <cmpift.h>
 
-#include <functional>
 #include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include "orv/cimxml/xml_writer.hpp"
+#include "orv/repository/class_repository.hpp"
 
 namespace orv::cimxml {
 
-// What the encoder may know about a property from the class declaration.
-struct PropertyInfo {
-    std::string classOrigin;     // CLASSORIGIN when asked for
-    std::string referenceClass;  // REFERENCECLASS of reference properties
-    bool propagated = false;
-};
+// Where the instance encoder reads property declarations, for what they add to a
+// property's start tag (REFERENCECLASS of a reference, CLASSORIGIN when asked for): the
+// classes of one namespace of a repository. The class most instances of an answer have
+// is looked up once, ahead; other classes per instance.
+class ClassDeclarations {
+public:
+    // None: start tags carry what the values show.
+    ClassDeclarations() = default;
+    // `classes` must outlive this.
+    ClassDeclarations(const repository::ClassRepository& classes, std::string nameSpace,
+                      std::string_view expectedClass = {});
 
-// Declaration lookup: (class name, property name) -> info; nullopt when unknown. The
-// instance encoder asks only where the answer shows in the start tag: for reference
-// properties (REFERENCECLASS) and when class origins are asked for.
-using PropertyLookup =
-    std::function<std::optional<PropertyInfo>(std::string_view className, std::string_view property)>;
+    explicit operator bool() const noexcept { return classes_ != nullptr; }
+    // The class named so (any case) in the namespace, or nullptr.
+    const repository::ClassDecl* find(std::string_view className) const noexcept;
+
+private:
+    const repository::ClassRepository* classes_ = nullptr;
+    std::string nameSpace_;
+    const repository::ClassDecl* expected_ = nullptr;
+};
 
 // How NULL elements of an array value are sent. DSP0201 writes each as a
 // VALUE.NULL inside VALUE.ARRAY, which wbemcli 1.6 and pywbem cannot read;
@@ -41,7 +50,7 @@ struct InstanceEncoding {
     ArrayNullElements arrayNullElements = ArrayNullElements::Drop;
     // Properties to keep (any case); nullopt keeps every property.
     std::optional<std::vector<std::string>> propertyList;
-    PropertyLookup lookup;  // may be empty
+    ClassDeclarations declarations;  // may be none
 };
 
 // Where a path lacks a host or namespace, INSTANCEPATH uses these.
@@ -61,11 +70,21 @@ void writeInstancePath(XmlWriter& out, const CMPIObjectPath* path, const PathDef
 void writeValueReference(XmlWriter& out, const CMPIObjectPath* path);
 // <INSTANCE CLASSNAME=...> with its properties.
 void writeInstance(XmlWriter& out, const CMPIInstance* instance, const InstanceEncoding& encoding);
+// The same where the class name is known (that of the instance's path).
+void writeInstance(XmlWriter& out, const CMPIInstance* instance, std::string_view className,
+                   const InstanceEncoding& encoding);
+// <VALUE.NAMEDINSTANCE>: INSTANCENAME and INSTANCE.
+void writeNamedInstance(XmlWriter& out, const CMPIInstance* instance, const InstanceEncoding& encoding);
+// `element` (VALUE.OBJECTWITHPATH, VALUE.INSTANCEWITHPATH) holding INSTANCEPATH and INSTANCE.
+void writeInstanceWithPath(XmlWriter& out, std::string_view element, const CMPIInstance* instance,
+                           const PathDefaults& defaults, const InstanceEncoding& encoding);
 // The INSTANCE element alone, as text (the value of an embedded instance).
 std::string instanceText(const CMPIInstance* instance);
 
 // The class name of a path / an instance's path ("" when unknown).
 std::string pathClassName(const CMPIObjectPath* path);
+// The same without a copy, valid while the path is.
+std::string_view pathClassChars(const CMPIObjectPath* path);
 std::string instanceClassName(const CMPIInstance* instance);
 
 }  // namespace orv::cimxml

@@ -1,6 +1,7 @@
 // Declarations of CIM classes, their properties, methods and parameters.
 #pragma once
 
+#include <cstdint>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -68,13 +69,20 @@ struct ClassDecl {
     std::string file;
     int line = 0;
 
-    // Effective property / method named so (any case), or nullptr.
+    // Effective property / method named so (any case), or nullptr. A property spelled as
+    // declared is found through propertySlots; another spelling by a scan.
     const PropertyDecl* findProperty(std::string_view name) const noexcept;
     const MethodDecl* findMethod(std::string_view name) const noexcept;
     // Names of the key properties, inherited ones included, in schema order.
     std::vector<std::string> keyNames() const;
     // The reference properties (for an association, its ends), in schema order.
     std::vector<const PropertyDecl*> referenceProperties() const;
+
+    // Hashes the names of `properties` into propertySlots; called once the list is final.
+    void indexProperties();
+    // An open-addressed table over the exact property names: each slot holds a position in
+    // `properties` plus one, 0 when empty. Empty until indexProperties().
+    std::vector<std::uint32_t> propertySlots;
 };
 
 }  // namespace orv::repository
