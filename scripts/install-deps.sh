@@ -10,6 +10,7 @@ PACKAGES=(
   libgtest-dev libgmock-dev googletest libbenchmark-dev valgrind
   # libraries the project links against
   libboost-dev nlohmann-json3-dev libcpp-httplib-dev libssl-dev libexpat1-dev libmnl-dev libpam0g-dev
+  libjemalloc-dev
   # tools the end-to-end and Linux tests drive
   sblim-wbemcli ethtool iproute2 curl procps openssl
   # xmllint: the CIM-XML requests and answers of the tests are checked against the DTD

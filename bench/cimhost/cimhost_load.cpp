@@ -1,20 +1,32 @@
-// A small load client for orv-cimhost: N keep-alive connections send the same CIM-XML
-// request for a fixed time; prints requests per second and p50 / p99 latency.
+// A small load client for a CIM broker (orv-cimhost, sfcb): N keep-alive connections send
+// the same CIM-XML request for a fixed time; prints requests per second and p50 / p99
+// latency.
 //
 //   cimhost_load --port 5988 --clients 8 --seconds 5 --op ei --class Raw_Element
 //   cimhost_load --op gi --class Orvane_EthernetPort --key DeviceID=vmnic0,SystemName=h ...
-#include <httplib.h>
+#include <boost/asio/ip/tcp.hpp>
+#include <boost/beast/core/detail/base64.hpp>
+#include <boost/beast/core/flat_buffer.hpp>
+#include <boost/beast/http/read.hpp>
+#include <boost/beast/http/string_body.hpp>
+#include <boost/beast/http/write.hpp>
 
 #include <algorithm>
 #include <atomic>
 #include <chrono>
 #include <cstdio>
+#include <cstdint>
 #include <cstdlib>
+#include <limits>
 #include <string>
 #include <thread>
 #include <vector>
 
 namespace {
+
+namespace asio = boost::asio;
+namespace beast = boost::beast;
+namespace http = boost::beast::http;
 
 struct Options {
     std::string host = "127.0.0.1";
@@ -82,22 +94,93 @@ Options parse(int argc, char** argv) {
     return options;
 }
 
+// One keep-alive connection speaking HTTP/1.1 through Boost.Beast's synchronous calls:
+// one write and, for a small answer, one read per request, so that the client takes as
+// little of the machine as it can from the broker it measures.
+class Connection {
+public:
+    Connection(const Options& options, std::string document) : options_(options) {
+        request_.method(http::verb::post);
+        request_.target("/cimom");
+        request_.version(11);
+        request_.set(http::field::host, options.host + ":" + std::to_string(options.port));
+        request_.set(http::field::content_type, "application/xml; charset=\"utf-8\"");
+        request_.set("CIMOperation", "MethodCall");
+        request_.set("CIMMethod", options.op == "gi" ? "GetInstance" : "EnumerateInstances");
+        request_.set("CIMObject", "root%2Fcimv2");
+        if (!options.user.empty()) {
+            request_.set(http::field::authorization, "Basic " + base64(options.user + ":" + options.password));
+        }
+        request_.keep_alive(true);
+        request_.body() = std::move(document);
+        request_.prepare_payload();
+    }
+
+    // True for a 200 answer without an ERROR element.
+    bool exchange() {
+        boost::system::error_code ec;
+        if (!socket_.is_open() && !open()) {
+            return false;
+        }
+        http::write(socket_, request_, ec);
+        http::response_parser<http::string_body> parser;
+        parser.body_limit(std::numeric_limits<std::uint64_t>::max());
+        if (!ec) {
+            http::read(socket_, buffer_, parser, ec);
+        }
+        if (ec) {
+            close();
+            return false;
+        }
+        const auto& response = parser.get();
+        if (!response.keep_alive()) {
+            close();
+        }
+        return response.result_int() == 200 && response.body().find("<ERROR") == std::string::npos;
+    }
+
+private:
+    bool open() {
+        boost::system::error_code ec;
+        const auto address = asio::ip::make_address(options_.host, ec);
+        if (ec) {
+            return false;
+        }
+        socket_.connect(asio::ip::tcp::endpoint(address, static_cast<unsigned short>(options_.port)), ec);
+        if (ec) {
+            close();
+            return false;
+        }
+        socket_.set_option(asio::ip::tcp::no_delay(true), ec);
+        return true;
+    }
+    void close() {
+        boost::system::error_code ignored;
+        socket_.close(ignored);
+        buffer_.clear();
+    }
+    static std::string base64(const std::string& text) {
+        std::string out(beast::detail::base64::encoded_size(text.size()), '\0');
+        out.resize(beast::detail::base64::encode(out.data(), text.data(), text.size()));
+        return out;
+    }
+
+    const Options& options_;
+    asio::io_context io_;
+    asio::ip::tcp::socket socket_{io_};
+    beast::flat_buffer buffer_;
+    http::request<http::string_body> request_;
+};
+
 // One client's loop; latencies in microseconds.
 void runClient(const Options& options, const std::string& body, std::chrono::steady_clock::time_point end,
                std::vector<double>& latencies, std::atomic<long>& failures) {
-    httplib::Client client(options.host, options.port);
-    client.set_keep_alive(true);
-    client.set_tcp_nodelay(true);
-    if (!options.user.empty()) {
-        client.set_basic_auth(options.user.c_str(), options.password.c_str());
-    }
-    const std::string method = options.op == "gi" ? "GetInstance" : "EnumerateInstances";
-    const httplib::Headers headers{{"CIMOperation", "MethodCall"}, {"CIMMethod", method}, {"CIMObject", "root%2Fcimv2"}};
+    Connection connection(options, body);
     while (std::chrono::steady_clock::now() < end) {
         const auto start = std::chrono::steady_clock::now();
-        auto result = client.Post("/cimom", headers, body, "application/xml; charset=\"utf-8\"");
+        const bool answered = connection.exchange();
         const auto stop = std::chrono::steady_clock::now();
-        if (!result || result->status != 200 || result->body.find("<ERROR") != std::string::npos) {
+        if (!answered) {
             ++failures;
             continue;
         }

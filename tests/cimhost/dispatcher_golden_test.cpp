@@ -26,6 +26,7 @@ const Case kCases[] = {
     // Status codes: each operation answers only codes its list has, with the provider's message.
     {"gi_no_such_property_is_invalid_parameter", "gi_element", "nosuchproperty"},
     {"gi_not_found_without_message", "gi_element", "errornomsg"},
+    {"gi_failure_after_the_instance_answers_only_the_error", "gi_element", "lateerror"},
     {"ei_not_found_without_message_is_invalid_parameter", "ei_element", "errornomsg"},
     {"ei_invalid_class_from_provider_kept", "ei_element", "invalidclass"},
     {"ai_invalid_class_from_provider_is_invalid_parameter", "ai_element", "invalidclass"},

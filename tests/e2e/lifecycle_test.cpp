@@ -5,11 +5,14 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <atomic>
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
+#include <thread>
+#include <vector>
 
 #include "golden_file.hpp"
 #include "host_process.hpp"
@@ -166,6 +169,113 @@ TEST(CimHostLifecycle, OverrunAfterTheAnswerBeganClosesTheConnectionWithoutTheLa
     auto answer = next.readResponse(std::chrono::seconds(10));
     ASSERT_TRUE(answer);
     EXPECT_EQ(answer->status, 200);
+    EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
+}
+
+// The arguments of a host serving the slow provider with a provider call limit of 1 s and
+// `threads` workers.
+std::vector<std::string> slowHostArgs(const char* threads) {
+    return {"--provider-dir", buildDir() + "/lib", "--registration", sourceDir() + "/tests/e2e/data/slowhost.reg",
+            "--mof", sourceDir() + "/tests/rawprovider/rawprovider.mof", "--provider-call-limit", "1",
+            "--threads", threads};
+}
+
+// EnumerateInstanceNames of Raw_Element in root/cimv2 with the given MESSAGE ID.
+std::string enumerateRawElementNames(int messageId) {
+    return "<?xml version=\"1.0\" encoding=\"utf-8\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
+           "<MESSAGE ID=\"" + std::to_string(messageId) +
+           "\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ><IMETHODCALL NAME=\"EnumerateInstanceNames\">"
+           "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/></LOCALNAMESPACEPATH>"
+           "<IPARAMVALUE NAME=\"ClassName\"><CLASSNAME NAME=\"Raw_Element\"/></IPARAMVALUE>"
+           "</IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
+}
+
+// The call runs on the request's worker; when it overruns, the answer goes out at the limit
+// and another worker takes that one's place: with a single worker, the same connection and
+// a new one are both served while the provider still sleeps.
+TEST(CimHostLifecycle, OverrunningCallHandsItsWorkerOverSoTheNextRequestsAreServed) {
+    setenv("SLOW_PROVIDER_MS", "4000", 1);
+    HostProcess host(slowHostArgs("1"));
+    unsetenv("SLOW_PROVIDER_MS");
+    ASSERT_TRUE(host.waitReady()) << host.output();
+    const std::string enumerateNames = enumerateRawElementNames(7);
+    const auto start = std::chrono::steady_clock::now();
+    RawConnection connection(host.port());
+    ASSERT_TRUE(connection.send(cimPost(enumerateNames, "EnumerateInstanceNames")));
+    auto overrun = connection.readResponse(std::chrono::milliseconds(3000));
+    ASSERT_TRUE(overrun) << "answered at the limit";
+    EXPECT_EQ(overrun->status, 200);
+    EXPECT_NE(overrun->body.find("<ERROR CODE=\"1\" DESCRIPTION=\"the request did not finish within the provider "
+                                 "call limit of 1 s"),
+              std::string::npos)
+        << overrun->body;
+    EXPECT_NE(overrun->body.find("<MESSAGE ID=\"7\""), std::string::npos) << overrun->body;
+
+    ASSERT_TRUE(connection.send(cimPost(enumerateClassNamesBody(8), "EnumerateClassNames")));
+    auto sameConnection = connection.readResponse(std::chrono::milliseconds(1500));
+    ASSERT_TRUE(sameConnection) << "the connection goes on after the early answer";
+    EXPECT_EQ(sameConnection->status, 200);
+    EXPECT_NE(sameConnection->body.find("<MESSAGE ID=\"8\""), std::string::npos);
+
+    RawConnection other(host.port());
+    ASSERT_TRUE(other.send(cimPost(enumerateClassNamesBody(9), "EnumerateClassNames")));
+    auto otherConnection = other.readResponse(std::chrono::milliseconds(1500));
+    ASSERT_TRUE(otherConnection) << "the only worker is busy with the provider: another took its place";
+    EXPECT_EQ(otherConnection->status, 200);
+    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(3800))
+        << "all of it while the provider still sleeps";
+    EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
+    EXPECT_GT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(3900))
+        << "the stop waited for the provider call still running";
+}
+
+// Calls that overrun and calls that do not, from several clients at once: each overrun is
+// answered at the limit and every quick request in full, on two workers (under the thread
+// sanitizer this drives the early answer, the watchdog and the worker hand-over together).
+TEST(CimHostLifecycle, ConcurrentClientsAreServedWhileCallsOverrun) {
+    setenv("SLOW_PROVIDER_MS", "1500", 1);
+    HostProcess host(slowHostArgs("2"));
+    unsetenv("SLOW_PROVIDER_MS");
+    ASSERT_TRUE(host.waitReady()) << host.output();
+    const std::string enumerateNames = enumerateRawElementNames(5);
+    std::atomic<int> overruns{0};
+    std::atomic<int> quick{0};
+    std::vector<std::thread> clients;
+    for (int c = 0; c < 2; ++c) {
+        clients.emplace_back([&] {
+            RawConnection connection(host.port());
+            for (int i = 0; i < 2; ++i) {
+                if (!connection.send(cimPost(enumerateNames, "EnumerateInstanceNames"))) {
+                    return;
+                }
+                auto answer = connection.readResponse(std::chrono::seconds(10));
+                if (answer && answer->body.find("provider call limit of 1 s") != std::string::npos) {
+                    ++overruns;
+                }
+            }
+        });
+    }
+    for (int c = 0; c < 4; ++c) {
+        clients.emplace_back([&, c] {
+            RawConnection connection(host.port());
+            for (int i = 0; i < 20; ++i) {
+                if (!connection.send(cimPost(enumerateClassNamesBody(100 + c), "EnumerateClassNames"))) {
+                    return;
+                }
+                auto answer = connection.readResponse(std::chrono::seconds(10));
+                if (answer && answer->status == 200 &&
+                    answer->body.find("<MESSAGE ID=\"" + std::to_string(100 + c) + "\"") != std::string::npos &&
+                    answer->body.find("<ERROR") == std::string::npos) {
+                    ++quick;
+                }
+            }
+        });
+    }
+    for (auto& client : clients) {
+        client.join();
+    }
+    EXPECT_EQ(overruns.load(), 4);
+    EXPECT_EQ(quick.load(), 80);
     EXPECT_EQ(host.stop(SIGTERM), 0) << host.output();
 }
 

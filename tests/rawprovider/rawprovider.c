@@ -12,7 +12,8 @@
  *             "invalidclass" CMPI_RC_ERR_INVALID_CLASS "class not served here"
  *   "noquery" execQuery answers CMPI_RC_ERR_NOT_SUPPORTED without a message,
  *             as the binding's default does
- * getInstance of the Name "gaps" answers Numbers = 0, NULL, 20.
+ * getInstance of the Name "gaps" answers Numbers = 0, NULL, 20; with the principal
+ * "lateerror" getInstance returns the instance, then fails with CMPI_RC_ERR_FAILED.
  * Lifecycle calls are appended, one line each, to the file named by the
  * environment variable RAW_PROVIDER_LOG; RAW_PROVIDER_CLEANUP_RC sets what
  * cleanup(terminating = false) answers.
@@ -306,6 +307,9 @@ static CMPIStatus instGet(CMPIInstanceMI* mi, const CMPIContext* ctx, const CMPI
         inst->ft->setPropertyFilter(inst, properties, NULL);
     }
     rslt->ft->returnInstance(rslt, inst);
+    if (is(principal(ctx), "lateerror")) {
+        return status(CMPI_RC_ERR_FAILED, "failed after returning the instance");
+    }
     rslt->ft->returnDone(rslt);
     return status(CMPI_RC_OK, NULL);
 }

@@ -1,5 +1,7 @@
 #include "call_limiter.hpp"
 
+#include <utility>
+
 namespace orv::cimhost::detail {
 
 // What the waiting request and the call thread share.
@@ -19,8 +21,78 @@ CallLimiter::~CallLimiter() {
         stopping_ = true;
     }
     jobReady_.notify_all();
+    watchChanged_.notify_all();
     for (std::thread& thread : threads_) {
         thread.join();
+    }
+    if (watchdogThread_.joinable()) {
+        watchdogThread_.join();
+    }
+}
+
+// The limit is the same for every call, so the list stays in deadline order by appending.
+// The watchdog is woken only when it waits without a deadline; otherwise it wakes at the
+// oldest deadline it knew and looks again, so a call that ends early costs it nothing.
+void CallLimiter::watch(Watch& entry) {
+    bool wake = false;
+    {
+        std::lock_guard lock(mutex_);
+        ++running_;
+        entry.deadline = std::chrono::steady_clock::now() + limit_;
+        entry.previous = newest_;
+        (newest_ != nullptr ? newest_->next : oldest_) = &entry;
+        newest_ = &entry;
+        if (!watchdogThread_.joinable()) {
+            watchdogThread_ = std::thread([this] { watchdog(); });
+        }
+        wake = std::exchange(watchdogIdle_, false);
+    }
+    if (wake) {
+        watchChanged_.notify_one();
+    }
+}
+
+void CallLimiter::unlinkLocked(Watch& entry) {
+    (entry.previous != nullptr ? entry.previous->next : oldest_) = entry.next;
+    (entry.next != nullptr ? entry.next->previous : newest_) = entry.previous;
+}
+
+void CallLimiter::unwatch(Watch& entry) {
+    std::unique_lock lock(mutex_);
+    if (entry.fired) {
+        fired_.wait(lock, [&entry] { return !entry.firing; });  // `overrun` uses the caller's state
+        --overrunning_;
+    } else {
+        unlinkLocked(entry);
+    }
+    if (--running_ == 0) {
+        idle_.notify_all();
+    }
+}
+
+void CallLimiter::watchdog() {
+    std::unique_lock lock(mutex_);
+    while (!stopping_) {
+        if (oldest_ == nullptr) {
+            watchdogIdle_ = true;
+            watchChanged_.wait(lock, [this] { return stopping_ || !watchdogIdle_; });
+            continue;
+        }
+        const auto deadline = oldest_->deadline;
+        if (std::chrono::steady_clock::now() < deadline) {
+            watchChanged_.wait_until(lock, deadline);
+            continue;
+        }
+        Watch& entry = *oldest_;
+        unlinkLocked(entry);
+        entry.fired = true;
+        entry.firing = true;
+        ++overrunning_;
+        lock.unlock();
+        entry.fire(entry.overrun);
+        lock.lock();
+        entry.firing = false;
+        fired_.notify_all();
     }
 }
 

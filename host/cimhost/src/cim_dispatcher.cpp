@@ -87,24 +87,41 @@ void CimDispatcher::drain() {
 std::size_t CimDispatcher::openEnumerations() const { return enumerations_->openCount(); }
 
 std::string CimDispatcher::respond(const cimxml::CimRequest& request, const std::string& principal) const {
-    return respondWithin(request, principal, nullptr);
+    return respondWithin(request, principal);
 }
 
+// With a stream the call runs on this thread: at the limit the watchdog answers the client
+// through the stream (or aborts a body that began) and hands this worker's place over.
 std::string CimDispatcher::respond(const cimxml::CimRequest& request, const std::string& principal,
                                    http::ResponseStream& stream, const http::Response& head) const {
-    return respondWithin(request, principal, std::make_shared<detail::StreamedResponse>(stream, head));
+    auto streamed = std::make_shared<detail::StreamedResponse>(stream, head);
+    const std::string owner = principal;  // the connection's request may be reused after an early answer
+    return limiter_->runHere([&] { return respondNow(request, owner, streamed.get()); },
+                             [&]() noexcept {
+                                 try {
+                                     if (!streamed->abandon()) {
+                                         http::Response whole = head;
+                                         whole.body = overrunAnswer(request);
+                                         stream.answer(std::move(whole));
+                                     }
+                                 } catch (...) {
+                                     stream.abort();  // no memory for the answer: the connection closes
+                                 }
+                                 stream.release();
+                             });
 }
 
-std::string CimDispatcher::respondWithin(const cimxml::CimRequest& request, const std::string& principal,
-                                         const std::shared_ptr<detail::StreamedResponse>& streamed) const {
-    std::optional<std::string> answer = limiter_->run(
-        [this, request, principal, streamed] { return respondNow(request, principal, streamed.get()); });
+// Without a stream the call runs on a call thread while this one waits up to the limit.
+std::string CimDispatcher::respondWithin(const cimxml::CimRequest& request, const std::string& principal) const {
+    std::optional<std::string> answer =
+        limiter_->run([this, request, principal] { return respondNow(request, principal, nullptr); });
     if (answer) {
         return std::move(*answer);
     }
-    if (streamed && streamed->abandon()) {
-        return {};  // part of the answer went out: the connection closes without the rest
-    }
+    return overrunAnswer(request);
+}
+
+std::string CimDispatcher::overrunAnswer(const cimxml::CimRequest& request) const {
     const auto limit = std::chrono::duration_cast<std::chrono::seconds>(limiter_->limit());
     return cimxml::errorResponse(request.messageId, request.methodName, request.intrinsic,
                                  static_cast<int>(CimStatus::Failed),

@@ -71,19 +71,19 @@ void getInstance(OperationContext& context) {
         instanceEncoding(context, flags.includeClassOrigin, flags.propertyList, name.className);
     host::CallOptions options =
         callOptions(context, false, flags.includeQualifiers, flags.includeClassOrigin, flags.propertyList);
-    // The first instance the provider returns is the answer: encoded as it arrives (no
-    // copy kept), and used only once the provider has answered OK.
-    std::optional<std::string> answer;
+    // The first instance the provider returns is the answer: encoded into the response as
+    // it arrives (no copy kept). Should the provider fail after all, the error document
+    // takes the place of the whole response, this text included.
+    bool answered = false;
     std::exception_ptr failure;
-    options.onItem = [&answer, &encoding, &failure](const host::ReturnedItem& item) {
-        if (answer) {
+    options.onItem = [&context, &answered, &encoding, &failure](const host::ReturnedItem& item) {
+        if (answered) {
             return true;
         }
         try {
             host::ObjectScope scope;
-            cimxml::XmlWriter text;
-            cimxml::writeInstance(text, item.data.value.inst, encoding);
-            answer = text.take();
+            cimxml::writeInstance(context.out, item.data.value.inst, encoding);
+            answered = true;
             return true;
         } catch (...) {
             failure = std::current_exception();
@@ -95,10 +95,9 @@ void getInstance(OperationContext& context) {
         std::rethrow_exception(failure);
     }
     throwIfFailed(reply);
-    if (!answer) {
+    if (!answered) {
         throw CimError(CimStatus::NotFound, "no such instance");
     }
-    context.out.raw(*answer);
 }
 
 void enumerateInstances(OperationContext& context) {

@@ -33,7 +33,7 @@ bool StreamedResponse::send(std::string piece) {
         head.body = std::move(piece);
         sent = stream_.begin(std::move(head));
     } else {
-        sent = stream_.write(piece);  // may wait for the client; abort() ends the wait
+        sent = stream_.write(std::move(piece));  // may wait for the client; abort() ends the wait
     }
     {
         std::lock_guard lock(mutex_);

@@ -5,9 +5,9 @@
 // element with the usual status). Once sent, a failure can no longer become an ERROR
 // element: the body is aborted, and the client sees an incomplete answer.
 //
-// The operation runs on a call thread while the request's worker waits for it; when the
-// call overruns its limit the worker gives the body up (abandon), after which the call
-// thread's pieces are dropped and it never touches the stream again.
+// The operation runs on the request's worker; when the call overruns its limit the call
+// limiter's watchdog gives the body up (abandon), after which the operation's pieces are
+// dropped and it never touches the stream again.
 #pragma once
 
 #include <condition_variable>
@@ -27,17 +27,17 @@ public:
     // `head`: status and headers of the answer; its body is not used.
     StreamedResponse(http::ResponseStream& stream, http::Response head);
 
-    // Call thread. Sends what `out` holds once it passes kPieceBytes (the head first);
+    // Operation's thread. Sends what `out` holds once it passes kPieceBytes (the head first);
     // false when the client is gone or the body was given up: the operation should stop.
     bool sendIfLarge(cimxml::XmlWriter& out);
-    // Call thread, at the end of a body that began: sends the rest; false when the client
+    // Operation's thread, at the end of a body that began: sends the rest; false when the client
     // is gone or the body was given up.
     bool sendRest(std::string rest);
-    // Call thread: the operation failed after the body began.
+    // Operation's thread: it failed after the body began.
     void fail();
     bool begun() const;
 
-    // Worker: the call overran. Answers whether the body had begun (then it is aborted).
+    // Another thread: the call overran. Answers whether the body had begun (then it is aborted).
     bool abandon();
 
 private:
@@ -49,7 +49,7 @@ private:
     std::condition_variable idle_;
     bool begun_ = false;
     bool abandoned_ = false;
-    unsigned sending_ = 0;  // call-thread sends in progress
+    unsigned sending_ = 0;  // the operation's sends in progress
 };
 
 }  // namespace orv::cimhost::detail

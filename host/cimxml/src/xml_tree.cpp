@@ -4,7 +4,9 @@
 
 #include <expat.h>
 
+#include <algorithm>
 #include <climits>
+#include <random>
 
 namespace orv::cimxml {
 
@@ -31,7 +33,8 @@ namespace {
 // State shared with expat's callbacks while one document is read.
 class TreeBuilder {
 public:
-    TreeBuilder(XML_Parser parser, const XmlLimits& limits) : parser_(parser), limits_(limits) {}
+    TreeBuilder(XML_Parser parser, std::string_view document, const XmlLimits& limits)
+        : parser_(parser), document_(document), limits_(limits) {}
 
     void start(const XML_Char* name, const XML_Char** attrs) {
         if (stack_.size() >= limits_.maxDepth) {
@@ -44,7 +47,7 @@ public:
         }
         auto element = std::make_unique<XmlElement>();
         element->name = name;
-        element->line = static_cast<int>(XML_GetCurrentLineNumber(parser_));
+        element->line = lineHere();
         for (std::size_t i = 0; attrs[i] != nullptr; i += 2) {
             element->attributes.emplace_back(attrs[i], fromControlPictures(attrs[i + 1]));
         }
@@ -79,12 +82,39 @@ public:
         XML_StopParser(parser_, XML_FALSE);
     }
 
+    // The line of the element starting now. Expat's own line count re-reads the text
+    // since its last answer token by token; the newlines are counted here instead.
+    int lineHere() {
+        const XML_Index at = XML_GetCurrentByteIndex(parser_);
+        const auto offset = at < 0 ? lineCountedTo_ : std::min(static_cast<std::size_t>(at), document_.size());
+        if (offset > lineCountedTo_) {
+            line_ += lineBreaks(document_.substr(lineCountedTo_, offset - lineCountedTo_));
+            lineCountedTo_ = offset;
+        }
+        return line_;
+    }
+
+    // Line breaks as XML counts them: LF, CR LF and a CR alone. A piece ends before the
+    // '<' of an element, so a CR at its end stands alone.
+    static int lineBreaks(std::string_view text) {
+        int breaks = static_cast<int>(std::count(text.begin(), text.end(), '\n'));
+        for (std::size_t at = text.find('\r'); at != std::string_view::npos; at = text.find('\r', at + 1)) {
+            if (at + 1 >= text.size() || text[at + 1] != '\n') {
+                ++breaks;
+            }
+        }
+        return breaks;
+    }
+
     const std::string& error() const noexcept { return error_; }
     std::unique_ptr<XmlElement> takeRoot() { return std::move(root_); }
 
 private:
     XML_Parser parser_;
+    std::string_view document_;
     const XmlLimits& limits_;
+    std::size_t lineCountedTo_ = 0;
+    int line_ = 1;
     std::unique_ptr<XmlElement> root_;
     std::vector<XmlElement*> stack_;
     std::size_t elementCount_ = 0;
@@ -112,6 +142,71 @@ void XMLCALL onEntityDecl(void* data, const XML_Char*, int, const XML_Char*, int
 struct ParserDeleter {
     void operator()(XML_ParserStruct* parser) const noexcept { XML_ParserFree(parser); }
 };
+using ParserHandle = std::unique_ptr<XML_ParserStruct, ParserDeleter>;
+
+// Documents up to this size leave their parser to the thread's next document; a larger
+// one frees it, so that no thread keeps what a large document made expat allocate.
+constexpr std::size_t kKeptParserDocumentBytes = 64U << 10U;
+
+// Each thread keeps one parser and resets it for the next document (making one costs
+// more than reading a small request). The hash salt comes from a generator seeded once
+// per thread instead of the system's random source at every document.
+class ThreadParser {
+public:
+    explicit ThreadParser(std::size_t documentBytes) {
+        Kept& kept = keptParser();
+        if (!kept.busy && documentBytes <= kKeptParserDocumentBytes) {
+            if (kept.parser && XML_ParserReset(kept.parser.get(), "UTF-8") == XML_TRUE) {
+                parser_ = kept.parser.get();
+            } else {
+                kept.parser.reset(XML_ParserCreate("UTF-8"));
+                parser_ = kept.parser.get();
+            }
+            kept_ = &kept;
+        } else {
+            own_.reset(XML_ParserCreate("UTF-8"));
+            parser_ = own_.get();
+        }
+        if (parser_ == nullptr) {
+            throw std::bad_alloc();
+        }
+        if (kept_ != nullptr) {
+            kept_->busy = true;
+        }
+        XML_SetHashSalt(parser_, kept.salt());
+    }
+    ~ThreadParser() {
+        if (kept_ != nullptr) {
+            kept_->busy = false;
+        }
+    }
+    ThreadParser(const ThreadParser&) = delete;
+    ThreadParser& operator=(const ThreadParser&) = delete;
+
+    XML_Parser get() const noexcept { return parser_; }
+
+private:
+    struct Kept {
+        ParserHandle parser;
+        std::mt19937_64 salts{std::random_device{}()};
+        bool busy = false;  // a document of this thread is being read with it
+        unsigned long salt() {
+            unsigned long value = 0;
+            while (value == 0) {  // expat takes 0 as "not set"
+                value = static_cast<unsigned long>(salts());
+            }
+            return value;
+        }
+    };
+    static Kept& keptParser() {
+        thread_local Kept kept;
+        return kept;
+    }
+
+    XML_Parser parser_ = nullptr;
+    Kept* kept_ = nullptr;
+    ParserHandle own_;
+};
 
 }  // namespace
 
@@ -119,25 +214,22 @@ std::unique_ptr<XmlElement> parseXmlDocument(std::string_view document, const Xm
     if (document.size() > static_cast<std::size_t>(INT_MAX)) {
         throw XmlSyntaxError("document too large");
     }
-    std::unique_ptr<XML_ParserStruct, ParserDeleter> parser(XML_ParserCreate("UTF-8"));
-    if (!parser) {
-        throw std::bad_alloc();
-    }
-    TreeBuilder builder(parser.get(), limits);
-    XML_SetUserData(parser.get(), &builder);
-    XML_SetElementHandler(parser.get(), onStart, onEnd);
-    XML_SetCharacterDataHandler(parser.get(), onCharacters);
-    XML_SetEntityDeclHandler(parser.get(), onEntityDecl);
-    XML_SetParamEntityParsing(parser.get(), XML_PARAM_ENTITY_PARSING_NEVER);
+    ThreadParser handle(document.size());
+    XML_Parser parser = handle.get();
+    TreeBuilder builder(parser, document, limits);
+    XML_SetUserData(parser, &builder);
+    XML_SetElementHandler(parser, onStart, onEnd);
+    XML_SetCharacterDataHandler(parser, onCharacters);
+    XML_SetEntityDeclHandler(parser, onEntityDecl);
+    XML_SetParamEntityParsing(parser, XML_PARAM_ENTITY_PARSING_NEVER);
 
-    const XML_Status status =
-        XML_Parse(parser.get(), document.data(), static_cast<int>(document.size()), XML_TRUE);
+    const XML_Status status = XML_Parse(parser, document.data(), static_cast<int>(document.size()), XML_TRUE);
     if (!builder.error().empty()) {
         throw XmlSyntaxError(builder.error());
     }
     if (status != XML_STATUS_OK) {
-        throw XmlSyntaxError("line " + std::to_string(XML_GetCurrentLineNumber(parser.get())) + ": " +
-                             XML_ErrorString(XML_GetErrorCode(parser.get())));
+        throw XmlSyntaxError("line " + std::to_string(XML_GetCurrentLineNumber(parser)) + ": " +
+                             XML_ErrorString(XML_GetErrorCode(parser)));
     }
     auto root = builder.takeRoot();
     if (!root) {

@@ -3,7 +3,6 @@
 #include <boost/asio/ip/tcp.hpp>
 #include <boost/asio/post.hpp>
 #include <boost/asio/steady_timer.hpp>
-#include <boost/asio/thread_pool.hpp>
 
 #include <atomic>
 #include <stdexcept>
@@ -173,7 +172,7 @@ int HttpServer::httpsPort() const noexcept {
 
 void HttpServer::run() {
     const std::size_t threads = impl_->context.options.threads == 0 ? 1 : impl_->context.options.threads;
-    asio::thread_pool workers(threads);
+    detail::WorkerPool workers(threads);
     impl_->context.workers = &workers;
     impl_->running.store(true);
     impl_->accept(impl_->plain);

@@ -4,7 +4,6 @@
 #pragma once
 
 #include <boost/asio/io_context.hpp>
-#include <boost/asio/thread_pool.hpp>
 
 #include <cstddef>
 #include <deque>
@@ -15,6 +14,7 @@
 
 #include "login_throttle.hpp"
 #include "orv/http/http_server.hpp"
+#include "worker_pool.hpp"
 
 namespace orv::http::detail {
 
@@ -26,7 +26,7 @@ struct ServerContext {
     AccessLog accessLog;
     EventLog eventLog;
     boost::asio::io_context io{1};
-    boost::asio::thread_pool* workers = nullptr;  // set while run() serves
+    WorkerPool* workers = nullptr;  // set while run() serves
     LoginThrottle logins;
     std::unordered_map<std::string, std::size_t> connectionsPerAddress;
     std::unordered_set<SessionBase*> sessions;

@@ -1,5 +1,7 @@
 #include "session.hpp"
 
+#include "response_head.hpp"
+
 #include <boost/asio/post.hpp>
 #include <boost/asio/ssl/stream_base.hpp>
 #include <boost/asio/write.hpp>
@@ -56,12 +58,14 @@ Response unauthorized(const std::string& realm) {
     return response;
 }
 
-Response callHandler(const Handler& handler, const Request& request) {
+// `channel` is the request's stream: after an early answer the connection reads its next
+// request into the same place, so the request's own pointer is not looked at again.
+Response callHandler(const Handler& handler, const Request& request, StreamChannel* channel) {
     try {
         return handler(request);
     } catch (...) {
-        if (request.stream != nullptr) {
-            request.stream->abort();  // a body already begun cannot be completed
+        if (channel != nullptr) {
+            channel->abort();  // a body already begun cannot be completed
         }
         return status(500);
     }
@@ -85,7 +89,7 @@ SessionBase::~SessionBase() {
 template <class Stream>
 void Session<Stream>::start() {
     if constexpr (kTls) {
-        transport().expires_after(context_.options.readTimeout);
+        setDeadline(context_.options.readTimeout);
         stream_.async_handshake(asio::ssl::stream_base::server, [self = shared_from_this()](error_code ec) {
             if (!ec) {
                 self->awaitRequest();
@@ -105,6 +109,44 @@ void Session<Stream>::stopServing() {
     }
 }
 
+// The connection's deadline: one timer, moved only when a deadline comes before the time
+// it is armed for (about once a request: the keep-alive wait after an answer). When it
+// fires it closes the connection if the deadline has passed, or waits again for the later
+// one. (The stream's own timeouts arm and cancel a timer around every read and write.)
+template <class Stream>
+void Session<Stream>::setDeadline(std::chrono::steady_clock::duration timeout) {
+    deadline_ = std::chrono::steady_clock::now() + timeout;
+    if (!deadlineArmed_ || deadline_ < deadlineTimer_.expiry()) {
+        armDeadline();
+    }
+}
+
+template <class Stream>
+void Session<Stream>::clearDeadline() {
+    deadline_ = std::chrono::steady_clock::time_point::max();
+}
+
+template <class Stream>
+void Session<Stream>::armDeadline() {
+    deadlineArmed_ = true;
+    deadlineTimer_.expires_at(deadline_);
+    deadlineTimer_.async_wait([weak = this->weak_from_this()](error_code ec) {
+        auto self = weak.lock();
+        if (!self || ec) {
+            return;  // the connection is gone, or the timer was moved
+        }
+        self->deadlineArmed_ = false;
+        if (self->deadline_ == std::chrono::steady_clock::time_point::max()) {
+            return;  // nothing to wait for now; the next deadline arms the timer again
+        }
+        if (std::chrono::steady_clock::now() < self->deadline_) {
+            self->armDeadline();
+            return;
+        }
+        self->transport().close();  // what was waiting ends with an error
+    });
+}
+
 template <class Stream>
 bool Session<Stream>::keepAliveAfterThis() const {
     return parser_ && parser_->is_done() && parser_->keep_alive() && !context_.stopping &&
@@ -122,7 +164,7 @@ void Session<Stream>::awaitRequest() {
         return;
     }
     // Between requests a connection may stay silent for the keep-alive time only.
-    transport().expires_after(context_.options.keepAliveTimeout);
+    setDeadline(context_.options.keepAliveTimeout);
     stream_.async_read_some(buffer_.prepare(4096), [self = shared_from_this()](error_code ec, std::size_t n) {
         if (ec) {
             return;  // closed, timed out or the server stopped
@@ -136,7 +178,7 @@ template <class Stream>
 void Session<Stream>::readHead() {
     state_ = State::Head;
     // One deadline for the whole head, however slowly its bytes arrive.
-    transport().expires_after(context_.options.readTimeout);
+    setDeadline(context_.options.readTimeout);
     beasthttp::async_read_header(stream_, buffer_, *parser_,
                                  [self = shared_from_this()](error_code ec, std::size_t) { self->onHead(ec); });
 }
@@ -198,10 +240,10 @@ void Session<Stream>::checkLogin() {
 template <class Stream>
 void Session<Stream>::checkSystemLogin(std::string user, std::string password) {
     state_ = State::LoginCheck;
-    transport().expires_never();
+    clearDeadline();
     auto check = [self = shared_from_this(), user = std::move(user), password = std::move(password)]() mutable {
-        asio::post(*self->context_.workers, [self, guard = asio::make_work_guard(self->context_.io),
-                                             user = std::move(user), password = std::move(password)]() mutable {
+        self->context_.workers->post([self, guard = asio::make_work_guard(self->context_.io),
+                                      user = std::move(user), password = std::move(password)]() mutable {
             const bool accepted = self->context_.options.pam->check(user, password);
             asio::io_context& io = self->context_.io;
             asio::post(io, [self = std::move(self), guard = std::move(guard), user = std::move(user),
@@ -276,7 +318,7 @@ template <class Stream>
 void Session<Stream>::acceptBody() {
     const std::string* expect = request_.header("Expect");
     if (expect != nullptr && sameText(*expect, "100-continue") && !parser_->is_done()) {
-        transport().expires_after(context_.options.writeTimeout);
+        setDeadline(context_.options.writeTimeout);
         asio::async_write(stream_, asio::buffer(kContinue.data(), kContinue.size()),
                           [self = shared_from_this()](error_code written, std::size_t) {
                               if (!written) {
@@ -291,7 +333,7 @@ void Session<Stream>::acceptBody() {
 template <class Stream>
 void Session<Stream>::readBody() {
     state_ = State::Body;
-    transport().expires_after(context_.options.readTimeout);
+    setDeadline(context_.options.readTimeout);
     beasthttp::async_read(stream_, buffer_, *parser_,
                           [self = shared_from_this()](error_code ec, std::size_t) { self->onBody(ec); });
 }
@@ -310,13 +352,20 @@ void Session<Stream>::onBody(error_code ec) {
 template <class Stream>
 void Session<Stream>::work() {
     state_ = State::Working;
-    transport().expires_never();
+    clearDeadline();
     std::shared_ptr<StreamChannel> channel = parser_->version() == 11 ? openStream() : nullptr;
     request_.stream = channel.get();
-    // The worker reads request_ while this connection waits; nothing else touches it.
-    asio::post(*context_.workers, [self = shared_from_this(), channel = std::move(channel),
-                                   guard = asio::make_work_guard(context_.io)]() mutable {
-        Response response = callHandler(self->context_.handler, self->request_);
+    // The worker reads request_ while this connection waits; nothing else touches it (until
+    // an early answer, after which the handler no longer reads it).
+    context_.workers->post([self = shared_from_this(), channel = std::move(channel),
+                            guard = asio::make_work_guard(context_.io)]() mutable {
+        if (channel) {
+            channel->runOn(*self->context_.workers, WorkerPool::current());
+        }
+        Response response = callHandler(self->context_.handler, self->request_, channel.get());
+        if (channel && !channel->settle()) {
+            return;  // answered early: what the handler returned is dropped
+        }
         asio::io_context& io = self->context_.io;
         if (channel && channel->begun()) {
             // The I/O thread writes what is left and the last chunk; this post keeps the
@@ -344,12 +393,17 @@ void Session<Stream>::refuse(int code) {
 }
 
 template <class Stream>
-template <class Message>
-void Session<Stream>::prepareHead(Message& message, Response& response, bool keepAlive) {
+void Session<Stream>::countServed(const Response& response) {
     ++served_;
     if (context_.accessLog) {
         context_.accessLog(request_, response);
     }
+}
+
+template <class Stream>
+template <class Message>
+void Session<Stream>::prepareHead(Message& message, Response& response, bool keepAlive) {
+    countServed(response);
     // Named, not "= {}": clang 14 leaves the destructor of a temporary made from an empty
     // braced list undefined inside an explicitly instantiated template (a link error).
     message = Message{};
@@ -367,14 +421,17 @@ void Session<Stream>::prepareHead(Message& message, Response& response, bool kee
     message.keep_alive(keepAlive);
 }
 
+// Head and body leave in one write.
 template <class Stream>
 void Session<Stream>::reply(Response response, bool keepAlive) {
-    prepareHead(response_, response, keepAlive);
-    response_.body() = std::move(response.body);
-    response_.prepare_payload();
+    countServed(response);
+    const unsigned version = parser_ && parser_->version() == 10 ? 10 : 11;
+    responseHead_ = responseHead(version, response, keepAlive, context_.options.serverName);
+    responseBody_ = std::move(response.body);
     state_ = State::Writing;
-    transport().expires_after(context_.options.writeTimeout);
-    beasthttp::async_write(stream_, response_, [self = shared_from_this(), keepAlive](error_code ec, std::size_t) {
+    setDeadline(context_.options.writeTimeout);
+    const std::array<asio::const_buffer, 2> pieces{asio::buffer(responseHead_), asio::buffer(responseBody_)};
+    asio::async_write(stream_, pieces, [self = shared_from_this(), keepAlive](error_code ec, std::size_t) {
         self->onWritten(ec, keepAlive);
     });
 }
@@ -401,6 +458,10 @@ void Session<Stream>::pumpStream() {
         return;  // no body streamed now, or the write in flight pumps again when done
     }
     StreamChannel::Batch batch = channel_->take();
+    if (batch.whole) {
+        finish(std::move(*batch.whole));  // answered early, while the handler goes on
+        return;
+    }
     if (batch.aborted) {
         streamFailed();
         return;
@@ -420,7 +481,7 @@ void Session<Stream>::startStream(Response head, std::string data, bool last) {
     headWriter_.emplace(streamHead_);
     state_ = State::Writing;
     chunkInFlight_ = true;
-    transport().expires_after(context_.options.writeTimeout);
+    setDeadline(context_.options.writeTimeout);
     beasthttp::async_write_header(stream_, *headWriter_,
                                   [self = shared_from_this(), data = std::move(data), last](error_code ec,
                                                                                            std::size_t) mutable {
@@ -443,7 +504,7 @@ void Session<Stream>::writeChunk(std::string data, bool last) {
     }
     chunk_ = std::move(data);
     chunkInFlight_ = true;
-    transport().expires_after(context_.options.writeTimeout);
+    setDeadline(context_.options.writeTimeout);
     asio::async_write(stream_, beasthttp::make_chunk(asio::buffer(chunk_)),
                       [self = shared_from_this(), last](error_code ec, std::size_t) {
                           self->chunkInFlight_ = false;
@@ -461,7 +522,7 @@ void Session<Stream>::writeChunk(std::string data, bool last) {
 template <class Stream>
 void Session<Stream>::writeLastChunk() {
     chunkInFlight_ = true;
-    transport().expires_after(context_.options.writeTimeout);
+    setDeadline(context_.options.writeTimeout);
     asio::async_write(stream_, beasthttp::make_chunk_last(), [self = shared_from_this()](error_code ec, std::size_t) {
         self->chunkInFlight_ = false;
         self->channel_.reset();
@@ -498,7 +559,7 @@ void Session<Stream>::onWritten(error_code ec, bool keepAlive) {
 template <class Stream>
 void Session<Stream>::closeGracefully() {
     state_ = State::Closing;
-    transport().expires_after(kDrainTime);
+    setDeadline(kDrainTime);
     if constexpr (kTls) {
         stream_.async_shutdown([self = shared_from_this()](error_code) { self->transport().close(); });
     } else {

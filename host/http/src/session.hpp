@@ -11,7 +11,6 @@
 #include <boost/beast/http/empty_body.hpp>
 #include <boost/beast/http/message.hpp>
 #include <boost/beast/http/serializer.hpp>
-#include <boost/beast/http/string_body.hpp>
 #include <boost/beast/ssl/ssl_stream.hpp>
 
 #include <array>
@@ -56,7 +55,8 @@ public:
         : SessionBase(std::move(address), context),
           stream_(std::forward<StreamArgs>(streamArgs)...),
           buffer_(context.options.maxHeaderBytes + 65536),
-          delay_(context.io) {}
+          delay_(context.io),
+          deadlineTimer_(context.io) {}
 
     void start();
     void stopServing() override;
@@ -68,6 +68,9 @@ private:
     static constexpr bool kTls = std::is_same_v<Stream, TlsStream>;
 
     boost::beast::tcp_stream& transport() { return boost::beast::get_lowest_layer(stream_); }
+    void setDeadline(std::chrono::steady_clock::duration timeout);
+    void clearDeadline();
+    void armDeadline();
 
     void awaitRequest();
     void readHead();
@@ -85,6 +88,7 @@ private:
     void work();
     void finish(Response response);
     void refuse(int status);
+    void countServed(const Response& response);
     template <class Message>
     void prepareHead(Message& message, Response& response, bool keepAlive);
     void reply(Response response, bool keepAlive);
@@ -104,8 +108,8 @@ private:
     boost::beast::flat_buffer buffer_;
     Request request_;
     std::optional<RequestParser> parser_;
-    using ResponseMessage = boost::beast::http::response<boost::beast::http::string_body>;
-    ResponseMessage response_;
+    std::string responseHead_;  // the whole answer being written: head, then body
+    std::string responseBody_;
     std::shared_ptr<StreamChannel> channel_;  // the streamed body in progress, if any
     boost::beast::http::response<boost::beast::http::empty_body> streamHead_;
     std::optional<boost::beast::http::response_serializer<boost::beast::http::empty_body>> headWriter_;
@@ -113,6 +117,9 @@ private:
     bool chunkInFlight_ = false;
     bool streamKeepAlive_ = false;
     boost::asio::steady_timer delay_;
+    boost::asio::steady_timer deadlineTimer_;
+    std::chrono::steady_clock::time_point deadline_ = std::chrono::steady_clock::time_point::max();
+    bool deadlineArmed_ = false;
     std::array<char, 4096> scratch_{};
     std::size_t drained_ = 0;
     std::size_t served_ = 0;

@@ -16,7 +16,7 @@ void StreamChannel::wakeLocked() {
 
 bool StreamChannel::begin(Response head) {
     std::lock_guard lock(mutex_);
-    if (begun_ || aborted_ || closed_) {
+    if (begun_ || aborted_ || closed_ || answered_) {
         return false;
     }
     begun_ = true;
@@ -27,13 +27,18 @@ bool StreamChannel::begin(Response head) {
     return true;
 }
 
-bool StreamChannel::write(std::string_view piece) {
+// A piece that finds nothing waiting is kept as it is, without a copy.
+bool StreamChannel::write(std::string piece) {
     std::unique_lock lock(mutex_);
     space_.wait(lock, [this] { return pending_.size() < limit_ || aborted_ || closed_; });
-    if (!begun_ || ended_ || aborted_ || closed_) {
+    if (!begun_ || ended_ || aborted_ || closed_ || answered_) {
         return false;
     }
-    pending_.append(piece);
+    if (pending_.empty()) {
+        pending_ = std::move(piece);
+    } else {
+        pending_.append(piece);
+    }
     wakeLocked();
     return true;
 }
@@ -55,6 +60,37 @@ bool StreamChannel::begun() const {
     return begun_;
 }
 
+bool StreamChannel::answer(Response whole) {
+    std::lock_guard lock(mutex_);
+    if (begun_ || closed_ || answered_ || settled_) {
+        return false;
+    }
+    answered_ = true;
+    whole_ = std::move(whole);
+    wakeLocked();
+    return true;
+}
+
+void StreamChannel::runOn(WorkerPool& pool, WorkerPool::Worker* worker) {
+    std::lock_guard lock(mutex_);
+    pool_ = &pool;
+    worker_ = worker;
+}
+
+// Under the lock: the handler cannot settle, so its worker is still busy with it.
+void StreamChannel::release() {
+    std::lock_guard lock(mutex_);
+    if (!settled_ && pool_ != nullptr && worker_ != nullptr) {
+        std::exchange(pool_, nullptr)->replace(worker_);
+    }
+}
+
+bool StreamChannel::settle() {
+    std::lock_guard lock(mutex_);
+    settled_ = true;
+    return !answered_;
+}
+
 void StreamChannel::end() {
     std::lock_guard lock(mutex_);
     if (!begun_ || ended_ || aborted_) {
@@ -70,6 +106,7 @@ StreamChannel::Batch StreamChannel::take() {
         std::lock_guard lock(mutex_);
         wakePending_ = false;
         batch.head = std::exchange(head_, std::nullopt);
+        batch.whole = std::exchange(whole_, std::nullopt);
         batch.data.swap(pending_);
         batch.aborted = aborted_;
         batch.last = ended_ && !aborted_;

@@ -40,7 +40,8 @@ public:
     std::string respond(const cimxml::CimRequest& request, const std::string& principal) const;
     // The same, but a large answer (EnumerateInstances) may go out on `stream` in pieces
     // while the providers run, with the status and headers of `head`: the document is
-    // then sent and the returned text is empty (see streamed_response.hpp).
+    // then sent and the returned text is empty (see streamed_response.hpp). The call runs
+    // on the calling thread; an overrun is answered through `stream` (answer, release).
     std::string respond(const cimxml::CimRequest& request, const std::string& principal,
                         http::ResponseStream& stream, const http::Response& head) const;
     // Waits for every provider call still running (overrunning ones included), then
@@ -53,8 +54,9 @@ public:
 private:
     std::string respondNow(const cimxml::CimRequest& request, const std::string& principal,
                            detail::StreamedResponse* streamed) const;
-    std::string respondWithin(const cimxml::CimRequest& request, const std::string& principal,
-                              const std::shared_ptr<detail::StreamedResponse>& streamed) const;
+    std::string respondWithin(const cimxml::CimRequest& request, const std::string& principal) const;
+    // The ERROR document of a request that overran the call limit.
+    std::string overrunAnswer(const cimxml::CimRequest& request) const;
 
     host::BrokerCore& core_;
     const repository::ClassRepository& classes_;

@@ -58,13 +58,22 @@ struct Response;
 // should stop then. abort() says the body cannot be completed: the connection closes
 // without the last chunk, so the client sees an incomplete answer, never a cut one taken
 // for whole. All three may be called from any one thread at a time.
+//
+// A handler that goes on past a deadline of its own uses the last two, from any thread:
+// answer() sends `whole` (status, headers and body) at once as the complete answer, when
+// nothing was begun and the handler has not returned; what the handler sends or returns
+// afterwards is dropped, and the connection goes on to its next request, so the handler
+// must not read its Request any more. release() hands the handler's worker over: another
+// worker takes its place at once, and this one ends when the handler returns.
 class ResponseStream {
 public:
     virtual ~ResponseStream() = default;
     virtual bool begin(Response head) = 0;
-    virtual bool write(std::string_view piece) = 0;
+    virtual bool write(std::string piece) = 0;
     virtual void abort() = 0;
     virtual bool begun() const = 0;
+    virtual bool answer(Response whole) = 0;
+    virtual void release() = 0;
 };
 
 struct Request {
