@@ -129,6 +129,24 @@ bool isKnownType(CMPIType type) noexcept {
     }
 }
 
+namespace {
+
+// storeValue for CMPI_chars (the value pointer is the text) and CMPI_string.
+CMPIrc storeText(CMPIData& out, const CMPIValue* value, CMPIType type) {
+    const void* member = value == nullptr      ? nullptr
+                         : type == CMPI_chars ? static_cast<const void*>(value)
+                                              : static_cast<const void*>(value->string);
+    if (member == nullptr) {
+        out.state = CMPI_nullValue;
+        return CMPI_RC_OK;
+    }
+    out.value.string = type == CMPI_chars ? newString(static_cast<const char*>(member), Owner::Parent)
+                                          : memberString(static_cast<const CMPIString*>(member));
+    return out.value.string != nullptr ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE;
+}
+
+}  // namespace
+
 CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
     out = CMPIData{};
     out.type = storedType(type);
@@ -140,6 +158,9 @@ CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
             std::memcpy(&out.value, value, width);
         }
         return CMPI_RC_OK;
+    }
+    if (type == CMPI_chars || type == CMPI_string) {  // then texts
+        return storeText(out, value, type);
     }
     if (!isKnownType(type)) {
         out = CMPIData{};
