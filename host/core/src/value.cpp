@@ -147,31 +147,27 @@ CMPIrc storeText(CMPIData& out, const CMPIValue* value, CMPIType type) {
 
 }  // namespace
 
-CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
-    out = CMPIData{};
-    out.type = storedType(type);
-    out.state = CMPI_goodValue;
-    if (std::size_t width = scalarWidth(type); width != 0) {  // the common case first
-        if (value == nullptr) {
-            out.state = CMPI_nullValue;
-        } else {
-            std::memcpy(&out.value, value, width);
-        }
-        return CMPI_RC_OK;
+namespace {
+
+// Copies a scalar of `width` bytes (1, 2, 4 or 8) in one fixed-size move.
+inline void copyScalar(CMPIValue& to, const CMPIValue& from, std::size_t width) noexcept {
+    switch (width) {
+    case 1: to.uint8 = from.uint8; break;
+    case 2: to.uint16 = from.uint16; break;
+    case 4: to.uint32 = from.uint32; break;
+    default: to.uint64 = from.uint64; break;
     }
-    if (type == CMPI_chars || type == CMPI_string) {  // then texts
-        return storeText(out, value, type);
-    }
+}
+
+// storeValue for everything but scalars and texts, kept apart so that the
+// common cases pay for no more than they use.
+[[gnu::noinline]] CMPIrc storeObject(CMPIData& out, const CMPIValue* value, CMPIType type) {
     if (!isKnownType(type)) {
         out = CMPIData{};
         return CMPI_RC_ERR_INVALID_DATA_TYPE;
     }
     if (type == CMPI_null || value == nullptr) {
         out.state = CMPI_nullValue;
-        return CMPI_RC_OK;
-    }
-    if (type == CMPI_chars) {
-        out.value.string = newString(reinterpret_cast<const char*>(value), Owner::Parent);
         return CMPI_RC_OK;
     }
     if (!ownsMember(type)) {  // class, ptr, charsptr: kept as given
@@ -197,6 +193,26 @@ CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
     }
     out.value.inst = static_cast<CMPIInstance*>(copy);
     return CMPI_RC_OK;
+}
+
+}  // namespace
+
+CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
+    out = CMPIData{};
+    out.type = storedType(type);
+    out.state = CMPI_goodValue;
+    if (std::size_t width = scalarWidth(type); width != 0) {  // the common case first
+        if (value == nullptr) {
+            out.state = CMPI_nullValue;
+        } else {
+            copyScalar(out.value, *value, width);
+        }
+        return CMPI_RC_OK;
+    }
+    if (type == CMPI_chars || type == CMPI_string) {  // then texts
+        return storeText(out, value, type);
+    }
+    return storeObject(out, value, type);
 }
 
 void copyValue(CMPIData& out, const CMPIData& in) {
