@@ -1,5 +1,6 @@
 #include "value.hpp"
 
+#include <algorithm>
 #include <cstring>
 
 #include "array.hpp"
@@ -274,6 +275,12 @@ void ValueList::useNameTable(const NameTable* table) {
     }
     table_ = table;
     positions_ = static_cast<std::int32_t*>(allocateObject(home_, sizeof(std::int32_t) * table->size()));
+    // Room for the declared names from the start (up to a bound: a list in a pool
+    // never gives back what it outgrows).
+    constexpr std::uint32_t kReservedNames = 64;
+    if (const std::uint32_t room = std::min(table->size(), kReservedNames); room > capacity_) {
+        reserve(room);
+    }
     indexSlots();
 }
 
@@ -306,16 +313,19 @@ void ValueList::freeEntry(NamedValue& item) noexcept {
     }
 }
 
+void ValueList::reserve(std::uint32_t capacity) {
+    auto* items = static_cast<NamedValue*>(allocateObject(home_, capacity * sizeof(NamedValue)));
+    for (std::uint32_t i = 0; i < size_; ++i) {
+        items[i] = items_[i];
+    }
+    freeObjectMemory(items_, home_);
+    items_ = items;
+    capacity_ = capacity;
+}
+
 NamedValue& ValueList::append() {
     if (size_ == capacity_) {
-        const std::uint32_t grown = capacity_ == 0 ? 8 : capacity_ * 2;
-        auto* items = static_cast<NamedValue*>(allocateObject(home_, grown * sizeof(NamedValue)));
-        for (std::uint32_t i = 0; i < size_; ++i) {
-            items[i] = items_[i];
-        }
-        freeObjectMemory(items_, home_);
-        items_ = items;
-        capacity_ = grown;
+        reserve(capacity_ == 0 ? 8 : capacity_ * 2);
     }
     items_[size_] = NamedValue{};
     return items_[size_++];

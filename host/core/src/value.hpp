@@ -127,6 +127,7 @@ private:
     // spelledAlike: set when the table spells the name the same.
     std::uint32_t slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike);
     NamedValue& append();
+    void reserve(std::uint32_t capacity);
     CMPIString* nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot, bool spelledAlike);
     void freeEntry(NamedValue& item) noexcept;
     void indexSlots() noexcept;
