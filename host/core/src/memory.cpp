@@ -101,17 +101,6 @@ Arena& ownArena() noexcept {
 
 }  // namespace
 
-void Arena::adopt(ObjectBase* object) noexcept {
-    object->arena = this;
-    object->prev = nullptr;
-    object->next = head_;
-    if (head_ != nullptr) {
-        head_->prev = object;
-    }
-    head_ = object;
-    ++count_;
-}
-
 void Arena::unlink(ObjectBase* object) noexcept {
     if (object->prev != nullptr) {
         object->prev->next = object->next;
@@ -142,14 +131,6 @@ void Arena::clearAfter(const ObjectBase* mark) noexcept {
 }
 
 Arena& threadArena() noexcept { return ownArena(); }
-
-void placeObject(ObjectBase* object, Owner owner, Arena* home) noexcept {
-    object->owner = owner;
-    object->home = home;
-    if (owner == Owner::Arena) {
-        currentArena().adopt(object);
-    }
-}
 
 bool releaseObject(ObjectBase* object) noexcept {
     if (object->released) {

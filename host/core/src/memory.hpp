@@ -88,7 +88,16 @@ public:
     Arena(const Arena&) = delete;
     Arena& operator=(const Arena&) = delete;
 
-    void adopt(ObjectBase* object) noexcept;
+    void adopt(ObjectBase* object) noexcept {
+        object->arena = this;
+        object->prev = nullptr;
+        object->next = head_;
+        if (head_ != nullptr) {
+            head_->prev = object;
+        }
+        head_ = object;
+        ++count_;
+    }
     void unlink(ObjectBase* object) noexcept;
     // Frees every object, newest first, then gives the pool back.
     void clear() noexcept;
@@ -170,7 +179,13 @@ private:
 
 // Places a new object under `owner`: Arena -> the current arena. `home` is
 // where its memory came from (homeFor(owner) when it was allocated).
-void placeObject(ObjectBase* object, Owner owner, Arena* home) noexcept;
+inline void placeObject(ObjectBase* object, Owner owner, Arena* home) noexcept {
+    object->owner = owner;
+    object->home = home;
+    if (owner == Owner::Arena) {
+        currentArena().adopt(object);
+    }
+}
 
 // The generic release: Caller objects drop their contents and leave the shell
 // to the current arena; Arena objects drop their contents; Parent objects are
