@@ -1,5 +1,7 @@
 #include "array.hpp"
 
+#include <cstring>
+
 #include "value.hpp"
 
 namespace orv::host::detail {
@@ -24,6 +26,12 @@ ArrayImpl::ArrayImpl(CMPICount count, CMPIType type)
 
 ArrayImpl::ArrayImpl(const ArrayImpl& other) : elementType(other.elementType) {
     allocate(other.size);
+    if (!ownsMember(elementType)) {  // plain values: one move
+        if (size != 0) {
+            std::memcpy(elements, other.elements, sizeof(CMPIData) * size);
+        }
+        return;
+    }
     for (CMPICount i = 0; i < size; ++i) {
         copyValue(elements[i], other.elements[i]);
     }

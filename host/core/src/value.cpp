@@ -46,24 +46,6 @@ inline std::size_t scalarWidth(CMPIType type) noexcept {
 
 }  // namespace
 
-bool ownsMember(CMPIType type) noexcept {
-    if ((type & CMPI_ARRAY) != 0) {
-        return true;
-    }
-    switch (type) {
-    case CMPI_instance:
-    case CMPI_ref:
-    case CMPI_args:
-    case CMPI_filter:
-    case CMPI_enumeration:
-    case CMPI_string:
-    case CMPI_dateTime:
-        return true;
-    default:
-        return false;
-    }
-}
-
 namespace {
 
 // A Parent-owned copy of an encapsulated input object, or nullptr when the

@@ -46,7 +46,23 @@ inline CMPIType storedType(CMPIType type) noexcept {
 }
 bool isKnownType(CMPIType type) noexcept;
 // Whether a stored value of this type owns an encapsulated member.
-bool ownsMember(CMPIType type) noexcept;
+inline bool ownsMember(CMPIType type) noexcept {
+    if ((type & CMPI_ARRAY) != 0) {
+        return true;
+    }
+    switch (type) {
+    case CMPI_instance:
+    case CMPI_ref:
+    case CMPI_args:
+    case CMPI_filter:
+    case CMPI_enumeration:
+    case CMPI_string:
+    case CMPI_dateTime:
+        return true;
+    default:
+        return false;
+    }
+}
 
 // One entry of a ValueList. The name is a string object of the list (hdl: its
 // characters), handed out as it is by the getters that report names.
