@@ -26,7 +26,9 @@ ArrayImpl::ArrayImpl(CMPICount count, CMPIType type)
 
 ArrayImpl::ArrayImpl(const ArrayImpl& other) : elementType(other.elementType) {
     allocate(other.size);
-    if (!ownsMember(elementType)) {  // plain values: one move
+    // Plain values, and the strings of an array of the same pool (which that pool's
+    // values share), are copied in one move.
+    if (!ownsMember(elementType) || (elementType == CMPI_string && home != nullptr && home == other.home)) {
         if (size != 0) {
             std::memcpy(elements, other.elements, sizeof(CMPIData) * size);
         }
