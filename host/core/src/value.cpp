@@ -366,14 +366,19 @@ void ValueList::appendDistinct(const NamedValue& source, CMPIData stored) {
 
 // Names are mostly set in the same order on every instance of a class: the
 // name set in this place last time is tried first, by its exact spelling.
-std::uint32_t ValueList::slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike) {
+inline std::uint32_t ValueList::slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike) {
     const std::uint32_t place = sets_++;
-    std::uint32_t slot = table_->guess(place);
-    if (slot != NameTable::kNone && table_->spelledAs(slot, name)) {
+    const std::uint32_t slot = table_->guess(place);
+    if (slot != NameTable::kNone && table_->spelledAs(slot, name)) [[likely]] {
         spelledAlike = true;
         return slot;
     }
-    slot = table_->find(name, source != nullptr ? source->hash : hashNoCase(name));
+    return lookUpSlot(place, name, source, spelledAlike);
+}
+
+std::uint32_t ValueList::lookUpSlot(std::uint32_t place, std::string_view name, const NamedValue* source,
+                                    bool& spelledAlike) {
+    const std::uint32_t slot = table_->find(name, source != nullptr ? source->hash : hashNoCase(name));
     if (slot != NameTable::kNone) {
         table_->learn(place, slot);
         spelledAlike = table_->spelledAs(slot, name);
@@ -383,8 +388,8 @@ std::uint32_t ValueList::slotOf(std::string_view name, const NamedValue* source,
 
 // The name string of a new entry: the table's when spelled the same, the
 // source's when it comes from the same pool, else a copy.
-CMPIString* ValueList::nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot,
-                               bool spelledAlike) {
+inline CMPIString* ValueList::nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot,
+                                      bool spelledAlike) {
     if (spelledAlike) {
         return table_->nameString(slot);
     }

@@ -142,6 +142,10 @@ private:
     // The slot of `name` in the name table, or NameTable::kNone.
     // spelledAlike: set when the table spells the name the same.
     std::uint32_t slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike);
+    // slotOf when the guess is wrong: the name looked up in the table, which
+    // learns its place.
+    std::uint32_t lookUpSlot(std::uint32_t place, std::string_view name, const NamedValue* source,
+                             bool& spelledAlike);
     NamedValue& append();
     void reserve(std::uint32_t capacity);
     CMPIString* nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot, bool spelledAlike);
