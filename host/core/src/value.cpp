@@ -233,7 +233,10 @@ ValueList::ValueList() noexcept : home_(memberHome()) {}
 
 ValueList::~ValueList() {
     for (std::uint32_t i = 0; i < size_; ++i) {
-        freeEntry(items_[i]);
+        // In a pool, an entry without a member (or with a pool string) has nothing to free.
+        if (home_ == nullptr || (ownsMember(items_[i].data.type) && items_[i].data.type != CMPI_string)) {
+            freeEntry(items_[i]);
+        }
     }
     freeObjectMemory(items_, home_);
     freeObjectMemory(positions_, home_);
