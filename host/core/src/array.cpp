@@ -102,7 +102,9 @@ CMPIStatus setElementAt(CMPIArray* array, CMPICount index, const CMPIValue* valu
     if (CMPIrc rc = storeValue(stored, value, type); rc != CMPI_RC_OK) {
         return CMPIStatus{rc, nullptr};
     }
-    retireValue(impl->elements[index]);
+    if (CMPIData& old = impl->elements[index]; old.state == CMPI_goodValue && ownsMember(old.type)) {
+        retireValue(old);  // a null element (the usual one) has nothing to retire
+    }
     impl->elements[index] = stored;
     return okStatus();
 }
