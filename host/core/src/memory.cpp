@@ -101,20 +101,6 @@ Arena& ownArena() noexcept {
 
 }  // namespace
 
-void Arena::unlink(ObjectBase* object) noexcept {
-    if (object->prev != nullptr) {
-        object->prev->next = object->next;
-    } else {
-        head_ = object->next;
-    }
-    if (object->next != nullptr) {
-        object->next->prev = object->prev;
-    }
-    object->prev = object->next = nullptr;
-    object->arena = nullptr;
-    --count_;
-}
-
 void Arena::clear() noexcept {
     clearAfter(nullptr);
     pool_.release();

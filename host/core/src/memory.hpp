@@ -98,7 +98,19 @@ public:
         head_ = object;
         ++count_;
     }
-    void unlink(ObjectBase* object) noexcept;
+    void unlink(ObjectBase* object) noexcept {
+        if (object->prev != nullptr) {
+            object->prev->next = object->next;
+        } else {
+            head_ = object->next;
+        }
+        if (object->next != nullptr) {
+            object->next->prev = object->prev;
+        }
+        object->prev = object->next = nullptr;
+        object->arena = nullptr;
+        --count_;
+    }
     // Frees every object, newest first, then gives the pool back.
     void clear() noexcept;
     // Frees the objects adopted after `mark` (a value from top()). Their pool
