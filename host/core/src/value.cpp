@@ -444,7 +444,7 @@ CMPIData ValueList::get(std::string_view name, CMPIStatus* rc, CMPIValueState mi
 // A name carved from a pool is handed out as it is (it lasts as long as the
 // pool, at least the invocation); a list on the heap hands out a copy that
 // belongs to the current arena, since the list may be released first.
-CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const {
+CMPIData ValueList::atOtherwise(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const {
     if (index >= size_) {
         setRc(rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
         if (name != nullptr) {

@@ -131,9 +131,22 @@ public:
     // Getter helpers: the value, or rc CMPI_RC_ERR_NO_SUCH_PROPERTY and a null
     // CMPIData with state CMPI_notFound (entries: CMPI_nullValue).
     CMPIData get(std::string_view name, CMPIStatus* rc, CMPIValueState missing) const;
-    CMPIData at(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const;
+    CMPIData at(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const {
+        if (index < size_ && home_ != nullptr) [[likely]] {  // the name is handed out as it is
+            if (name != nullptr) {
+                *name = items_[index].nameString;
+            }
+            if (rc != nullptr) {
+                *rc = CMPIStatus{CMPI_RC_OK, nullptr};
+            }
+            return items_[index].data;
+        }
+        return atOtherwise(index, name, rc, missing);
+    }
 
 private:
+    // at() past the end or for a list on the heap.
+    CMPIData atOtherwise(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const;
     // The entry named `name`, whose hashNoCase is `hash`, or null.
     NamedValue* findHashed(std::string_view name, std::uint32_t hash) const noexcept;
     // Stores `stored` under `name` (source: an entry of another list with that
