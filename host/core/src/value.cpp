@@ -132,13 +132,14 @@ CMPIrc storeText(CMPIData& out, const CMPIValue* value, CMPIType type) {
 
 namespace {
 
-// Copies a scalar of `width` bytes (1, 2, 4 or 8) in one fixed-size move.
-inline void copyScalar(CMPIValue& to, const CMPIValue& from, std::size_t width) noexcept {
+// Copies a scalar of `width` bytes (1, 2, 4 or 8) in one fixed-size move. The
+// input may be any variable of the type, aligned for that type only.
+inline void copyScalar(CMPIValue& to, const void* from, std::size_t width) noexcept {
     switch (width) {
-    case 1: to.uint8 = from.uint8; break;
-    case 2: to.uint16 = from.uint16; break;
-    case 4: to.uint32 = from.uint32; break;
-    default: to.uint64 = from.uint64; break;
+    case 1: std::memcpy(&to, from, 1); break;
+    case 2: std::memcpy(&to, from, 2); break;
+    case 4: std::memcpy(&to, from, 4); break;
+    default: std::memcpy(&to, from, 8); break;
     }
 }
 
@@ -188,7 +189,7 @@ CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
         if (value == nullptr) {
             out.state = CMPI_nullValue;
         } else {
-            copyScalar(out.value, *value, width);
+            copyScalar(out.value, value, width);
         }
         return CMPI_RC_OK;
     }
