@@ -4,10 +4,6 @@
 
 namespace cmpibinding {
 
-void throwOnError(const CMPIStatus& st) {
-    if (st.rc != CMPI_RC_OK) {
-        throw CmpiStatus(st);
-    }
-}
+void throwStatus(const CMPIStatus& st) { throw CmpiStatus(st); }
 
 }  // namespace cmpibinding

@@ -9,8 +9,14 @@ namespace cmpibinding {
 // A status to be filled by a broker call.
 inline CMPIStatus freshStatus() { return CMPIStatus{CMPI_RC_OK, nullptr}; }
 
-// Throws the status as CmpiStatus unless it is OK.
-void throwOnError(const CMPIStatus& st);
+// Throws the status as CmpiStatus.
+[[noreturn]] void throwStatus(const CMPIStatus& st);
+// Throws the status as CmpiStatus unless it is OK (the test inline, the throw not).
+inline void throwOnError(const CMPIStatus& st) {
+    if (st.rc != CMPI_RC_OK) [[unlikely]] {
+        throwStatus(st);
+    }
+}
 
 // Runs a broker call that reports through a status pointer, throws its
 // status unless OK, and returns its result.

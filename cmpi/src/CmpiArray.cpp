@@ -9,7 +9,6 @@
 #include "GlobalBroker.h"
 
 using cmpibinding::checked;
-using cmpibinding::throwOnError;
 
 namespace {
 
@@ -35,12 +34,23 @@ CMPIType CmpiArray::getSimpleType() const {
     return checked([&](CMPIStatus* st) { return a->ft->getSimpleType(a, st); });
 }
 
+// The value's type must be the element type. Brokers store a value of any other
+// type only when it is CMPI_chars or CMPI_null (as a string, as a null element),
+// so those two are checked first; for the others the broker's own check is
+// enough, and a failed store is answered as a mismatch when the types differ.
 CmpiArrayIdx& CmpiArrayIdx::operator=(const CmpiData& v) {
-    if (array_.getSimpleType() != v.getType()) {
+    const CMPIType type = v.getType();
+    if ((type == CMPI_chars || type == CMPI_null) && array_.getSimpleType() != type) {
         throw CmpiStatus(CMPI_RC_ERR_TYPE_MISMATCH);
     }
     CMPIArray* a = array_.getEnc();
-    throwOnError(a->ft->setElementAt(a, index_, &v.getEncData().value, v.getType()));
+    const CMPIStatus st = a->ft->setElementAt(a, index_, &v.getEncData().value, type);
+    if (st.rc != CMPI_RC_OK) [[unlikely]] {
+        if (array_.getSimpleType() != type) {
+            throw CmpiStatus(CMPI_RC_ERR_TYPE_MISMATCH);
+        }
+        cmpibinding::throwStatus(st);
+    }
     return *this;
 }
 

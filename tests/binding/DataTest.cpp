@@ -96,4 +96,18 @@ TEST_F(DataTest, ArrayElementOfAnotherTypeIsRefused) {
     EXPECT_EQ(CMPIUint32(numbers[0]), 4u);
 }
 
+TEST_F(DataTest, ArrayElementOfAnotherTypeIsRefusedBeforeItsIndexIsChecked) {
+    CmpiArray numbers(1, CMPI_uint32);
+    EXPECT_EQ(thrownCode([&] { numbers[5] = CmpiData(CMPIUint64(1)); }), CMPI_RC_ERR_TYPE_MISMATCH);
+    EXPECT_EQ(thrownCode([&] { numbers[5] = CmpiData(CMPIUint32(1)); }), CMPI_RC_ERR_NO_SUCH_PROPERTY);
+}
+
+TEST_F(DataTest, CharsAndNullValuesAreRefusedByATypedArray) {
+    CmpiArray names(1, CMPI_string);
+    names[0] = CmpiData(CmpiString("kept"));
+    EXPECT_EQ(thrownCode([&] { names[0] = CmpiData("text"); }), CMPI_RC_ERR_TYPE_MISMATCH);
+    EXPECT_EQ(thrownCode([&] { names[0] = CmpiData(); }), CMPI_RC_ERR_TYPE_MISMATCH);
+    EXPECT_STREQ(static_cast<const char*>(names[0]), "kept");
+}
+
 }  // namespace

@@ -172,6 +172,18 @@ TEST_F(TypesTest, ArraySlotsAndTypeChecks) {
               CMPI_RC_OK);
 }
 
+TEST_F(TypesTest, AStringStoredAndThenReleasedStillReadsWhereItWasStored) {
+    CMPIString* name = mb()->eft->newString(mb(), "kept", nullptr);
+    const auto* value = reinterpret_cast<const CMPIValue*>(&name);
+    CMPIArray* array = mb()->eft->newArray(mb(), 1, CMPI_string, nullptr);
+    ASSERT_EQ(array->ft->setElementAt(array, 0, value, CMPI_string).rc, CMPI_RC_OK);
+    CMPIInstance* inst = mb()->eft->newInstance(mb(), path("Raw_Element"), nullptr);
+    ASSERT_EQ(inst->ft->setProperty(inst, "Name", value, CMPI_string).rc, CMPI_RC_OK);
+    EXPECT_EQ(name->ft->release(name).rc, CMPI_RC_OK);
+    EXPECT_EQ(text(array->ft->getElementAt(array, 0, nullptr).value.string), "kept");
+    EXPECT_EQ(text(inst->ft->getProperty(inst, "Name", nullptr).value.string), "kept");
+}
+
 TEST_F(TypesTest, EnumerationSlots) {
     CMPIEnumeration* en = mb()->bft->enumerateInstances(mb(), nullptr, path("Raw_SubElement"), nullptr, nullptr);
     ASSERT_NE(en, nullptr);

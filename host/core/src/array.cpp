@@ -1,5 +1,7 @@
 #include "array.hpp"
 
+#include <cstring>
+
 #include "value.hpp"
 
 namespace orv::host::detail {
@@ -24,6 +26,14 @@ ArrayImpl::ArrayImpl(CMPICount count, CMPIType type)
 
 ArrayImpl::ArrayImpl(const ArrayImpl& other) : elementType(other.elementType) {
     allocate(other.size);
+    // Plain values, and the strings of an array of the same pool (which that pool's
+    // values share), are copied in one move.
+    if (!ownsMember(elementType) || (elementType == CMPI_string && home != nullptr && home == other.home)) {
+        if (size != 0) {
+            std::memcpy(elements, other.elements, sizeof(CMPIData) * size);
+        }
+        return;
+    }
     for (CMPICount i = 0; i < size; ++i) {
         copyValue(elements[i], other.elements[i]);
     }
@@ -92,7 +102,9 @@ CMPIStatus setElementAt(CMPIArray* array, CMPICount index, const CMPIValue* valu
     if (CMPIrc rc = storeValue(stored, value, type); rc != CMPI_RC_OK) {
         return CMPIStatus{rc, nullptr};
     }
-    retireValue(impl->elements[index]);
+    if (CMPIData& old = impl->elements[index]; old.state == CMPI_goodValue && ownsMember(old.type)) {
+        retireValue(old);  // a null element (the usual one) has nothing to retire
+    }
     impl->elements[index] = stored;
     return okStatus();
 }

@@ -101,31 +101,6 @@ Arena& ownArena() noexcept {
 
 }  // namespace
 
-void Arena::adopt(ObjectBase* object) noexcept {
-    object->arena = this;
-    object->prev = nullptr;
-    object->next = head_;
-    if (head_ != nullptr) {
-        head_->prev = object;
-    }
-    head_ = object;
-    ++count_;
-}
-
-void Arena::unlink(ObjectBase* object) noexcept {
-    if (object->prev != nullptr) {
-        object->prev->next = object->next;
-    } else {
-        head_ = object->next;
-    }
-    if (object->next != nullptr) {
-        object->next->prev = object->prev;
-    }
-    object->prev = object->next = nullptr;
-    object->arena = nullptr;
-    --count_;
-}
-
 void Arena::clear() noexcept {
     clearAfter(nullptr);
     pool_.release();
@@ -142,14 +117,6 @@ void Arena::clearAfter(const ObjectBase* mark) noexcept {
 }
 
 Arena& threadArena() noexcept { return ownArena(); }
-
-void placeObject(ObjectBase* object, Owner owner, Arena* home) noexcept {
-    object->owner = owner;
-    object->home = home;
-    if (owner == Owner::Arena) {
-        currentArena().adopt(object);
-    }
-}
 
 bool releaseObject(ObjectBase* object) noexcept {
     if (object->released) {

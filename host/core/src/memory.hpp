@@ -88,8 +88,29 @@ public:
     Arena(const Arena&) = delete;
     Arena& operator=(const Arena&) = delete;
 
-    void adopt(ObjectBase* object) noexcept;
-    void unlink(ObjectBase* object) noexcept;
+    void adopt(ObjectBase* object) noexcept {
+        object->arena = this;
+        object->prev = nullptr;
+        object->next = head_;
+        if (head_ != nullptr) {
+            head_->prev = object;
+        }
+        head_ = object;
+        ++count_;
+    }
+    void unlink(ObjectBase* object) noexcept {
+        if (object->prev != nullptr) {
+            object->prev->next = object->next;
+        } else {
+            head_ = object->next;
+        }
+        if (object->next != nullptr) {
+            object->next->prev = object->prev;
+        }
+        object->prev = object->next = nullptr;
+        object->arena = nullptr;
+        --count_;
+    }
     // Frees every object, newest first, then gives the pool back.
     void clear() noexcept;
     // Frees the objects adopted after `mark` (a value from top()). Their pool
@@ -170,7 +191,13 @@ private:
 
 // Places a new object under `owner`: Arena -> the current arena. `home` is
 // where its memory came from (homeFor(owner) when it was allocated).
-void placeObject(ObjectBase* object, Owner owner, Arena* home) noexcept;
+inline void placeObject(ObjectBase* object, Owner owner, Arena* home) noexcept {
+    object->owner = owner;
+    object->home = home;
+    if (owner == Owner::Arena) {
+        currentArena().adopt(object);
+    }
+}
 
 // The generic release: Caller objects drop their contents and leave the shell
 // to the current arena; Arena objects drop their contents; Parent objects are

@@ -4,8 +4,6 @@
 
 namespace orv::host::detail {
 
-CMPIStatus okStatus() noexcept { return CMPIStatus{CMPI_RC_OK, nullptr}; }
-
 CMPIStatus makeStatus(CMPIrc rc, const char* message) {
     CMPIStatus status{rc, nullptr};
     if (message != nullptr) {

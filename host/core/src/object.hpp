@@ -66,7 +66,7 @@ Impl* implOf(const Pub* pub, const FT* ft) noexcept {
 }
 
 // Status helpers. The message string belongs to the current arena.
-CMPIStatus okStatus() noexcept;
+inline CMPIStatus okStatus() noexcept { return CMPIStatus{CMPI_RC_OK, nullptr}; }
 CMPIStatus makeStatus(CMPIrc rc, const char* message = nullptr);
 inline void setRc(CMPIStatus* rc, CMPIrc code) noexcept {
     if (rc != nullptr) {

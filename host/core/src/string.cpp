@@ -72,14 +72,23 @@ CMPIString* newString(std::string_view text, Owner owner) {
 
 // A string a parent owns is never released or changed, and its pool memory
 // lasts as long as the pool: another value of the same pool may refer to it.
+// A string the current arena owns and whose memory is in the same pool becomes
+// such a string instead of being copied: releasing it afterwards does nothing,
+// and its text stays as long as the pool, as a copy's would.
 CMPIString* memberString(const CMPIString* string) {
     StringObject* object = stringObject(string);
     if (object == nullptr) {
         return nullptr;
     }
     Arena* home = memberHome();
-    if (home != nullptr && object->home == home && object->owner == Owner::Parent) {
-        return const_cast<CMPIString*>(string);
+    if (home != nullptr && object->home == home) {
+        if (object->owner == Owner::Arena && object->arena == home && tlsCurrentArena == home) {
+            home->unlink(object);
+            object->owner = Owner::Parent;
+        }
+        if (object->owner == Owner::Parent) {
+            return const_cast<CMPIString*>(string);
+        }
     }
     return newString(std::string_view(object->text(), object->length), Owner::Parent);
 }

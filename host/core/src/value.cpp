@@ -1,5 +1,6 @@
 #include "value.hpp"
 
+#include <algorithm>
 #include <cstring>
 
 #include "array.hpp"
@@ -44,24 +45,6 @@ inline std::size_t scalarWidth(CMPIType type) noexcept {
 }
 
 }  // namespace
-
-bool ownsMember(CMPIType type) noexcept {
-    if ((type & CMPI_ARRAY) != 0) {
-        return true;
-    }
-    switch (type) {
-    case CMPI_instance:
-    case CMPI_ref:
-    case CMPI_args:
-    case CMPI_filter:
-    case CMPI_enumeration:
-    case CMPI_string:
-    case CMPI_dateTime:
-        return true;
-    default:
-        return false;
-    }
-}
 
 namespace {
 
@@ -129,28 +112,46 @@ bool isKnownType(CMPIType type) noexcept {
     }
 }
 
-CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
-    out = CMPIData{};
-    out.type = storedType(type);
-    out.state = CMPI_goodValue;
-    if (std::size_t width = scalarWidth(type); width != 0) {  // the common case first
-        if (value == nullptr) {
-            out.state = CMPI_nullValue;
-        } else {
-            std::memcpy(&out.value, value, width);
-        }
+namespace {
+
+// storeValue for CMPI_chars (the value pointer is the text) and CMPI_string.
+CMPIrc storeText(CMPIData& out, const CMPIValue* value, CMPIType type) {
+    const void* member = value == nullptr      ? nullptr
+                         : type == CMPI_chars ? static_cast<const void*>(value)
+                                              : static_cast<const void*>(value->string);
+    if (member == nullptr) {
+        out.state = CMPI_nullValue;
         return CMPI_RC_OK;
     }
+    out.value.string = type == CMPI_chars ? newString(static_cast<const char*>(member), Owner::Parent)
+                                          : memberString(static_cast<const CMPIString*>(member));
+    return out.value.string != nullptr ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_HANDLE;
+}
+
+}  // namespace
+
+namespace {
+
+// Copies a scalar of `width` bytes (1, 2, 4 or 8) in one fixed-size move. The
+// input may be any variable of the type, aligned for that type only.
+inline void copyScalar(CMPIValue& to, const void* from, std::size_t width) noexcept {
+    switch (width) {
+    case 1: std::memcpy(&to, from, 1); break;
+    case 2: std::memcpy(&to, from, 2); break;
+    case 4: std::memcpy(&to, from, 4); break;
+    default: std::memcpy(&to, from, 8); break;
+    }
+}
+
+// storeValue for everything but scalars and texts, kept apart so that the
+// common cases pay for no more than they use.
+[[gnu::noinline]] CMPIrc storeObject(CMPIData& out, const CMPIValue* value, CMPIType type) {
     if (!isKnownType(type)) {
         out = CMPIData{};
         return CMPI_RC_ERR_INVALID_DATA_TYPE;
     }
     if (type == CMPI_null || value == nullptr) {
         out.state = CMPI_nullValue;
-        return CMPI_RC_OK;
-    }
-    if (type == CMPI_chars) {
-        out.value.string = newString(reinterpret_cast<const char*>(value), Owner::Parent);
         return CMPI_RC_OK;
     }
     if (!ownsMember(type)) {  // class, ptr, charsptr: kept as given
@@ -176,6 +177,26 @@ CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
     }
     out.value.inst = static_cast<CMPIInstance*>(copy);
     return CMPI_RC_OK;
+}
+
+}  // namespace
+
+CMPIrc storeValue(CMPIData& out, const CMPIValue* value, CMPIType type) {
+    out = CMPIData{};
+    out.type = storedType(type);
+    out.state = CMPI_goodValue;
+    if (std::size_t width = scalarWidth(type); width != 0) {  // the common case first
+        if (value == nullptr) {
+            out.state = CMPI_nullValue;
+        } else {
+            copyScalar(out.value, value, width);
+        }
+        return CMPI_RC_OK;
+    }
+    if (type == CMPI_chars || type == CMPI_string) {  // then texts
+        return storeText(out, value, type);
+    }
+    return storeObject(out, value, type);
 }
 
 void copyValue(CMPIData& out, const CMPIData& in) {
@@ -213,7 +234,10 @@ ValueList::ValueList() noexcept : home_(memberHome()) {}
 
 ValueList::~ValueList() {
     for (std::uint32_t i = 0; i < size_; ++i) {
-        freeEntry(items_[i]);
+        // In a pool, an entry without a member (or with a pool string) has nothing to free.
+        if (home_ == nullptr || (ownsMember(items_[i].data.type) && items_[i].data.type != CMPI_string)) {
+            freeEntry(items_[i]);
+        }
     }
     freeObjectMemory(items_, home_);
     freeObjectMemory(positions_, home_);
@@ -237,6 +261,12 @@ void ValueList::useNameTable(const NameTable* table) {
     }
     table_ = table;
     positions_ = static_cast<std::int32_t*>(allocateObject(home_, sizeof(std::int32_t) * table->size()));
+    // Room for the declared names from the start (up to a bound: a list in a pool
+    // never gives back what it outgrows).
+    constexpr std::uint32_t kReservedNames = 64;
+    if (const std::uint32_t room = std::min(table->size(), kReservedNames); room > capacity_) {
+        reserve(room);
+    }
     indexSlots();
 }
 
@@ -269,16 +299,19 @@ void ValueList::freeEntry(NamedValue& item) noexcept {
     }
 }
 
+void ValueList::reserve(std::uint32_t capacity) {
+    auto* items = static_cast<NamedValue*>(allocateObject(home_, capacity * sizeof(NamedValue)));
+    for (std::uint32_t i = 0; i < size_; ++i) {
+        items[i] = items_[i];
+    }
+    freeObjectMemory(items_, home_);
+    items_ = items;
+    capacity_ = capacity;
+}
+
 NamedValue& ValueList::append() {
     if (size_ == capacity_) {
-        const std::uint32_t grown = capacity_ == 0 ? 8 : capacity_ * 2;
-        auto* items = static_cast<NamedValue*>(allocateObject(home_, grown * sizeof(NamedValue)));
-        for (std::uint32_t i = 0; i < size_; ++i) {
-            items[i] = items_[i];
-        }
-        freeObjectMemory(items_, home_);
-        items_ = items;
-        capacity_ = grown;
+        reserve(capacity_ == 0 ? 8 : capacity_ * 2);
     }
     items_[size_] = NamedValue{};
     return items_[size_++];
@@ -337,14 +370,19 @@ void ValueList::appendDistinct(const NamedValue& source, CMPIData stored) {
 
 // Names are mostly set in the same order on every instance of a class: the
 // name set in this place last time is tried first, by its exact spelling.
-std::uint32_t ValueList::slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike) {
+inline std::uint32_t ValueList::slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike) {
     const std::uint32_t place = sets_++;
-    std::uint32_t slot = table_->guess(place);
-    if (slot != NameTable::kNone && table_->spelledAs(slot, name)) {
+    const std::uint32_t slot = table_->guess(place);
+    if (slot != NameTable::kNone && table_->spelledAs(slot, name)) [[likely]] {
         spelledAlike = true;
         return slot;
     }
-    slot = table_->find(name, source != nullptr ? source->hash : hashNoCase(name));
+    return lookUpSlot(place, name, source, spelledAlike);
+}
+
+std::uint32_t ValueList::lookUpSlot(std::uint32_t place, std::string_view name, const NamedValue* source,
+                                    bool& spelledAlike) {
+    const std::uint32_t slot = table_->find(name, source != nullptr ? source->hash : hashNoCase(name));
     if (slot != NameTable::kNone) {
         table_->learn(place, slot);
         spelledAlike = table_->spelledAs(slot, name);
@@ -354,8 +392,8 @@ std::uint32_t ValueList::slotOf(std::string_view name, const NamedValue* source,
 
 // The name string of a new entry: the table's when spelled the same, the
 // source's when it comes from the same pool, else a copy.
-CMPIString* ValueList::nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot,
-                               bool spelledAlike) {
+inline CMPIString* ValueList::nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot,
+                                      bool spelledAlike) {
     if (spelledAlike) {
         return table_->nameString(slot);
     }
@@ -407,7 +445,7 @@ CMPIData ValueList::get(std::string_view name, CMPIStatus* rc, CMPIValueState mi
 // A name carved from a pool is handed out as it is (it lasts as long as the
 // pool, at least the invocation); a list on the heap hands out a copy that
 // belongs to the current arena, since the list may be released first.
-CMPIData ValueList::at(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const {
+CMPIData ValueList::atOtherwise(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const {
     if (index >= size_) {
         setRc(rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
         if (name != nullptr) {

@@ -46,7 +46,23 @@ inline CMPIType storedType(CMPIType type) noexcept {
 }
 bool isKnownType(CMPIType type) noexcept;
 // Whether a stored value of this type owns an encapsulated member.
-bool ownsMember(CMPIType type) noexcept;
+inline bool ownsMember(CMPIType type) noexcept {
+    if ((type & CMPI_ARRAY) != 0) {
+        return true;
+    }
+    switch (type) {
+    case CMPI_instance:
+    case CMPI_ref:
+    case CMPI_args:
+    case CMPI_filter:
+    case CMPI_enumeration:
+    case CMPI_string:
+    case CMPI_dateTime:
+        return true;
+    default:
+        return false;
+    }
+}
 
 // One entry of a ValueList. The name is a string object of the list (hdl: its
 // characters), handed out as it is by the getters that report names.
@@ -115,9 +131,22 @@ public:
     // Getter helpers: the value, or rc CMPI_RC_ERR_NO_SUCH_PROPERTY and a null
     // CMPIData with state CMPI_notFound (entries: CMPI_nullValue).
     CMPIData get(std::string_view name, CMPIStatus* rc, CMPIValueState missing) const;
-    CMPIData at(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const;
+    CMPIData at(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const {
+        if (index < size_ && home_ != nullptr) [[likely]] {  // the name is handed out as it is
+            if (name != nullptr) {
+                *name = items_[index].nameString;
+            }
+            if (rc != nullptr) {
+                *rc = CMPIStatus{CMPI_RC_OK, nullptr};
+            }
+            return items_[index].data;
+        }
+        return atOtherwise(index, name, rc, missing);
+    }
 
 private:
+    // at() past the end or for a list on the heap.
+    CMPIData atOtherwise(CMPICount index, CMPIString** name, CMPIStatus* rc, CMPIValueState missing) const;
     // The entry named `name`, whose hashNoCase is `hash`, or null.
     NamedValue* findHashed(std::string_view name, std::uint32_t hash) const noexcept;
     // Stores `stored` under `name` (source: an entry of another list with that
@@ -126,7 +155,12 @@ private:
     // The slot of `name` in the name table, or NameTable::kNone.
     // spelledAlike: set when the table spells the name the same.
     std::uint32_t slotOf(std::string_view name, const NamedValue* source, bool& spelledAlike);
+    // slotOf when the guess is wrong: the name looked up in the table, which
+    // learns its place.
+    std::uint32_t lookUpSlot(std::uint32_t place, std::string_view name, const NamedValue* source,
+                             bool& spelledAlike);
     NamedValue& append();
+    void reserve(std::uint32_t capacity);
     CMPIString* nameFor(std::string_view name, const NamedValue* source, std::uint32_t slot, bool spelledAlike);
     void freeEntry(NamedValue& item) noexcept;
     void indexSlots() noexcept;
