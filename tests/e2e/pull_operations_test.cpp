@@ -83,7 +83,7 @@ protected:
             } else if (child->name == "IRETURNVALUE") {
                 EXPECT_FALSE(seenParam) << "IRETURNVALUE after a PARAMVALUE";
                 for (const auto& object : child->children) {
-                    answer.objects.push_back(object.get());
+                    answer.objects.push_back(object);
                 }
             } else {
                 ASSERT_EQ(child->name, "PARAMVALUE");
@@ -120,7 +120,7 @@ protected:
         }
         out += ">" + element->text;
         for (const auto& child : element->children) {
-            out += flat(child.get());
+            out += flat(child);
         }
         return out + "</>";
     }
@@ -140,7 +140,7 @@ protected:
             return "";
         }
         for (const auto& child : object->children) {
-            if (std::string name = nameOf(child.get()); !name.empty()) {
+            if (std::string name = nameOf(child); !name.empty()) {
                 return name;
             }
         }

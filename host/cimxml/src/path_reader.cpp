@@ -197,7 +197,7 @@ const XmlElement* propertyValue(const XmlElement& property) {
         if (found != nullptr) {
             invalid(*child, "more than one value");
         }
-        found = child.get();
+        found = child;
     }
     return found;
 }

@@ -115,7 +115,7 @@ void readSimpleRequest(const XmlElement& simple, CimRequest& request) {
         if (call != nullptr) {
             invalid(*child, "more than one method call");
         }
-        call = child.get();
+        call = child;
     }
     if (call == nullptr) {
         invalid(simple, "no method call");

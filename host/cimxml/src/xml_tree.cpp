@@ -4,11 +4,37 @@
 
 #include <expat.h>
 
-#include <algorithm>
 #include <climits>
+#include <algorithm>
 #include <random>
 
 namespace orv::cimxml {
+
+// Blocks of elements that double in size up to a cap: a small request takes one
+// allocation for all its elements.
+class XmlElement::NodeStore {
+public:
+    XmlElement* add() {
+        if (used_ == blockSize_ || blocks_.empty()) {
+            if (!blocks_.empty() && blockSize_ < kLargestBlock) {
+                blockSize_ *= 2;
+            }
+            blocks_.push_back(std::make_unique<XmlElement[]>(blockSize_));
+            used_ = 0;
+        }
+        return &blocks_.back()[used_++];
+    }
+
+private:
+    static constexpr std::size_t kFirstBlock = 24;
+    static constexpr std::size_t kLargestBlock = 1024;
+    std::vector<std::unique_ptr<XmlElement[]>> blocks_;
+    std::size_t blockSize_ = kFirstBlock;
+    std::size_t used_ = 0;
+};
+
+XmlElement::XmlElement() = default;
+XmlElement::~XmlElement() = default;
 
 const std::string* XmlElement::attribute(std::string_view key) const noexcept {
     for (const auto& [attrName, value] : attributes) {
@@ -20,9 +46,9 @@ const std::string* XmlElement::attribute(std::string_view key) const noexcept {
 }
 
 const XmlElement* XmlElement::child(std::string_view childName) const noexcept {
-    for (const auto& element : children) {
+    for (const XmlElement* element : children) {
         if (element->name == childName) {
-            return element.get();
+            return element;
         }
     }
     return nullptr;
@@ -45,19 +71,30 @@ public:
             fail("too many elements");
             return;
         }
-        auto element = std::make_unique<XmlElement>();
+        XmlElement* element = newElement();
         element->name = name;
         element->line = lineHere();
-        for (std::size_t i = 0; attrs[i] != nullptr; i += 2) {
+        std::size_t count = 0;
+        while (attrs[count] != nullptr) {
+            count += 2;
+        }
+        element->attributes.reserve(count / 2);
+        for (std::size_t i = 0; i < count; i += 2) {
             element->attributes.emplace_back(attrs[i], fromControlPictures(attrs[i + 1]));
         }
-        XmlElement* raw = element.get();
+        stack_.push_back(element);
+    }
+
+    // The root owns the node store the elements below it live in.
+    XmlElement* newElement() {
         if (stack_.empty()) {
-            root_ = std::move(element);
-        } else {
-            stack_.back()->children.push_back(std::move(element));
+            root_ = std::make_unique<XmlElement>();
+            root_->nodes = std::make_unique<XmlElement::NodeStore>();
+            return root_.get();
         }
-        stack_.push_back(raw);
+        XmlElement* element = root_->nodes->add();
+        stack_.back()->children.push_back(element);
+        return element;
     }
 
     void end() {
@@ -97,7 +134,10 @@ public:
     // Line breaks as XML counts them: LF, CR LF and a CR alone. A piece ends before the
     // '<' of an element, so a CR at its end stands alone.
     static int lineBreaks(std::string_view text) {
-        int breaks = static_cast<int>(std::count(text.begin(), text.end(), '\n'));
+        int breaks = 0;
+        for (std::size_t at = text.find('\n'); at != std::string_view::npos; at = text.find('\n', at + 1)) {
+            ++breaks;
+        }
         for (std::size_t at = text.find('\r'); at != std::string_view::npos; at = text.find('\r', at + 1)) {
             if (at + 1 >= text.size() || text[at + 1] != '\n') {
                 ++breaks;

@@ -49,7 +49,7 @@ const XmlElement& newIndicationParameter(const XmlElement& call) {
             throw ProtocolError(ProtocolError::Kind::NotValid, "unexpected " + child->name + " in EXPMETHODCALL");
         }
         if (requireAttribute(*child, "NAME") == "NewIndication") {
-            found = child.get();
+            found = child;
         }
     }
     if (found == nullptr) {

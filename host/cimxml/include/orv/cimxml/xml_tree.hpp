@@ -17,14 +17,25 @@ namespace orv::cimxml {
 struct XmlElement {
     std::string name;
     std::vector<std::pair<std::string, std::string>> attributes;
-    std::vector<std::unique_ptr<XmlElement>> children;
+    // The elements inside this one; all elements of a document live in its root's
+    // node store and go with the root.
+    std::vector<XmlElement*> children;
     std::string text;  // character data directly inside this element
     int line = 0;
+
+    XmlElement();
+    ~XmlElement();
+    XmlElement(const XmlElement&) = delete;
+    XmlElement& operator=(const XmlElement&) = delete;
 
     // The attribute's value, or nullptr when absent.
     const std::string* attribute(std::string_view key) const noexcept;
     // The first child element with this name, or nullptr.
     const XmlElement* child(std::string_view childName) const noexcept;
+
+    // The elements below the root, allocated in a few blocks rather than one by one.
+    class NodeStore;
+    std::unique_ptr<NodeStore> nodes;  // set on a document's root only
 };
 
 struct XmlLimits {
