@@ -122,6 +122,7 @@ ObjectPathModel readInstanceName(const XmlElement& element) {
     ObjectPathModel path;
     path.className = requireAttribute(element, "CLASSNAME");
     path.instance = true;
+    path.keys.reserve(element.children.size());
     for (const auto& child : element.children) {
         if (child->name == "KEYBINDING") {
             path.keys.push_back(readKeyBinding(*child));

@@ -4,8 +4,8 @@
 
 #include <expat.h>
 
-#include <climits>
 #include <algorithm>
+#include <climits>
 #include <random>
 
 namespace orv::cimxml {
@@ -80,7 +80,12 @@ public:
         }
         element->attributes.reserve(count / 2);
         for (std::size_t i = 0; i < count; i += 2) {
-            element->attributes.emplace_back(attrs[i], fromControlPictures(attrs[i + 1]));
+            const std::string_view value = attrs[i + 1];
+            if (value.find('\xE2') == std::string_view::npos) {
+                element->attributes.emplace_back(attrs[i], value);
+            } else {
+                element->attributes.emplace_back(attrs[i], fromControlPictures(value));
+            }
         }
         stack_.push_back(element);
     }
