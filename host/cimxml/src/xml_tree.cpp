@@ -87,7 +87,12 @@ struct OpenElement {
 class TreeBuilder {
 public:
     TreeBuilder(XML_Parser parser, std::string_view document, const XmlLimits& limits)
-        : parser_(parser), document_(document), limits_(limits) {}
+        : parser_(parser), document_(document), limits_(limits) {
+        // Room for a request's usual depth and width, so that these grow once at most.
+        stack_.reserve(kUsualDepth);
+        texts_.reserve(kUsualDepth);
+        pending_.reserve(2 * kUsualDepth);
+    }
 
     void start(const XML_Char* name, const XML_Char** attrs) {
         if (stack_.size() >= limits_.maxDepth) {
@@ -198,6 +203,8 @@ private:
         }
         return arena.copy(fromControlPictures(value));
     }
+
+    static constexpr std::size_t kUsualDepth = 16;
 
     XML_Parser parser_;
     std::string_view document_;
