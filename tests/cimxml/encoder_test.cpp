@@ -36,7 +36,7 @@ TEST(XmlTree, ControlPicturesAreReadAsTheControlCharacters) {
     const auto root = parseXmlDocument(out.take());
     EXPECT_EQ(root->text, value);
     ASSERT_EQ(root->attributes.size(), 1u);
-    EXPECT_EQ(root->attributes.front().second, value);
+    EXPECT_EQ(root->attributes.front().value, value);
 }
 
 // Pictures of characters XML does carry (tab, line feed, carriage return, NUL) and

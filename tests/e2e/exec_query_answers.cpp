@@ -19,15 +19,15 @@ using cimxml::XmlElement;
 // The value text of a PROPERTY, PROPERTY.ARRAY or KEYVALUE; "NULL" without one.
 std::string valueText(const XmlElement& element) {
     if (element.name == "KEYVALUE") {
-        return element.text;
+        return std::string(element.text);
     }
     if (const XmlElement* value = element.child("VALUE")) {
-        return value->text;
+        return std::string(value->text);
     }
     if (const XmlElement* array = element.child("VALUE.ARRAY")) {
         std::string joined;
         for (const auto& item : array->children) {
-            joined += (joined.empty() ? "" : ",") + item->text;
+            joined += (joined.empty() ? "" : ",") + std::string(item->text);
         }
         return joined;
     }
@@ -52,17 +52,17 @@ std::optional<std::string> instanceLine(const XmlElement& withPath) {
     std::map<std::string, std::string> keys;
     for (const auto& binding : name->children) {
         if (binding->name == "KEYBINDING" && !binding->children.empty()) {
-            keys[*binding->attribute("NAME")] = valueText(*binding->children.front());
+            keys[std::string(*binding->attribute("NAME"))] = valueText(*binding->children.front());
         }
     }
     std::map<std::string, std::string> properties;
     for (const auto& property : instance->children) {
         const std::string value = valueText(*property);
         if (property->attribute("NAME") != nullptr && value != "NULL") {
-            properties[*property->attribute("NAME")] = value;
+            properties[std::string(*property->attribute("NAME"))] = value;
         }
     }
-    return *name->attribute("CLASSNAME") + " " + joined(keys) + " | " + joined(properties);
+    return std::string(*name->attribute("CLASSNAME")) + " " + joined(keys) + " | " + joined(properties);
 }
 
 // The IMETHODRESPONSE of a CIM-XML answer, or nullptr.
@@ -103,13 +103,13 @@ std::string execQueryAnswer(int port, const std::string& language, const std::st
         return "BAD: " + response->body;
     }
     if (const XmlElement* error = answer->child("ERROR")) {
-        return "ERROR " + *error->attribute("CODE");
+        return "ERROR " + std::string(*error->attribute("CODE"));
     }
     std::vector<std::string> lines;
     if (const XmlElement* values = answer->child("IRETURNVALUE")) {
         for (const auto& item : values->children) {
             std::optional<std::string> line = instanceLine(*item);
-            lines.push_back(line ? *line : "BAD: " + item->name);
+            lines.push_back(line ? *line : "BAD: " + std::string(item->name));
         }
     }
     std::sort(lines.begin(), lines.end());

@@ -77,18 +77,18 @@ protected:
         for (const auto& child : response.children) {
             if (child->name == "ERROR") {
                 EXPECT_EQ(response.children.size(), 1u);
-                answer.error = std::stoi(*child->attribute("CODE"));
-                const std::string* description = child->attribute("DESCRIPTION");
-                answer.description = description != nullptr ? *description : "";
+                answer.error = std::stoi(std::string(*child->attribute("CODE")));
+                const std::string_view* description = child->attribute("DESCRIPTION");
+                answer.description = description != nullptr ? std::string(*description) : "";
             } else if (child->name == "IRETURNVALUE") {
                 EXPECT_FALSE(seenParam) << "IRETURNVALUE after a PARAMVALUE";
                 for (const auto& object : child->children) {
-                    answer.objects.push_back(object.get());
+                    answer.objects.push_back(object);
                 }
             } else {
                 ASSERT_EQ(child->name, "PARAMVALUE");
                 seenParam = true;
-                const std::string& name = *child->attribute("NAME");
+                const std::string_view name = *child->attribute("NAME");
                 const XmlElement* value = child->child("VALUE");
                 ASSERT_NE(value, nullptr);
                 if (name == "EndOfSequence") {
@@ -114,13 +114,13 @@ protected:
 
     // An element and everything in it, as one line.
     static std::string flat(const XmlElement* element) {
-        std::string out = "<" + element->name;
+        std::string out = "<" + std::string(element->name);
         for (const auto& [name, value] : element->attributes) {
-            out += " " + name + "=" + value;
+            out += " " + std::string(name) + "=" + std::string(value);
         }
-        out += ">" + element->text;
+        out += ">" + std::string(element->text);
         for (const auto& child : element->children) {
-            out += flat(child.get());
+            out += flat(child);
         }
         return out + "</>";
     }
@@ -134,13 +134,13 @@ protected:
         if (object->name == "INSTANCE") {
             for (const auto& property : object->children) {
                 if (*property->attribute("NAME") == "Name") {
-                    return property->child("VALUE")->text;
+                    return std::string(property->child("VALUE")->text);
                 }
             }
             return "";
         }
         for (const auto& child : object->children) {
-            if (std::string name = nameOf(child.get()); !name.empty()) {
+            if (std::string name = nameOf(child); !name.empty()) {
                 return name;
             }
         }

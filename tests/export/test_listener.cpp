@@ -98,7 +98,7 @@ http::Response TestListener::serve(const http::Request& request) {
         response.body = buildExportResponse(parsed.messageId, 1, "refused by the test");
         return response;
     }
-    accepted_.push_back(*parsed.indication->attribute("CLASSNAME"));
+    accepted_.emplace_back(*parsed.indication->attribute("CLASSNAME"));
     response.body = buildExportResponse(parsed.messageId);
     return response;
 }

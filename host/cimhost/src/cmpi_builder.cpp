@@ -20,16 +20,17 @@ using cimxml::CimError;
 using cimxml::CimStatus;
 using repository::CimType;
 
-// One value converted for a CMPI call; `text` keeps string data alive for the call.
+// One value converted for a CMPI call; `chars` points at the client's text of a
+// string, which outlives the call.
 struct Converted {
     CMPIValue value{};
     CMPIType type = CMPI_null;
-    std::string text;
+    const char* chars = nullptr;
 
     // What the CMPI setters take: for CMPI_chars the characters themselves stand in
     // for the value, as providers pass them.
     const CMPIValue* pointer() const noexcept {
-        return type == CMPI_chars ? reinterpret_cast<const CMPIValue*>(text.c_str()) : &value;
+        return type == CMPI_chars ? reinterpret_cast<const CMPIValue*>(chars) : &value;
     }
 };
 
@@ -133,14 +134,14 @@ void convertNumber(Converted& out, std::string_view name, const std::string& tex
     }
 }
 
-// Converts text to `out.type`; strings travel as CMPI_chars pointing into out.text.
+// Converts text to `out.type`; strings travel as CMPI_chars pointing at `text`.
 void convertText(const CMPIBroker* broker, Converted& out, std::string_view name, const std::string& text) {
     switch (out.type) {
         case CMPI_boolean: out.value.boolean = parseBoolean(name, text) ? 1 : 0; return;
         case CMPI_char16: out.value.char16 = parseChar16(name, text); return;
         case CMPI_string:
         case CMPI_chars:
-            out.text = text;
+            out.chars = text.c_str();
             out.type = CMPI_chars;
             return;
         case CMPI_dateTime: {
@@ -189,11 +190,15 @@ CMPIType typeFromXmlName(std::string_view name) {
     return CMPI_string;
 }
 
+// `cls` is the path's class, nullptr when the repository does not know it.
 void addKey(const CMPIBroker* broker, const repository::ClassRepository& classes, std::string_view nameSpace,
-            CMPIObjectPath* path, const cimxml::ObjectPathModel& model, const cimxml::KeyBindingModel& key) {
+            CMPIObjectPath* path, const repository::ClassDecl* cls, const cimxml::KeyBindingModel& key) {
     // A bare KEYVALUE (no KEYBINDING) is the value of the class's only key.
-    const std::string name = key.name.empty() ? soleKeyName(classes, nameSpace, model.className) : key.name;
-    const repository::PropertyDecl* declared = declaredProperty(classes, nameSpace, model.className, name);
+    const repository::PropertyDecl* sole = key.name.empty() ? soleKeyOf(cls) : nullptr;
+    static const std::string noName;
+    const std::string& name = !key.name.empty() ? key.name : sole != nullptr ? sole->name : noName;
+    const repository::PropertyDecl* declared =
+        sole != nullptr ? sole : cls != nullptr ? cls->findProperty(name) : nullptr;
     Converted converted;
     converted.type = declared != nullptr ? cmpiType(declared->type.type) : guessedKeyType(key);
     if (converted.type == CMPI_ref || key.kind == cimxml::KeyBindingModel::Kind::Reference) {
@@ -362,7 +367,7 @@ CMPIArgs* buildArgs(const CMPIBroker* broker, const repository::ClassRepository&
 
 CMPIObjectPath* buildObjectPath(const CMPIBroker* broker, const repository::ClassRepository& classes,
                                 std::string_view nameSpace, const cimxml::ObjectPathModel& model) {
-    checkInstanceName(classes, nameSpace, model);
+    const repository::ClassDecl* cls = checkInstanceName(classes, nameSpace, model);
     const std::string ns = model.nameSpace.empty() ? std::string(nameSpace) : model.nameSpace;
     CMPIStatus rc{CMPI_RC_OK, nullptr};
     CMPIObjectPath* path = broker->eft->newObjectPath(broker, ns.c_str(), model.className.c_str(), &rc);
@@ -373,7 +378,7 @@ CMPIObjectPath* buildObjectPath(const CMPIBroker* broker, const repository::Clas
         path->ft->setHostname(path, model.host.c_str());
     }
     for (const auto& key : model.keys) {
-        addKey(broker, classes, ns, path, model, key);
+        addKey(broker, classes, ns, path, cls, key);
     }
     return path;
 }

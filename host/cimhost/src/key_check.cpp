@@ -42,21 +42,26 @@ const char* kindName(KeyBindingModel::Kind kind) {
     return "string";
 }
 
+// The start of every refusal about one key; built only when a key is refused.
+std::string keyOfClass(const repository::ClassDecl& cls, const repository::PropertyDecl& declared) {
+    return "key " + declared.name + " of class " + cls.name;
+}
+
 void checkKeyType(const repository::ClassDecl& cls, const repository::PropertyDecl& declared,
                   const KeyBindingModel& key) {
     const CimType type = declared.type.type;
-    const std::string what = "key " + declared.name + " of class " + cls.name;
-    const std::string typeName(repository::cimTypeName(type));
+    const std::string_view typeName = repository::cimTypeName(type);
     // A KEYVALUE without VALUETYPE reads as "string"; the text must then fit the type,
     // which the conversion to the declared type checks.
     if (key.kind != KeyBindingModel::Kind::String && key.kind != kindOf(type)) {
-        refuse(what + " is a " + typeName + ", not " + kindName(key.kind));
+        refuse(keyOfClass(cls, declared) + " is a " + std::string(typeName) + ", not " + kindName(key.kind));
     }
     if (key.kind == KeyBindingModel::Kind::String && type == CimType::Reference) {
-        refuse(what + " is a reference, not a string");
+        refuse(keyOfClass(cls, declared) + " is a reference, not a string");
     }
-    if (!key.type.empty() && !sameName(key.type, typeName)) {
-        refuse(what + " is a " + typeName + ", not a " + key.type);
+    if (!key.type.empty() && (key.type.size() != typeName.size() ||
+                              strncasecmp(key.type.data(), typeName.data(), typeName.size()) != 0)) {
+        refuse(keyOfClass(cls, declared) + " is a " + std::string(typeName) + ", not a " + key.type);
     }
 }
 
@@ -77,12 +82,12 @@ const repository::PropertyDecl* soleKey(const repository::ClassDecl& cls) {
 
 }  // namespace
 
-void checkInstanceName(const repository::ClassRepository& classes, std::string_view nameSpace,
-                       const cimxml::ObjectPathModel& model) {
+const repository::ClassDecl* checkInstanceName(const repository::ClassRepository& classes,
+                                               std::string_view nameSpace, const cimxml::ObjectPathModel& model) {
     const std::string_view ns = model.nameSpace.empty() ? nameSpace : std::string_view(model.nameSpace);
     const repository::ClassDecl* cls = classes.getClass(ns, model.className);
     if (cls == nullptr) {
-        return;
+        return nullptr;
     }
     for (std::size_t i = 0; i < model.keys.size(); ++i) {
         const KeyBindingModel& key = model.keys[i];
@@ -105,13 +110,11 @@ void checkInstanceName(const repository::ClassRepository& classes, std::string_v
             }
         }
     }
+    return cls;
 }
 
-std::string soleKeyName(const repository::ClassRepository& classes, std::string_view nameSpace,
-                        std::string_view className) {
-    const repository::ClassDecl* cls = classes.getClass(nameSpace, className);
-    const repository::PropertyDecl* key = cls != nullptr ? soleKey(*cls) : nullptr;
-    return key != nullptr ? key->name : std::string();
+const repository::PropertyDecl* soleKeyOf(const repository::ClassDecl* cls) {
+    return cls != nullptr ? soleKey(*cls) : nullptr;
 }
 
 }  // namespace orv::cimhost::detail

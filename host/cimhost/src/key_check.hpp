@@ -14,14 +14,14 @@
 
 namespace orv::cimhost::detail {
 
-// Throws CimError(CIM_ERR_INVALID_PARAMETER) for the faults above. Paths of classes
-// the repository does not know in `nameSpace` are not checked.
-void checkInstanceName(const repository::ClassRepository& classes, std::string_view nameSpace,
-                       const cimxml::ObjectPathModel& model);
+// Throws CimError(CIM_ERR_INVALID_PARAMETER) for the faults above and returns the
+// path's class. Paths of classes the repository does not know in `nameSpace` are not
+// checked (nullptr).
+const repository::ClassDecl* checkInstanceName(const repository::ClassRepository& classes,
+                                               std::string_view nameSpace, const cimxml::ObjectPathModel& model);
 
-// The name of the class's only key; empty when the class is unknown or has no key
-// or several.
-std::string soleKeyName(const repository::ClassRepository& classes, std::string_view nameSpace,
-                        std::string_view className);
+// The class's only key; nullptr when the class is unknown (nullptr) or has no key or
+// several.
+const repository::PropertyDecl* soleKeyOf(const repository::ClassDecl* cls);
 
 }  // namespace orv::cimhost::detail

@@ -12,7 +12,7 @@ namespace orv::cimxml::detail {
 
 namespace {
 
-bool oneOf(const std::string& name, std::initializer_list<std::string_view> names) {
+bool oneOf(std::string_view name, std::initializer_list<std::string_view> names) {
     for (std::string_view candidate : names) {
         if (name == candidate) {
             return true;
@@ -25,13 +25,13 @@ bool oneOf(const std::string& name, std::initializer_list<std::string_view> name
 void childrenAmong(const XmlElement& element, std::initializer_list<std::string_view> allowed) {
     for (const auto& child : element.children) {
         if (!oneOf(child->name, allowed)) {
-            invalid(*child, "not allowed in " + element.name);
+            invalid(*child, "not allowed in " + std::string(element.name));
         }
     }
 }
 
 bool booleanAttribute(const XmlElement& element, const char* name) {
-    const std::string* value = element.attribute(name);
+    const std::string_view* value = element.attribute(name);
     if (value == nullptr || *value == "false") {
         return false;
     }
@@ -48,7 +48,7 @@ ClassParam readClass(const XmlElement& element) {
     childrenAmong(element, {"QUALIFIER", "PROPERTY", "PROPERTY.ARRAY", "PROPERTY.REFERENCE", "METHOD"});
     ClassParam cls;
     cls.name = requireAttribute(element, "NAME");
-    if (const std::string* superClass = element.attribute("SUPERCLASS")) {
+    if (const std::string_view* superClass = element.attribute("SUPERCLASS")) {
         cls.superClass = *superClass;
     }
     return cls;

@@ -6,11 +6,11 @@ namespace orv::cimxml::detail {
 
 void invalid(const XmlElement& at, const std::string& why) {
     throw ProtocolError(ProtocolError::Kind::NotValid,
-                        "line " + std::to_string(at.line) + ": <" + at.name + ">: " + why);
+                        "line " + std::to_string(at.line) + ": <" + std::string(at.name) + ">: " + why);
 }
 
-const std::string& requireAttribute(const XmlElement& element, const char* name) {
-    const std::string* value = element.attribute(name);
+std::string_view requireAttribute(const XmlElement& element, const char* name) {
+    const std::string_view* value = element.attribute(name);
     if (value == nullptr) {
         invalid(element, std::string("missing attribute ") + name);
     }
@@ -51,7 +51,7 @@ std::string readLocalNamespacePath(const XmlElement& element) {
 namespace {
 
 KeyBindingModel::Kind keyKind(const XmlElement& keyValue) {
-    const std::string* valueType = keyValue.attribute("VALUETYPE");
+    const std::string_view* valueType = keyValue.attribute("VALUETYPE");
     if (valueType == nullptr || *valueType == "string") {
         return KeyBindingModel::Kind::String;
     }
@@ -64,19 +64,19 @@ KeyBindingModel::Kind keyKind(const XmlElement& keyValue) {
     invalid(keyValue, "VALUETYPE must be string, boolean or numeric");
 }
 
-KeyBindingModel readKeyValue(const XmlElement& keyValue, std::string name) {
+KeyBindingModel readKeyValue(const XmlElement& keyValue, std::string_view name) {
     KeyBindingModel key;
-    key.name = std::move(name);
+    key.name = name;
     key.kind = keyKind(keyValue);
     key.value = keyValue.text;
-    if (const std::string* type = keyValue.attribute("TYPE")) {
+    if (const std::string_view* type = keyValue.attribute("TYPE")) {
         key.type = *type;
     }
     return key;
 }
 
 KeyBindingModel readKeyBinding(const XmlElement& binding) {
-    const std::string& name = requireAttribute(binding, "NAME");
+    const std::string_view name = requireAttribute(binding, "NAME");
     const XmlElement& content = onlyChild(binding);
     if (content.name == "KEYVALUE") {
         return readKeyValue(content, name);
@@ -122,6 +122,7 @@ ObjectPathModel readInstanceName(const XmlElement& element) {
     ObjectPathModel path;
     path.className = requireAttribute(element, "CLASSNAME");
     path.instance = true;
+    path.keys.reserve(element.children.size());
     for (const auto& child : element.children) {
         if (child->name == "KEYBINDING") {
             path.keys.push_back(readKeyBinding(*child));
@@ -178,11 +179,11 @@ std::vector<std::optional<std::string>> readValueArray(const XmlElement& element
 namespace {
 
 std::string embeddedObjectAttribute(const XmlElement& element) {
-    if (const std::string* value = element.attribute("EmbeddedObject")) {
-        return *value;
+    if (const std::string_view* value = element.attribute("EmbeddedObject")) {
+        return std::string(*value);
     }
-    if (const std::string* value = element.attribute("EMBEDDEDOBJECT")) {
-        return *value;
+    if (const std::string_view* value = element.attribute("EMBEDDEDOBJECT")) {
+        return std::string(*value);
     }
     return {};
 }
@@ -197,7 +198,7 @@ const XmlElement* propertyValue(const XmlElement& property) {
         if (found != nullptr) {
             invalid(*child, "more than one value");
         }
-        found = child.get();
+        found = child;
     }
     return found;
 }

@@ -13,7 +13,7 @@
 namespace orv::cimxml::detail {
 
 [[noreturn]] void invalid(const XmlElement& at, const std::string& why);
-const std::string& requireAttribute(const XmlElement& element, const char* name);
+std::string_view requireAttribute(const XmlElement& element, const char* name);
 // Throws unless the element has this name.
 void expectName(const XmlElement& element, const char* name);
 // The only child element; throws when there are none or several.

@@ -10,22 +10,22 @@ using detail::invalid;
 using detail::onlyChild;
 using detail::requireAttribute;
 
-bool hasMajorVersion(const std::string& version, const char* major) {
+bool hasMajorVersion(std::string_view version, std::string_view major) {
     return version.rfind(major, 0) == 0;
 }
 
 void checkVersions(const XmlElement& cim, const XmlElement& message) {
     if (!hasMajorVersion(requireAttribute(cim, "CIMVERSION"), "2.")) {
         throw ProtocolError(ProtocolError::Kind::UnsupportedCimVersion,
-                            "CIMVERSION " + *cim.attribute("CIMVERSION") + " is not supported");
+                            "CIMVERSION " + std::string(*cim.attribute("CIMVERSION")) + " is not supported");
     }
     if (!hasMajorVersion(requireAttribute(cim, "DTDVERSION"), "2.")) {
         throw ProtocolError(ProtocolError::Kind::UnsupportedDtdVersion,
-                            "DTDVERSION " + *cim.attribute("DTDVERSION") + " is not supported");
+                            "DTDVERSION " + std::string(*cim.attribute("DTDVERSION")) + " is not supported");
     }
     if (!hasMajorVersion(requireAttribute(message, "PROTOCOLVERSION"), "1.")) {
         throw ProtocolError(ProtocolError::Kind::UnsupportedProtocolVersion,
-                            "PROTOCOLVERSION " + *message.attribute("PROTOCOLVERSION") +
+                            "PROTOCOLVERSION " + std::string(*message.attribute("PROTOCOLVERSION")) +
                                 " is not supported");
     }
 }
@@ -36,13 +36,13 @@ ParamValue readParamValue(const XmlElement& holder) {
     }
     const XmlElement& value = onlyChild(holder);
     if (value.name == "VALUE") {
-        return value.text;
+        return std::string(value.text);
     }
     if (value.name == "VALUE.ARRAY") {
         return detail::readValueArray(value);
     }
     if (value.name == "CLASSNAME") {
-        return ClassNameParam{requireAttribute(value, "NAME")};
+        return ClassNameParam{std::string(requireAttribute(value, "NAME"))};
     }
     if (value.name == "INSTANCENAME" || value.name == "VALUE.REFERENCE") {
         return detail::readObjectPath(value);
@@ -115,7 +115,7 @@ void readSimpleRequest(const XmlElement& simple, CimRequest& request) {
         if (call != nullptr) {
             invalid(*child, "more than one method call");
         }
-        call = child.get();
+        call = child;
     }
     if (call == nullptr) {
         invalid(simple, "no method call");

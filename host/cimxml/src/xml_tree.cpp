@@ -6,23 +6,70 @@
 
 #include <algorithm>
 #include <climits>
+#include <cstring>
+#include <new>
 #include <random>
+#include <vector>
 
 namespace orv::cimxml {
 
-const std::string* XmlElement::attribute(std::string_view key) const noexcept {
-    for (const auto& [attrName, value] : attributes) {
-        if (attrName == key) {
-            return &value;
+// Blocks of memory that double in size up to a cap: a small request takes one
+// allocation for all its elements and texts. What is placed here is never destroyed
+// one by one: the elements below the root own nothing.
+class XmlElement::Arena {
+public:
+    void* allocate(std::size_t bytes, std::size_t alignment) {
+        std::size_t at = (used_ + alignment - 1) & ~(alignment - 1);
+        if (blocks_.empty() || at + bytes > blockSize_) {
+            std::size_t size = blocks_.empty() ? kFirstBlock : std::min(blockSize_ * 2, kLargestBlock);
+            size = std::max(size, bytes);
+            blocks_.push_back(
+                std::make_unique_for_overwrite<std::max_align_t[]>((size + sizeof(std::max_align_t) - 1) / sizeof(std::max_align_t)));
+            blockSize_ = size;
+            at = 0;
+        }
+        used_ = at + bytes;
+        return reinterpret_cast<char*>(blocks_.back().get()) + at;
+    }
+
+    std::string_view copy(std::string_view text) {
+        if (text.empty()) {
+            return {};
+        }
+        char* out = static_cast<char*>(allocate(text.size(), 1));
+        std::memcpy(out, text.data(), text.size());
+        return {out, text.size()};
+    }
+
+    template <typename T>
+    T* array(std::size_t count) {
+        return static_cast<T*>(allocate(count * sizeof(T), alignof(T)));
+    }
+
+private:
+    static constexpr std::size_t kFirstBlock = 4096;
+    static constexpr std::size_t kLargestBlock = 256U << 10U;
+    std::vector<std::unique_ptr<std::max_align_t[]>> blocks_;
+    std::size_t blockSize_ = 0;
+    std::size_t used_ = 0;
+};
+
+XmlElement::XmlElement() = default;
+XmlElement::~XmlElement() = default;
+
+const std::string_view* XmlElement::attribute(std::string_view key) const noexcept {
+    for (const XmlAttribute& attr : attributes) {
+        if (attr.name == key) {
+            return &attr.value;
         }
     }
     return nullptr;
 }
 
 const XmlElement* XmlElement::child(std::string_view childName) const noexcept {
-    for (const auto& element : children) {
+    for (const XmlElement* element : children) {
         if (element->name == childName) {
-            return element.get();
+            return element;
         }
     }
     return nullptr;
@@ -30,11 +77,22 @@ const XmlElement* XmlElement::child(std::string_view childName) const noexcept {
 
 namespace {
 
+// An element being read and where its children start among the pending ones.
+struct OpenElement {
+    XmlElement* element;
+    std::size_t firstChild;
+};
+
 // State shared with expat's callbacks while one document is read.
 class TreeBuilder {
 public:
     TreeBuilder(XML_Parser parser, std::string_view document, const XmlLimits& limits)
-        : parser_(parser), document_(document), limits_(limits) {}
+        : parser_(parser), document_(document), limits_(limits) {
+        // Room for a request's usual depth and width, so that these grow once at most.
+        stack_.reserve(kUsualDepth);
+        texts_.reserve(kUsualDepth);
+        pending_.reserve(2 * kUsualDepth);
+    }
 
     void start(const XML_Char* name, const XML_Char** attrs) {
         if (stack_.size() >= limits_.maxDepth) {
@@ -45,35 +103,47 @@ public:
             fail("too many elements");
             return;
         }
-        auto element = std::make_unique<XmlElement>();
-        element->name = name;
+        XmlElement* element = newElement();
+        XmlElement::Arena& arena = *root_->arena;
+        element->name = arena.copy(name);
         element->line = lineHere();
-        for (std::size_t i = 0; attrs[i] != nullptr; i += 2) {
-            element->attributes.emplace_back(attrs[i], fromControlPictures(attrs[i + 1]));
+        std::size_t count = 0;
+        while (attrs[count] != nullptr) {
+            count += 2;
         }
-        XmlElement* raw = element.get();
-        if (stack_.empty()) {
-            root_ = std::move(element);
-        } else {
-            stack_.back()->children.push_back(std::move(element));
+        if (count > 0) {
+            auto* attributes = arena.array<XmlAttribute>(count / 2);
+            for (std::size_t i = 0; i < count; i += 2) {
+                new (&attributes[i / 2]) XmlAttribute{arena.copy(attrs[i]), copyValue(arena, attrs[i + 1])};
+            }
+            element->attributes = {attributes, count / 2};
         }
-        stack_.push_back(raw);
+        if (texts_.size() <= stack_.size()) {
+            texts_.resize(stack_.size() + 1);
+        }
+        texts_[stack_.size()].clear();
+        stack_.push_back(OpenElement{element, pending_.size()});
     }
 
     void end() {
         // After a stop expat may still report the end of the element whose start was refused.
         if (error_.empty() && !stack_.empty()) {
-            std::string& text = stack_.back()->text;
-            if (text.find('\xE2') != std::string::npos) {
-                text = fromControlPictures(text);
+            const OpenElement open = stack_.back();
+            XmlElement::Arena& arena = *root_->arena;
+            if (const std::size_t count = pending_.size() - open.firstChild; count > 0) {
+                auto* children = arena.array<const XmlElement*>(count);
+                std::copy(pending_.begin() + static_cast<std::ptrdiff_t>(open.firstChild), pending_.end(), children);
+                open.element->children = {children, count};
+                pending_.resize(open.firstChild);
             }
+            open.element->text = copyValue(arena, texts_[stack_.size() - 1]);
             stack_.pop_back();
         }
     }
 
     void characters(const XML_Char* text, int length) {
         if (error_.empty() && !stack_.empty()) {
-            stack_.back()->text.append(text, static_cast<std::size_t>(length));
+            texts_[stack_.size() - 1].append(text, static_cast<std::size_t>(length));
         }
     }
 
@@ -97,7 +167,10 @@ public:
     // Line breaks as XML counts them: LF, CR LF and a CR alone. A piece ends before the
     // '<' of an element, so a CR at its end stands alone.
     static int lineBreaks(std::string_view text) {
-        int breaks = static_cast<int>(std::count(text.begin(), text.end(), '\n'));
+        int breaks = 0;
+        for (std::size_t at = text.find('\n'); at != std::string_view::npos; at = text.find('\n', at + 1)) {
+            ++breaks;
+        }
         for (std::size_t at = text.find('\r'); at != std::string_view::npos; at = text.find('\r', at + 1)) {
             if (at + 1 >= text.size() || text[at + 1] != '\n') {
                 ++breaks;
@@ -110,13 +183,38 @@ public:
     std::unique_ptr<XmlElement> takeRoot() { return std::move(root_); }
 
 private:
+    // The root holds the arena the elements below it live in.
+    XmlElement* newElement() {
+        if (stack_.empty()) {
+            root_ = std::make_unique<XmlElement>();
+            root_->arena = std::make_unique<XmlElement::Arena>();
+            return root_.get();
+        }
+        XmlElement* element = new (root_->arena->array<XmlElement>(1)) XmlElement();
+        pending_.push_back(element);
+        return element;
+    }
+
+    // Text or an attribute value in the arena, control pictures turned back into the
+    // characters they stand for.
+    static std::string_view copyValue(XmlElement::Arena& arena, std::string_view value) {
+        if (value.find('\xE2') == std::string_view::npos) {
+            return arena.copy(value);
+        }
+        return arena.copy(fromControlPictures(value));
+    }
+
+    static constexpr std::size_t kUsualDepth = 16;
+
     XML_Parser parser_;
     std::string_view document_;
     const XmlLimits& limits_;
     std::size_t lineCountedTo_ = 0;
     int line_ = 1;
     std::unique_ptr<XmlElement> root_;
-    std::vector<XmlElement*> stack_;
+    std::vector<OpenElement> stack_;
+    std::vector<const XmlElement*> pending_;  // children of the open elements, in order
+    std::vector<std::string> texts_;          // the open elements' text so far, by depth
     std::size_t elementCount_ = 0;
     std::string error_;
 };

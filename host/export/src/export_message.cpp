@@ -20,23 +20,23 @@ const XmlElement& requireChild(const XmlElement& parent, std::string_view name) 
     const XmlElement* child = parent.child(name);
     if (child == nullptr) {
         throw ProtocolError(ProtocolError::Kind::NotValid,
-                            parent.name + " has no " + std::string(name) + " element");
+                            std::string(parent.name) + " has no " + std::string(name) + " element");
     }
     return *child;
 }
 
-const std::string& requireAttribute(const XmlElement& element, std::string_view name) {
-    const std::string* value = element.attribute(name);
+std::string_view requireAttribute(const XmlElement& element, std::string_view name) {
+    const std::string_view* value = element.attribute(name);
     if (value == nullptr) {
         throw ProtocolError(ProtocolError::Kind::NotValid,
-                            element.name + " has no " + std::string(name) + " attribute");
+                            std::string(element.name) + " has no " + std::string(name) + " attribute");
     }
     return *value;
 }
 
 void requireMajor(const XmlElement& element, std::string_view attribute, std::string_view major,
                   ProtocolError::Kind kind) {
-    const std::string& version = requireAttribute(element, attribute);
+    const std::string version(requireAttribute(element, attribute));
     if (version.rfind(major, 0) != 0) {
         throw ProtocolError(kind, std::string(attribute) + " " + version + " is not supported");
     }
@@ -46,10 +46,10 @@ const XmlElement& newIndicationParameter(const XmlElement& call) {
     const XmlElement* found = nullptr;
     for (const auto& child : call.children) {
         if (child->name != "EXPPARAMVALUE") {
-            throw ProtocolError(ProtocolError::Kind::NotValid, "unexpected " + child->name + " in EXPMETHODCALL");
+            throw ProtocolError(ProtocolError::Kind::NotValid, "unexpected " + std::string(child->name) + " in EXPMETHODCALL");
         }
         if (requireAttribute(*child, "NAME") == "NewIndication") {
-            found = child.get();
+            found = child;
         }
     }
     if (found == nullptr) {
@@ -98,7 +98,7 @@ ExportRequest parseExportRequest(std::string_view body, const cimxml::XmlLimits&
     }
     const XmlElement& cim = *request.document;
     if (cim.name != "CIM") {
-        throw ProtocolError(ProtocolError::Kind::NotValid, "the document element is " + cim.name + ", not CIM");
+        throw ProtocolError(ProtocolError::Kind::NotValid, "the document element is " + std::string(cim.name) + ", not CIM");
     }
     requireMajor(cim, "CIMVERSION", "2.", ProtocolError::Kind::UnsupportedCimVersion);
     requireMajor(cim, "DTDVERSION", "2.", ProtocolError::Kind::UnsupportedDtdVersion);
@@ -132,10 +132,10 @@ std::optional<std::string> exportResponseError(std::string_view body) {
         return std::string("response has no EXPMETHODRESPONSE");
     }
     if (const XmlElement* error = response->child("ERROR")) {
-        const std::string* code = error->attribute("CODE");
-        const std::string* description = error->attribute("DESCRIPTION");
-        return "listener answered error " + (code != nullptr ? *code : std::string("?")) +
-               (description != nullptr ? ": " + *description : std::string());
+        const std::string_view* code = error->attribute("CODE");
+        const std::string_view* description = error->attribute("DESCRIPTION");
+        return "listener answered error " + std::string(code != nullptr ? *code : "?") +
+               (description != nullptr ? ": " + std::string(*description) : std::string());
     }
     return std::nullopt;
 }

@@ -6,25 +6,40 @@
 
 #include <cstddef>
 #include <memory>
+#include <span>
 #include <stdexcept>
 #include <string>
 #include <string_view>
-#include <utility>
-#include <vector>
 
 namespace orv::cimxml {
 
+struct XmlAttribute {
+    std::string_view name;
+    std::string_view value;
+};
+
+// An element of a parsed document. Names, texts, attributes and child lists are views
+// into the memory of the document's root: they live as long as the root.
 struct XmlElement {
-    std::string name;
-    std::vector<std::pair<std::string, std::string>> attributes;
-    std::vector<std::unique_ptr<XmlElement>> children;
-    std::string text;  // character data directly inside this element
+    std::string_view name;
+    std::span<const XmlAttribute> attributes;
+    std::span<const XmlElement* const> children;
+    std::string_view text;  // character data directly inside this element
     int line = 0;
 
+    XmlElement();
+    ~XmlElement();
+    XmlElement(const XmlElement&) = delete;
+    XmlElement& operator=(const XmlElement&) = delete;
+
     // The attribute's value, or nullptr when absent.
-    const std::string* attribute(std::string_view key) const noexcept;
+    const std::string_view* attribute(std::string_view key) const noexcept;
     // The first child element with this name, or nullptr.
     const XmlElement* child(std::string_view childName) const noexcept;
+
+    // The memory of a whole document: elements and their text, taken in a few blocks.
+    class Arena;
+    std::unique_ptr<Arena> arena;  // set on a document's root only
 };
 
 struct XmlLimits {
