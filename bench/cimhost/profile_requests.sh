@@ -5,7 +5,8 @@
 # Orvane_EthernetPort and REQUESTS GetInstance of vmnic0 are sent one after the other (curl,
 # one connection each), each kind in its own counting window. Prints the whole process's
 # instructions per request and per delivered instance, and the inclusive share of the parts
-# named below (the provider's fill, the binding's setProperty, the writer, request parsing).
+# named below (the provider's fill, the binding's setProperty, the writer, request parsing;
+# the handlers run on the HTTP workers, so no HTTP function stands for the front end alone).
 #
 #   BUILD_DIR=build bench/cimhost/profile_requests.sh
 #   REQUESTS=20 NICS=64 KEEP=dir bench/cimhost/profile_requests.sh   (KEEP keeps the callgrind files)
@@ -78,7 +79,6 @@ PARTS=(
   "writer: instance|orv::cimxml::writeInstance\\("
   "writer: instance name|orv::cimxml::writeInstanceName"
   "request parsing|orv::cimxml::parseRequest"
-  "HTTP front end (all)|orv::http::"
 )
 report() {  # report FILE PER LABEL
   local file=$1 per=$2 label=$3 total
